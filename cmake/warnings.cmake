@@ -1,0 +1,7 @@
+# SPDX-License-Identifier: MIT
+# Warnings are errors in the project's own targets.
+function(quarzel_warnings target)
+  target_compile_options(${target} PRIVATE -Wall -Wextra -Wshadow -Wconversion -Werror
+    # GCC 12 sees an overlap in every inlined "text" + std::string, where there is none (its bug 105651).
+    $<$<COMPILE_LANG_AND_ID:CXX,GNU>:-Wno-restrict>)
+endfunction()

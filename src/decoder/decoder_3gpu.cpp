@@ -1,0 +1,205 @@
+// SPDX-License-Identifier: MIT
+#include "decoder/decoder_3gpu.hpp"
+
+#include <algorithm>
+#include <locale>
+#include <optional>
+#include <sstream>
+
+#include "decoder/segment_trace.hpp"
+#include "fixed/text_output.hpp"
+#include "fixed/wrap16.hpp"
+
+using quarzel::errorLine;
+
+namespace {
+
+/// Metrics as they are kept between segments.
+T8 toBoundary(T8 metrics) {
+    for (std::int16_t& metric : metrics.element) {
+        metric = static_cast<std::int16_t>(metric & quarzel::boundaryMask);
+    }
+    return metrics;
+}
+
+}  // namespace
+
+TDecoder3GPU* TDecoder3GPU::create(bool is3GPP2, const std::string& properties) {
+    unsigned numPU = 4;
+    unsigned numThreads = 4;
+    if (!properties.empty()) {
+        std::istringstream stream(properties);
+        stream.imbue(std::locale::classic());
+        if (!(stream >> numPU) || numPU == 0) {
+            errorLine("ERROR:TDecoder3GPU:Illegal number of processing units:" + std::to_string(numPU));
+            return nullptr;
+        }
+        if (stream.peek() == ',') {
+            stream.get();
+            if (!(stream >> numThreads) || numThreads == 0) {
+                errorLine("ERROR:TDecoder3GPU:Illegal number of threads per processing unit:" +
+                          std::to_string(numThreads));
+                return nullptr;
+            }
+        }
+    }
+    return new TDecoder3GPU(is3GPP2, numPU, numThreads);
+}
+
+std::string TDecoder3GPU::getProperties() const {
+    std::string properties = (its3GPP2 ? "3GPP2PU:" : "3GPPPU:") + std::to_string(itsNumPU);
+    if (itsNumThreads != 4) {
+        properties += "," + std::to_string(itsNumThreads);
+    }
+    return properties;
+}
+
+bool TDecoder3GPU::allocate(unsigned blockSize) {
+    if (!TDecoder3G::allocate(blockSize)) {
+        return false;
+    }
+    if (blockSize != itsCutSize) {
+        itsCutSize = 0;
+        const std::uint32_t K = blockSize > tailSteps ? blockSize - tailSteps : 0;
+        itsNT = quarzel::threadSegments(K, itsNumPU * itsNumThreads);
+        if (itsVerbosity >= 1) {
+            quarzel::outputLine("itsNT=" + std::to_string(itsNT));
+        }
+        if (K / itsNT * itsNT + tailSteps != blockSize) {
+            errorLine("ERROR:TDecoder3GPU:Block size not supported");
+            return false;
+        }
+        quarzel::cutSegments(K, itsNT, itsSegments);
+        itsCutSize = blockSize;
+        if (itsVerbosity >= 2) {
+            quarzel::traceSegments(itsSegments);
+        }
+    }
+    for (unsigned set = 0; set < 2; ++set) {
+        itsAlphaInit[set].assign(itsSegments.alpha.size(), T8{});
+        itsBetaInit[set].assign(itsSegments.beta.size(), T8{});
+    }
+    return true;
+}
+
+bool TDecoder3GPU::calcGamma(unsigned siso) {
+    return calcGamma(siso, 0, itsBlockSize - tailSteps - 1);
+}
+
+bool TDecoder3GPU::preCalcAlpha(unsigned /*siso*/, unsigned /*step*/, T8* out) {
+    setUnknownState(out);
+    *out = toBoundary(*out);
+    return true;
+}
+
+bool TDecoder3GPU::preCalcBeta(unsigned siso, unsigned step, T8* out) {
+    return preCalcAlpha(siso, step, out);
+}
+
+bool TDecoder3GPU::preCalcBetaTail(unsigned siso, T8* out) const {
+    const unsigned set = inputSet(siso);
+    const unsigned K = itsBlockSize - tailSteps;
+    // Value of a termination step with the signs of its two parities.
+    const auto tail = [&](unsigned step, int parity0, int parity1) {
+        return itsSys[set][K + step] + parity0 * itsPar0[set][K + step] + parity1 * itsPar1[set][K + step];
+    };
+    const std::int32_t T = tail(2, 1, 1);
+    const std::int32_t U2 = tail(1, 1, 1);
+    const std::int32_t V2 = tail(1, -1, 1);
+    const std::int32_t U1 = tail(0, 1, 1);
+    const std::int32_t W1 = tail(0, 1, -1);
+    const std::int32_t V1 = tail(0, -1, 1);
+    const std::int32_t X1 = tail(0, -1, -1);
+    // The sums fit 32 bits, so that one wrap at the end is the wrap of every step.
+    const std::int32_t metrics[8] = {-T - U2 - U1, -T - U2 + U1, U2 - T + V1, U2 - T - V1,
+                                     T + V2 - X1,  T + V2 + X1,  T - V2 + W1, T - V2 - W1};
+    for (unsigned state = 0; state < 8; ++state) {
+        (*out)[state] = quarzel::wrap16(metrics[state]);
+    }
+    *out = toBoundary(*out);
+    return true;
+}
+
+bool TDecoder3GPU::calcAlpha(unsigned siso) {
+    const bool traced = itsVerbosity > 8;
+    std::vector<T8>& init = itsAlphaInit[inputSet(siso)];
+    if (traced) {
+        quarzel::outputLine("TDecoder3GPU::calcAlpha(" + std::to_string(siso) + ")");
+    }
+    if (siso <= 1) {
+        setInitialState(&init[0]);
+        for (std::size_t i = 1; i < init.size(); ++i) {
+            preCalcAlpha(siso, itsSegments.alpha[i].from, &init[i]);
+        }
+    }
+    T8 carry = init[0];
+    for (std::size_t i = 0; i < init.size(); ++i) {
+        const ABSegment& segment = itsSegments.alpha[i];
+        itsAlpha[segment.from] = init[i];
+        init[i] = toBoundary(carry);
+        if (traced) {
+            quarzel::traceAlphaSegment(segment, itsAlpha[segment.from], carry);
+        }
+        if (!calcAlpha(siso, segment.from, segment.to)) {
+            return false;
+        }
+        carry = itsAlpha[segment.to];
+    }
+    if (traced) {
+        quarzel::traceBoundaries("itsAlphaInit", inputSet(siso), init);
+    }
+    return true;
+}
+
+bool TDecoder3GPU::calcBeta(unsigned siso) {
+    const bool traced = itsVerbosity > 8;
+    std::vector<T8>& init = itsBetaInit[inputSet(siso)];
+    if (traced) {
+        quarzel::outputLine("TDecoder3GPU::calcBeta(" + std::to_string(siso) + ")");
+    }
+    if (siso <= 1) {
+        for (std::size_t j = 0; j < init.size(); ++j) {
+            if (j + 1 == init.size()) {
+                preCalcBetaTail(siso, &init[j]);
+            } else {
+                preCalcBeta(siso, itsSegments.beta[j].from, &init[j]);
+            }
+        }
+    }
+    // A thread's next start is read before its window runs, so a boundary that the first windows store
+    // reaches the last ones in this pass only when a thread has three windows or more.
+    const std::size_t threads = itsNT;
+    itsBetaWork.assign(init.begin(),
+                       init.begin() + static_cast<std::ptrdiff_t>(std::min(threads, init.size())));
+    for (std::size_t j = 0; j < init.size(); ++j) {
+        const ABSegment& window = itsSegments.beta[j];
+        T8& start = itsBetaWork[j % threads];
+        const T8 saved = itsBeta[window.to];
+        itsBeta[window.from] = start;
+        if (siso <= 1 && j + 1 != init.size()) {
+            setUnknownState(&itsBeta[window.from]);
+        }
+        if (j + threads < init.size()) {
+            start = init[j + threads];
+        }
+        if (!calcBeta(siso, window.from, window.to)) {
+            return false;
+        }
+        // The window just below: of the same thread, or the last one of the thread before.
+        std::optional<std::size_t> below;
+        if (j != 0) {
+            below = j >= threads ? j - threads : init.size() - threads + j - 1;
+        }
+        if (traced) {
+            quarzel::traceBetaWindow(window, itsBeta[window.from], itsBeta[window.to], below);
+        }
+        if (below) {
+            init[*below] = toBoundary(itsBeta[window.to]);
+            itsBeta[window.to] = saved;
+        }
+    }
+    if (traced) {
+        quarzel::traceBoundaries("itsBetaInit", inputSet(siso), init);
+    }
+    return true;
+}

@@ -1,0 +1,34 @@
+// SPDX-License-Identifier: MIT
+#include "decoder/segments.hpp"
+
+#include <ostream>
+
+namespace quarzel {
+
+std::string toText(const ABSegment& segment) {
+    return "[" + std::to_string(segment.from) + "," + std::to_string(segment.to) + ")";
+}
+
+std::ostream& operator<<(std::ostream& stream, const ABSegment& segment) {
+    return stream << toText(segment);
+}
+
+void cutSegments(std::uint32_t K, std::uint32_t count, Segments& segments) {
+    const std::uint32_t length = K / count;
+    segments.alpha.clear();
+    segments.beta.clear();
+    for (std::uint32_t thread = 0; thread < count; ++thread) {
+        segments.alpha.push_back({thread * length, (thread + 1) * length});
+    }
+    std::uint32_t offset = 0;
+    while (offset < length) {
+        const std::uint32_t window = windowLength(length - offset);
+        for (const ABSegment& thread : segments.alpha) {
+            const std::uint32_t bottom = thread.from + offset;
+            segments.beta.push_back({bottom + window - 1, bottom == 0 ? 0 : bottom - 1});
+        }
+        offset += window;
+    }
+}
+
+}  // namespace quarzel

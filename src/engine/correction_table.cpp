@@ -1,0 +1,59 @@
+// SPDX-License-Identifier: MIT
+#include <algorithm>
+#include <bit>
+#include <cmath>
+
+#include "engine/engine_mod_base.hpp"
+#include "fixed/text_output.hpp"
+
+namespace {
+
+/// Round half away from zero to the integer of the format, saturate, and keep the low byte of the word.
+unsigned char toTableByte(double y, const TNumberFormat& format) {
+    const double scaled = y * format.scale;
+    const auto q = static_cast<std::int32_t>(scaled >= 0 ? scaled + 0.5 : scaled - 0.5);
+    if (q < format.minQ) {
+        return static_cast<unsigned char>(format.min);
+    }
+    if (q > format.maxQ) {
+        return static_cast<unsigned char>(format.max);
+    }
+    return static_cast<unsigned char>(format.toWord(q));
+}
+
+}  // namespace
+
+std::vector<unsigned char> TCalculationEngineModBase::createLUT(unsigned points,
+                                                                const TNumberFormat* format) {
+    if (points == 0) {
+        points = 65536;
+    }
+    if (format->binpt + format->shift > 8) {
+        quarzel::errorLine(
+            "ERROR:TCalculationEngineModBase::createLUT:Binary point of state metrics is incompatible with 8 "
+            "bit "
+            "lookup tables");
+        return {};
+    }
+    if (!std::has_single_bit(points)) {
+        quarzel::errorLine(
+            "ERROR:TCalculationEngineModBase::createLUT:Number of points must be a binary number");
+        return {};
+    }
+    // The table ignores the low bits of a difference: its step is 8 / points, no finer than the metrics are.
+    const auto exponent = static_cast<std::uint32_t>(std::countr_zero(points));
+    const std::uint32_t drop = exponent <= 2 ? 0 : std::min(exponent - 3, format->binpt);
+    const auto ignored = static_cast<std::int32_t>(format->binpt + format->shift - drop);
+    const std::int32_t keep = ignored > 0 ? -(std::int32_t{1} << ignored) : -1;
+
+    std::vector<unsigned char> table;
+    table.reserve(65536);
+    for (std::int32_t difference = -32768; difference <= 32767; ++difference) {
+        // The complement, not the magnitude: -1 shares the entry of 0.
+        const std::int32_t d = (difference >= 0 ? difference : -difference - 1) & keep;
+        const double x = format->toReal(static_cast<std::int16_t>(d));
+        // The cut-off is the number of points, whatever difference they reach.
+        table.push_back(toTableByte(x < points ? std::log(std::exp(-x) + 1.0) : 0.0, *format));
+    }
+    return table;
+}

@@ -1,0 +1,63 @@
+// SPDX-License-Identifier: MIT
+#include "fixed/number_format.hpp"
+
+#include <locale>
+#include <ostream>
+#include <sstream>
+
+#include "fixed/properties.hpp"
+#include "fixed/text_output.hpp"
+
+using quarzel::errorLine;
+
+namespace {
+
+/// A 32-bit shift by the low five bits of the count.
+constexpr std::uint32_t shiftLeft(std::uint32_t value, std::uint32_t count) {
+    return value << (count & 31U);
+}
+
+}  // namespace
+
+TNumberFormat::TNumberFormat(std::uint32_t nbits_, std::uint32_t binpt_)
+    : nbits(nbits_), binpt(binpt_), shift(16U - nbits_), scale(shiftLeft(1, binpt_)) {
+    const std::uint32_t half = shiftLeft(1, nbits - 1U);
+    maxQ = static_cast<std::int32_t>(half - 1U);
+    minQ = static_cast<std::int32_t>(0U - half);
+    max = toWord(maxQ);
+    min = toWord(minQ);
+    mask = static_cast<std::int16_t>(max | min);
+}
+
+TNumberFormat* TNumberFormat::create(const std::string& properties) {
+    const auto [head, rest] = splitString(properties, "_");
+    std::istringstream stream(rest);
+    stream.imbue(std::locale::classic());
+    std::uint32_t nbits = 0;
+    std::uint32_t binpt = 0;
+    char separator = '\0';
+    stream >> nbits >> separator >> binpt;
+    if (head != "Fix" || stream.fail() || separator != '_') {
+        errorLine("ERROR:TNumberFormat:Unexpected property string:" + properties);
+        return nullptr;
+    }
+    if (nbits < 1 || nbits > 16) {
+        errorLine("ERROR:TNumberFormat:nbits must be in range [1:16]");
+        return nullptr;
+    }
+    if (binpt < 1 || binpt > 16 || binpt >= nbits) {
+        errorLine("ERROR:TNumberFormat:binpt must be in range [1:16] and <nbits");
+        return nullptr;
+    }
+    return new TNumberFormat(nbits, binpt);
+}
+
+std::string TNumberFormat::getProperties() const {
+    return "Fix_" + std::to_string(nbits) + "_" + std::to_string(binpt);
+}
+
+std::ostream& operator<<(std::ostream& stream, const TNumberFormat& format) {
+    return stream << "NBITS=" << format.nbits << " BINPT=" << format.binpt << " Shift=" << format.shift
+                  << " Scale=" << format.scale << " Min=" << format.min << " Max=" << format.max
+                  << " MinQ=" << format.minQ << " MaxQ=" << format.maxQ << " Mask=" << format.mask;
+}

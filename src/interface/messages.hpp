@@ -1,0 +1,20 @@
+// SPDX-License-Identifier: MIT
+#pragma once
+
+#include <string_view>
+
+#include "interface/soft_input.hpp"
+
+/// The lines of the model interface.
+namespace quarzel {
+
+/// "ERROR:decoder:" and the text, on the standard error stream.
+void decoderError(std::string_view text);
+
+/// The warning of the first saturated input, on the standard output stream.
+void warnSaturation(const Saturation& saturation);
+
+/// The warning of the first truncated tag, on the standard output stream.
+void warnTagTruncation(int tagWidth);
+
+}  // namespace quarzel

@@ -1,0 +1,169 @@
+// SPDX-License-Identifier: MIT
+#include <cstddef>
+#include <cstdlib>
+#include <new>
+#include <string>
+
+#include "decoder/decoder.hpp"
+#include "engine/engine.hpp"
+#include "fixed/number_format.hpp"
+#include "interface/messages.hpp"
+#include "interface/state.hpp"
+#include "interleaver/interleaver.hpp"
+
+using quarzel::decoderError;
+
+// The records are laid out for 64-bit Linux, whatever compiler or language calls.
+static_assert(sizeof(void*) != 8 || sizeof(vardel_ip_quarzel_generics) == 72);
+static_assert(sizeof(void*) != 8 || sizeof(vardel_ip_quarzel_inputs) == 40);
+static_assert(sizeof(void*) != 8 || sizeof(vardel_ip_quarzel_outputs) == 24);
+
+vardel_ip_quarzel_generics* vardel_ip_quarzel_get_default_generics(vardel_ip_quarzel_generics* generics) {
+    *generics = {
+        .C_PATH = "./",
+        .C_FAMILY = "durnox5",
+        .C_COMPONENT_NAME = "quarzel",
+        .C_SPARE_1 = 512,
+        .C_STATE_INT_WIDTH = 9,
+        .C_STATE_FRAC_WIDTH = 3,
+        .C_INPUT_INT_WIDTH = 5,
+        .C_INPUT_FRAC_WIDTH = 3,
+        .C_SPARE_2 = 0,
+        .C_SPARE_3 = 0,
+        .C_SPARE_4 = 0,
+        .C_NUM_PU = 2,
+        .C_TAG_WIDTH = 8,
+        .C_ALGORITHM_TYPE = 1,
+    };
+    return generics;
+}
+
+namespace {
+
+/// The text for the first generic that does not fit, or null.
+const char* findFault(const vardel_ip_quarzel_generics& generics) {
+    if (generics.C_NUM_PU != 2 && generics.C_NUM_PU != 4 && generics.C_NUM_PU != 8) {
+        return "C_NUM_PU must be either 2, 4 or 8";
+    }
+    if (generics.C_TAG_WIDTH < 0 || generics.C_TAG_WIDTH > 32) {
+        return "C_TAG_WIDTH must be in range 0 to 32";
+    }
+    if (generics.C_ALGORITHM_TYPE < 0 || generics.C_ALGORITHM_TYPE > 2) {
+        return "C_ALGORITHM_TYPE must be in range 0 to 2";
+    }
+    if (generics.C_STATE_INT_WIDTH != 9) {
+        return "C_STATE_INT_WIDTH must be 9";
+    }
+    if (generics.C_STATE_FRAC_WIDTH != 3) {
+        return "C_STATE_FRAC_WIDTH must be 3";
+    }
+    if (generics.C_INPUT_INT_WIDTH != 5) {
+        return "C_INPUT_INT_WIDTH must be 5";
+    }
+    if (generics.C_INPUT_FRAC_WIDTH != 3) {
+        return "C_INPUT_FRAC_WIDTH must be 3";
+    }
+    return nullptr;
+}
+
+/// Create and wire the components of a state.
+/// @return the text for the first that failed, or null
+const char* fillState(vardel_ip_quarzel_state& state) {
+    const int algorithm = state.generics.C_ALGORITHM_TYPE;
+    state.state_format = TNumberFormat::create("Fix_12_3");
+    if (state.state_format == nullptr) {
+        return "Could not set state number format";
+    }
+    state.branch_format = TNumberFormat::create("Fix_8_3");
+    if (state.branch_format == nullptr) {
+        return "Could not set branch number format";
+    }
+    state.input_format = TNumberFormat::create("Fix_8_3");
+    if (state.input_format == nullptr) {
+        return "Could not set input number format";
+    }
+    state.interleaver = TInterleaver::create("3GPPLTE");
+    if (state.interleaver == nullptr) {
+        return "Could not create interleaver";
+    }
+    state.engine = TCalculationEngine::create(algorithm == 2 ? "MOD#:16" : "MOD");
+    if (state.engine == nullptr) {
+        return "Could not create calculation engine";
+    }
+    state.engine->setFormats(state.input_format, state.state_format, state.branch_format);
+    if (!state.engine->initialise()) {
+        return "Could not initialise calculation engine";
+    }
+    state.decoder = TDecoder::create("3GPPPU:" + std::to_string(state.generics.C_NUM_PU));
+    if (state.decoder == nullptr) {
+        return "Could not create decoder";
+    }
+    state.decoder->connect(state.interleaver, state.engine);
+    state.decoder->setExtrinsicScale(algorithm == 1 ? 0.75 : 1.0);
+    return nullptr;
+}
+
+}  // namespace
+
+vardel_ip_quarzel_state* create_default_state(vardel_ip_quarzel_generics generics) {
+    void* memory = std::malloc(sizeof(vardel_ip_quarzel_state));
+    if (memory == nullptr) {
+        decoderError("Could not allocate memory for decoder state");
+        return nullptr;
+    }
+    auto* state = new (memory) vardel_ip_quarzel_state{};
+    state->generics = generics;
+    // The shift count is taken modulo 32, so that a width of 32 gives an empty mask, as a width of 0 does.
+    state->tag_mask = (1U << (static_cast<unsigned>(generics.C_TAG_WIDTH) % 32U)) - 1U;
+    return state;
+}
+
+vardel_ip_quarzel_state* vardel_ip_quarzel_create_state(vardel_ip_quarzel_generics generics) {
+    if (const char* fault = findFault(generics)) {
+        decoderError(fault);
+        return nullptr;
+    }
+    vardel_ip_quarzel_state* state = create_default_state(generics);
+    if (state == nullptr) {
+        return nullptr;
+    }
+    const char* fault = nullptr;
+    try {
+        fault = fillState(*state);
+    } catch (...) {
+        fault = "Unhandled exception has occurred";
+    }
+    if (fault != nullptr) {
+        decoderError(fault);
+        vardel_ip_quarzel_destroy_state(state);
+        return nullptr;
+    }
+    return state;
+}
+
+namespace {
+
+template <class Component>
+void destroy(Component*& component) {
+    delete component;
+    component = nullptr;
+}
+
+}  // namespace
+
+void vardel_ip_quarzel_destroy_state(vardel_ip_quarzel_state* state) {
+    if (state == nullptr) {
+        return;
+    }
+    destroy(state->state_format);
+    destroy(state->branch_format);
+    destroy(state->input_format);
+    destroy(state->engine);
+    destroy(state->interleaver);
+    destroy(state->decoder);
+    std::free(state);
+}
+
+void vardel_ip_quarzel_bitacc_dump_config(vardel_ip_quarzel_state* state, unsigned int count) {
+    state->decoder->setDump(count);
+}
