@@ -1,7 +1,6 @@
 // SPDX-License-Identifier: MIT
 #include "interleaver/lte_params.hpp"
 
-// clang-format off: rows are kept whole, five or six a line
 const std::array<LteParams, 188> lteParams = {{
     {40, 3, 10},      {48, 7, 12},      {56, 19, 42},     {64, 7, 16},      {72, 7, 18},
     {80, 11, 20},     {88, 5, 22},      {96, 11, 24},     {104, 7, 26},     {112, 41, 84},
@@ -42,4 +41,3 @@ const std::array<LteParams, 188> lteParams = {{
     {5696, 45, 178},  {5760, 161, 120}, {5824, 89, 182},  {5888, 323, 184}, {5952, 47, 186},
     {6016, 23, 94},   {6080, 47, 190},  {6144, 263, 480},
 }};
-// clang-format on
