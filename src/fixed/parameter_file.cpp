@@ -1,0 +1,40 @@
+// SPDX-License-Identifier: MIT
+#include "fixed/parameter_file.hpp"
+
+#include <algorithm>
+#include <fstream>
+
+#include "fixed/properties.hpp"
+#include "fixed/string_utilities.hpp"
+#include "fixed/text_output.hpp"
+
+bool parse(std::istream& stream, std::map<std::string, std::string>& parameters, bool addKeys) {
+    bool allGood = true;
+    std::size_t lineNumber = 0;
+    for (std::string line; std::getline(stream, line);) {
+        ++lineNumber;
+        line.resize(std::min({line.find("//"), line.find('#'), line.size()}));
+        if (line.find('=') == std::string::npos) {
+            continue;
+        }
+        const auto [left, right] = splitString(line, "=");
+        const std::string key = stripws(left);
+        if (addKeys || parameters.contains(key)) {
+            parameters[key] = stripws(right);
+        } else {
+            quarzel::errorLine("ERROR:" + std::to_string(lineNumber) + ":Parameter name '" + key +
+                               "' is invalid");
+            allGood = false;
+        }
+    }
+    return allGood;
+}
+
+bool parse(const std::string& fileName, std::map<std::string, std::string>& parameters, bool addKeys) {
+    std::ifstream file(fileName);
+    if (!file) {
+        quarzel::errorLine("ERROR:Could not open input file '" + fileName + "'");
+        return false;
+    }
+    return parse(file, parameters, addKeys);
+}
