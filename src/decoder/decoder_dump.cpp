@@ -12,9 +12,6 @@ using quarzel::writeText;
 
 namespace {
 
-/// The branch metrics in the order of the trace's columns g4 to g7.
-constexpr std::size_t branchColumns[] = {2, 1, 3, 0};
-
 constexpr const char* passHeader =
     "n    int           a0          a1          a2          a3          a4          a5          a6          "
     "a7"
@@ -53,17 +50,11 @@ void TDecoder3G::dumpFull(std::ostream& stream, unsigned siso) {
         quarzel::appendStep(row, step);
         appendReal(row, itsIntrinsic[step], format);
         row += "  ";
-        for (const std::int16_t metric : itsAlpha[step].element) {
-            appendReal(row, metric, format);
-        }
+        quarzel::appendStateMetrics(row, itsAlpha[step], format);
         row += "  ";
-        for (const std::int16_t metric : itsBeta[step].element) {
-            appendReal(row, metric, format);
-        }
+        quarzel::appendStateMetrics(row, itsBeta[step], format);
         row += "  ";
-        for (const std::size_t column : branchColumns) {
-            appendReal(row, itsGamma[step][column], format);
-        }
+        quarzel::appendBranchMetrics(row, itsGamma[step], format);
         row += "  ";
         appendReal(row, itsLLR[step], format);
         appendReal(row, itsExtrinsic[step], format);

@@ -7,6 +7,9 @@ namespace quarzel {
 
 namespace {
 
+/// The elements of a branch-metric record in the columns g4 to g7.
+constexpr std::size_t branchColumns[] = {2, 1, 3, 0};
+
 /// Pad with blanks what `row` holds from `start` on.
 void pad(std::string& row, std::size_t start, std::size_t width) {
     if (row.size() < start + width) {
@@ -32,6 +35,24 @@ void appendReal(std::string& row, std::int16_t word, const TNumberFormat& format
     const auto end = std::to_chars(digits, digits + sizeof digits, real, std::chars_format::fixed, 6).ptr;
     row.append(digits, end);
     pad(row, start, 12);
+}
+
+void appendMarkedReal(std::string& row, std::int16_t word, std::int16_t partner,
+                      const TNumberFormat& format) {
+    row += word == partner ? ' ' : '*';
+    appendReal(row, word, format);
+}
+
+void appendStateMetrics(std::string& row, const T8& metrics, const TNumberFormat& format) {
+    for (const std::int16_t metric : metrics.element) {
+        appendReal(row, metric, format);
+    }
+}
+
+void appendBranchMetrics(std::string& row, const T8& metrics, const TNumberFormat& format) {
+    for (const std::size_t column : branchColumns) {
+        appendReal(row, metrics[column], format);
+    }
 }
 
 }  // namespace quarzel

@@ -4,6 +4,7 @@
 #include <cstdint>
 #include <string>
 
+#include "engine/t8.hpp"
 #include "fixed/number_format.hpp"
 
 /// Columns of the trace tables, appended to a row. Their text depends on nothing but the values: neither on a
@@ -15,5 +16,15 @@ void appendStep(std::string& row, std::uint32_t step);
 
 /// A word as the real number it stands for, with its sign and 6 decimals, left-aligned in 12 characters.
 void appendReal(std::string& row, std::int16_t word, const TNumberFormat& format);
+
+/// A marker, "*" when the word differs from its partner and a blank when it does not, and then the word as a
+/// real number. Words may differ in bits that the format does not print.
+void appendMarkedReal(std::string& row, std::int16_t word, std::int16_t partner, const TNumberFormat& format);
+
+/// The eight state metrics of a step as real numbers.
+void appendStateMetrics(std::string& row, const T8& metrics, const TNumberFormat& format);
+
+/// The four branch metrics of a step as real numbers, in the order of the tables' columns g4 to g7.
+void appendBranchMetrics(std::string& row, const T8& metrics, const TNumberFormat& format);
 
 }  // namespace quarzel
