@@ -58,7 +58,7 @@ bool TDecoder3GPU::allocate(unsigned blockSize) {
     if (!TDecoder3G::allocate(blockSize)) {
         return false;
     }
-    if (blockSize != itsCutSize) {
+    if (itsCutSize == 0 || blockSize != itsCutSize) {
         itsCutSize = 0;
         const std::uint32_t K = blockSize > tailSteps ? blockSize - tailSteps : 0;
         itsNT = quarzel::threadSegments(K, itsNumPU * itsNumThreads);

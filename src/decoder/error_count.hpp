@@ -14,7 +14,7 @@ namespace quarzel {
 template <class Value, class Decide>
 unsigned long long countErrors(const std::vector<unsigned char>& reference, const std::vector<Value>& values,
                                Decide decide) {
-    const auto [shorter, longer] = std::minmax(reference.size(), values.size());
+    const auto [shorter, longer] = std::minmax({reference.size(), values.size()});
     unsigned long long errors = longer - shorter;
     for (std::size_t i = 0; i < shorter; ++i) {
         errors += (reference[i] != 0) != decide(values[i]) ? 1 : 0;

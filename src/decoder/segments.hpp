@@ -14,7 +14,7 @@ namespace quarzel {
 struct ABSegment {
     std::uint32_t from;  ///< the step where the recursion starts
     std::uint32_t to;    ///< where it ends. Forward: the first step of the next segment. Backward: the step
-                       ///< just below the window, or 0 for the window that starts at step 0
+                         ///< just below the window, or 0 for the window that starts at step 0
 };
 
 /// "[" from "," to ")".

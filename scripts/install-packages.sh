@@ -1,0 +1,44 @@
+#!/usr/bin/env bash
+# SPDX-License-Identifier: MIT
+# Install the packages of a purpose that are missing: install-packages.sh demo|test. Works as root, or as a user
+# with sudo; says what it installs.
+set -euo pipefail
+list=$(dirname "$0")/../packages.txt
+case "${1:-}" in
+demo) purposes=demo ;;
+test) purposes='demo|test' ;;
+*)
+    echo "usage: install-packages.sh demo|test" >&2
+    exit 2
+    ;;
+esac
+
+missing=()
+for package in $(awk -v purposes="^($purposes)\$" '$1 ~ purposes { print $2 }' "$list"); do
+    if [ "$(dpkg-query -W -f '${db:Status-Status}' "$package" 2>/dev/null)" != installed ]; then
+        missing+=("$package")
+    fi
+done
+if [ ${#missing[@]} -eq 0 ]; then
+    exit 0
+fi
+
+echo "Installing from Debian: ${missing[*]}"
+as_root=()
+if [ "$(id -u)" -ne 0 ]; then
+    if ! command -v sudo >/dev/null; then
+        echo "Please run as root: apt-get install ${missing[*]}" >&2
+        exit 1
+    fi
+    as_root=(sudo)
+fi
+log=$(mktemp)
+trap 'rm -f "$log"' EXIT
+install() {
+    "${as_root[@]}" env DEBIAN_FRONTEND=noninteractive \
+        sh -c 'apt-get update && apt-get install -y --no-install-recommends "$@"' sh "${missing[@]}"
+}
+if ! install >"$log" 2>&1; then
+    cat "$log" >&2
+    exit 1
+fi
