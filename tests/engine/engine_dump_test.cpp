@@ -1,9 +1,7 @@
 // SPDX-License-Identifier: MIT
-#include "engine/engine_dump.hpp"
-
+// The text of the tables, to the last blank.
 #include <gtest/gtest.h>
 
-#include <algorithm>
 #include <cstdint>
 #include <iomanip>
 #include <locale>
@@ -11,108 +9,11 @@
 #include <string>
 #include <vector>
 
+#include "engine/dump_tables.hpp"
 #include "support/locale_guard.hpp"
-#include "support/random.hpp"
 
 namespace quarzel::test {
 namespace {
-
-const std::string gammaHeader =
-    "n    intrinsic   parity0     parity1        g1[0]        g1[1]        g1[2]        g1[3]          g2[0] "
-    "  "
-    "     g2[1]        g2[2]        g2[3]\n";
-
-const std::string alphaBetaHeader =
-    "n    g4          g5          g6          g7             ab1[0]       ab1[1]       ab1[2]       ab1[3]   "
-    "  "
-    "  ab1[4]       ab1[5]       ab1[6]       ab1[7]         ab2[0]       ab2[1]       ab2[2]       ab2[3]   "
-    "  "
-    "  ab2[4]       ab2[5]       ab2[6]       ab2[7]\n";
-
-const std::string extrinsicHeader =
-    "n    a[0]        a[1]        a[2]        a[3]        a[4]        a[5]        a[6]        a[7]          "
-    "b[0"
-    "]        b[1]        b[2]        b[3]        b[4]        b[5]        b[6]        b[7]          g[4]     "
-    "  "
-    " g[5]        g[6]        g[7]           e1           e2\n";
-
-/// Words in units of 1/128, of which the format below keeps steps of 1/8.
-const TNumberFormat stateFormat(12, 3);
-
-/// The working arrays of an engine, everything zero at first.
-struct Arrays {
-    explicit Arrays(std::size_t n)
-        : alpha(n),
-          beta(n),
-          gamma(n),
-          gamma2(n),
-          intrinsic(n),
-          parity0(n),
-          parity1(n),
-          extrinsic(n),
-          extrinsic2(n) {}
-
-    std::vector<T8> alpha;
-    std::vector<T8> beta;  ///< also the second array of a pair with alpha
-    std::vector<T8> gamma;
-    std::vector<T8> gamma2;
-    std::vector<short> intrinsic;
-    std::vector<short> parity0;
-    std::vector<short> parity1;
-    std::vector<short> extrinsic;
-    std::vector<short> extrinsic2;
-};
-
-Arrays randomArrays(std::mt19937& random, std::size_t n) {
-    Arrays arrays(n);
-    arrays.alpha = randomRecords(random, n);
-    arrays.beta = randomRecords(random, n);
-    arrays.gamma = randomRecords(random, n);
-    arrays.gamma2 = randomRecords(random, n);
-    arrays.intrinsic = randomWords(random, n);
-    arrays.parity0 = randomWords(random, n);
-    arrays.parity1 = randomWords(random, n);
-    arrays.extrinsic = randomWords(random, n);
-    arrays.extrinsic2 = randomWords(random, n);
-    return arrays;
-}
-
-/// One of the three tables, in a form common to all.
-using Table = std::ostream& (*)(std::ostream&, const Arrays&, const TNumberFormat&);
-
-std::ostream& gammaTable(std::ostream& stream, const Arrays& arrays, const TNumberFormat& format) {
-    return dumpGamma(stream, static_cast<unsigned>(arrays.gamma.size()), arrays.intrinsic.data(),
-                     arrays.parity0.data(), arrays.parity1.data(), arrays.gamma.data(), arrays.gamma2.data(),
-                     &format);
-}
-
-std::ostream& alphaBetaTable(std::ostream& stream, const Arrays& arrays, const TNumberFormat& format) {
-    return dumpAlphaBeta(stream, static_cast<unsigned>(arrays.gamma.size()), arrays.gamma.data(),
-                         arrays.alpha.data(), arrays.beta.data(), &format);
-}
-
-std::ostream& extrinsicTable(std::ostream& stream, const Arrays& arrays, const TNumberFormat& format) {
-    return dumpExtrinsic(stream, static_cast<unsigned>(arrays.gamma.size()), arrays.alpha.data(),
-                         arrays.beta.data(), arrays.gamma.data(), arrays.extrinsic.data(),
-                         arrays.extrinsic2.data(), &format);
-}
-
-constexpr Table tables[] = {gammaTable, alphaBetaTable, extrinsicTable};
-
-std::string text(Table table, const Arrays& arrays, const TNumberFormat& format = stateFormat) {
-    std::ostringstream stream;
-    EXPECT_EQ(&table(stream, arrays, format), &stream);
-    return stream.str();
-}
-
-std::vector<std::string> lines(const std::string& text) {
-    std::vector<std::string> result;
-    std::istringstream stream(text);
-    for (std::string line; std::getline(stream, line);) {
-        result.push_back(line);
-    }
-    return result;
-}
 
 TEST(EngineDump, WritesTheInputsAndBothArraysOfBranchMetrics) {
     Arrays arrays(2);
@@ -210,116 +111,6 @@ TEST(EngineDump, WritesStepNumbersOfAnyLength) {
     EXPECT_EQ(rows[10000].substr(0, 14), "9999 +0.000000");
     EXPECT_EQ(rows[10001].substr(0, 14), "10000+0.000000");
     EXPECT_EQ(rows[100001].substr(0, 15), "100000+0.000000");
-}
-
-/// Where a column's values begin: below its heading.
-std::size_t column(const std::string& header, const std::string& heading) {
-    const std::size_t position = header.find(heading);
-    EXPECT_NE(position, std::string::npos) << heading;
-    return position;
-}
-
-/// The positions of the markers in the only row of a table.
-std::vector<std::size_t> markers(Table table, const Arrays& arrays) {
-    const std::string row = lines(text(table, arrays))[1];
-    std::vector<std::size_t> positions;
-    for (std::size_t i = 0; i < row.size(); ++i) {
-        if (row[i] == '*') {
-            positions.push_back(i);
-        }
-    }
-    return positions;
-}
-
-std::string heading(const char* name, std::size_t element) {
-    return std::string(name) + "[" + std::to_string(element) + "]";
-}
-
-using Positions = std::vector<std::size_t>;
-
-TEST(EngineDump, MarksAPairOfBranchMetricsThatDiffer) {
-    for (std::size_t i = 0; i < 4; ++i) {
-        Arrays arrays(1);
-        arrays.gamma[0][i] = 16;
-        EXPECT_EQ(markers(gammaTable, arrays), (Positions{column(gammaHeader, heading("g1", i)) - 1,
-                                                          column(gammaHeader, heading("g2", i)) - 1}));
-    }
-}
-
-TEST(EngineDump, MarksAPairOfStateMetricsThatDiffer) {
-    for (std::size_t i = 0; i < 8; ++i) {
-        Arrays arrays(1);
-        arrays.beta[0][i] = 16;
-        EXPECT_EQ(markers(alphaBetaTable, arrays),
-                  (Positions{column(alphaBetaHeader, heading("ab1", i)) - 1,
-                             column(alphaBetaHeader, heading("ab2", i)) - 1}));
-    }
-}
-
-TEST(EngineDump, MarksAPairOfExtrinsicValuesThatDiffer) {
-    Arrays arrays(1);
-    arrays.extrinsic2[0] = 16;
-    EXPECT_EQ(markers(extrinsicTable, arrays),
-              (Positions{column(extrinsicHeader, "e1") - 1, column(extrinsicHeader, "e2") + 1}));
-}
-
-TEST(EngineDump, MarksWordsThatDifferInBitsThatAreNotPrinted) {
-    Arrays arrays(1);
-    arrays.gamma[0][0] = 1;
-    EXPECT_EQ(markers(gammaTable, arrays),
-              (Positions{column(gammaHeader, "g1[0]") - 1, column(gammaHeader, "g2[0]") - 1}));
-}
-
-TEST(EngineDump, MarksNothingInEqualArrays) {
-    std::mt19937 random = seededRandom();
-    Arrays arrays = randomArrays(random, 50);
-    arrays.gamma2 = arrays.gamma;
-    arrays.beta = arrays.alpha;
-    arrays.extrinsic2 = arrays.extrinsic;
-    for (const Table table : tables) {
-        EXPECT_EQ(text(table, arrays).find('*'), std::string::npos);
-    }
-}
-
-TEST(EngineDump, MarksNothingButThePairs) {
-    std::mt19937 random = seededRandom();
-    Arrays arrays = randomArrays(random, 50);
-    arrays.extrinsic2 = arrays.extrinsic;
-    EXPECT_EQ(text(extrinsicTable, arrays).find('*'), std::string::npos);
-
-    for (std::size_t k = 0; k < 50; ++k) {
-        std::copy_n(arrays.gamma[k].element, 4, arrays.gamma2[k].element);
-    }
-    EXPECT_EQ(text(gammaTable, arrays).find('*'), std::string::npos);
-}
-
-/// Whether every heading of a table has a value of its only row below it, `shift` places to the right.
-void expectAligned(Table table, const std::string& header, const std::vector<std::string>& headings,
-                   std::size_t shift = 0) {
-    const std::string row = lines(text(table, Arrays(1)))[1];
-    for (const std::string& name : headings) {
-        EXPECT_EQ(row.substr(column(header, name) + shift, 12), "+0.000000   ") << name;
-    }
-}
-
-TEST(EngineDump, PutsValuesBelowTheirHeadings) {
-    std::vector<std::string> gammaHeadings = {"intrinsic", "parity0", "parity1"};
-    std::vector<std::string> alphaBetaHeadings = {"g4", "g5", "g6", "g7"};
-    std::vector<std::string> extrinsicHeadings = {"g[4]", "g[5]", "g[6]", "g[7]", "e1"};
-    for (std::size_t i = 0; i < 8; ++i) {
-        if (i < 4) {
-            gammaHeadings.insert(gammaHeadings.end(), {heading("g1", i), heading("g2", i)});
-        }
-        alphaBetaHeadings.insert(alphaBetaHeadings.end(), {heading("ab1", i), heading("ab2", i)});
-        extrinsicHeadings.insert(extrinsicHeadings.end(), {heading("a", i), heading("b", i)});
-    }
-    expectAligned(gammaTable, gammaHeader, gammaHeadings);
-    expectAligned(alphaBetaTable, alphaBetaHeader, alphaBetaHeadings);
-    expectAligned(extrinsicTable, extrinsicHeader, extrinsicHeadings);
-}
-
-TEST(EngineDump, PutsTheLastExtrinsicValueTwoPlacesRightOfItsHeading) {
-    expectAligned(extrinsicTable, extrinsicHeader, {"e2"}, 2);
 }
 
 TEST(EngineDump, NeitherFollowsNorChangesTheSettingsOfTheStream) {
