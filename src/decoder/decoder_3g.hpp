@@ -4,6 +4,7 @@
 #include <array>
 
 #include "decoder/decoder.hpp"
+#include "decoder/trace_columns.hpp"
 
 /// The 3GPP turbo decoder with one processing unit: the literal course of a decode, one operation after the
 /// other. Its pass structure is that of the parallel decoder too.
@@ -38,6 +39,13 @@ class TDecoder3G : public TDecoder {
 
     /// A table of every value of the pass, one row per trellis step, as real numbers.
     void dumpFull(std::ostream& stream, unsigned siso) override;
+
+    /// The streams of the block that `extract` has just taken apart, one line each. `extract` calls it for
+    /// the standard output stream while dumps are pending.
+    virtual void dumpInput(std::ostream& stream) const;
+
+    /// What the trace shows of a step; trace_columns.hpp names the entries.
+    quarzel::TraceRow traceRow(unsigned step) const;
 
     /// @name The operations of a pass, in their order. Each returns false to end the decode
     /// @{
@@ -91,5 +99,4 @@ class TDecoder3G : public TDecoder {
   private:
     bool calcIteration(unsigned iteration);
     bool startExtrinsic();
-    void dumpInput() const;
 };

@@ -1,5 +1,6 @@
 // SPDX-License-Identifier: MIT
-#include <iostream>
+#include <algorithm>
+#include <iterator>
 #include <string>
 
 #include "decoder/decoder_3g.hpp"
@@ -7,7 +8,6 @@
 #include "engine/engine.hpp"
 #include "fixed/text_output.hpp"
 
-using quarzel::appendReal;
 using quarzel::writeText;
 
 namespace {
@@ -30,35 +30,46 @@ std::string inputLine(const char* label, const std::vector<short>& values) {
 
 }  // namespace
 
-void TDecoder3G::dumpInput() const {
-    writeText(std::cout, std::string(120, '-') + "\n" +               //
-                             inputLine("itsSys [0]=[", itsSys[0]) +   //
-                             inputLine("itsPar0[0]=[", itsPar0[0]) +  //
-                             inputLine("itsPar1[0]=[", itsPar1[0]) +  //
-                             inputLine("itsSys [1]=[", itsSys[1]) +   //
-                             inputLine("itsPar0[1]=[", itsPar0[1]) +  //
-                             inputLine("itsPar1[1]=[", itsPar1[1]));
+void TDecoder3G::dumpInput(std::ostream& stream) const {
+    writeText(stream, std::string(120, '-') + "\n" +               //
+                          inputLine("itsSys [0]=[", itsSys[0]) +   //
+                          inputLine("itsPar0[0]=[", itsPar0[0]) +  //
+                          inputLine("itsPar1[0]=[", itsPar1[0]) +  //
+                          inputLine("itsSys [1]=[", itsSys[1]) +   //
+                          inputLine("itsPar0[1]=[", itsPar0[1]) +  //
+                          inputLine("itsPar1[1]=[", itsPar1[1]));
+}
+
+quarzel::TraceRow TDecoder3G::traceRow(unsigned step) const {
+    quarzel::TraceRow row{};
+    auto next = row.begin();
+    *next++ = itsIntrinsic[step];
+    next = std::copy(std::begin(itsAlpha[step].element), std::end(itsAlpha[step].element), next);
+    next = std::copy(std::begin(itsBeta[step].element), std::end(itsBeta[step].element), next);
+    for (const std::size_t element : quarzel::branchColumns) {
+        *next++ = itsGamma[step][element];
+    }
+    *next++ = itsLLR[step];
+    *next = itsExtrinsic[step];
+    return row;
 }
 
 void TDecoder3G::dumpFull(std::ostream& stream, unsigned siso) {
     const TNumberFormat& format = *itsEngine->stateFormat();
-    std::string row = std::string(289, '-') + "\ndecode=" + std::to_string(itsDecodeCount) +
-                      " siso=" + std::to_string(siso) + "\n" + passHeader;
-    writeText(stream, row);
+    writeText(stream, std::string(289, '-') + "\ndecode=" + std::to_string(itsDecodeCount) +
+                          " siso=" + std::to_string(siso) + "\n" + passHeader);
+    std::string text;
     for (std::uint32_t step = 0; step < itsBlockSize; ++step) {
-        row.clear();
-        quarzel::appendStep(row, step);
-        appendReal(row, itsIntrinsic[step], format);
-        row += "  ";
-        quarzel::appendStateMetrics(row, itsAlpha[step], format);
-        row += "  ";
-        quarzel::appendStateMetrics(row, itsBeta[step], format);
-        row += "  ";
-        quarzel::appendBranchMetrics(row, itsGamma[step], format);
-        row += "  ";
-        appendReal(row, itsLLR[step], format);
-        appendReal(row, itsExtrinsic[step], format);
-        row += '\n';
-        writeText(stream, row);
+        const quarzel::TraceRow row = traceRow(step);
+        text.clear();
+        quarzel::appendStep(text, step);
+        for (std::size_t column = 0; column < row.size(); ++column) {
+            if (quarzel::traceColumns[column].firstOfGroup) {
+                text += "  ";
+            }
+            quarzel::appendReal(text, row[column], format);
+        }
+        text += '\n';
+        writeText(stream, text);
     }
 }

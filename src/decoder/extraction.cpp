@@ -53,7 +53,7 @@ bool TDecoder3G::extract(const std::vector<short>& soft) {
         }
     }
     if (itsDumpCount != 0) {
-        dumpInput();
+        dumpInput(std::cout);
     }
     return true;
 }

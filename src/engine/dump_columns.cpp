@@ -7,9 +7,6 @@ namespace quarzel {
 
 namespace {
 
-/// The elements of a branch-metric record in the columns g4 to g7.
-constexpr std::size_t branchColumns[] = {2, 1, 3, 0};
-
 /// Pad with blanks what `row` holds from `start` on.
 void pad(std::string& row, std::size_t start, std::size_t width) {
     if (row.size() < start + width) {

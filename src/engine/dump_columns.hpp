@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: MIT
 #pragma once
 
+#include <cstddef>
 #include <cstdint>
 #include <string>
 
@@ -24,7 +25,10 @@ void appendMarkedReal(std::string& row, std::int16_t word, std::int16_t partner,
 /// The eight state metrics of a step as real numbers.
 void appendStateMetrics(std::string& row, const T8& metrics, const TNumberFormat& format);
 
-/// The four branch metrics of a step as real numbers, in the order of the tables' columns g4 to g7.
+/// The elements of a branch-metric record in the columns g4 to g7 of every table.
+inline constexpr std::size_t branchColumns[] = {2, 1, 3, 0};
+
+/// The four branch metrics of a step as real numbers, in that order.
 void appendBranchMetrics(std::string& row, const T8& metrics, const TNumberFormat& format);
 
 }  // namespace quarzel

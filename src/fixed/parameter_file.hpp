@@ -5,6 +5,8 @@
 #include <map>
 #include <string>
 
+#pragma GCC visibility push(default)  // the shared library offers these functions
+
 /// Read parameter lines "key = value" into a map.
 ///
 /// "//" and "#" begin a comment that reaches to the end of its line. The key is what stands before the first
@@ -15,8 +17,7 @@
 /// @param stream      lines ended by line feeds, read to the end of the stream; the last one may lack its own
 /// @param parameters  the map. A value that is there already is replaced
 /// @param addKeys     whether keys that the map lacks are added to it. If not, each line with such a key is
-/// an
-///                    error, and the lines after it are read all the same
+///                    an error, and the lines after it are read all the same
 /// @return            true when no line was an error. Each error is a line on the standard error stream, with
 ///                    a line number that counts all lines of the stream from 1:
 ///
@@ -30,3 +31,5 @@ bool parse(std::istream& stream, std::map<std::string, std::string>& parameters,
 ///
 ///   ERROR:Could not open input file 'fileName'
 bool parse(const std::string& fileName, std::map<std::string, std::string>& parameters, bool addKeys);
+
+#pragma GCC visibility pop

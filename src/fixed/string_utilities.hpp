@@ -4,6 +4,8 @@
 #include <string>
 #include <vector>
 
+#pragma GCC visibility push(default)  // the shared library offers these functions
+
 /// Text helpers around the model's property strings and parameter files. Characters are bytes and letters are
 /// those of ASCII: no locale is asked. None of these functions fails or writes anything.
 
@@ -42,3 +44,5 @@ bool nocase_compare(const std::string& x, const std::string& y);
 
 /// Whether two characters are equal but for the case of the letters A to Z.
 bool nocase_compare(char x, char y);
+
+#pragma GCC visibility pop

@@ -4,6 +4,8 @@
 #include <cstdint>
 #include <string>
 
+#pragma GCC visibility push(default)  // the shared library offers these functions
+
 /// Numbers and durations as text with a unit. No locale is asked: the decimal point is a point and digits are
 /// never grouped. A plain `int` converts equally well to several of the types below, so give a literal its
 /// type: `toSIString(1500.0, 2)`, `timeToString(90U)`.
@@ -53,3 +55,5 @@ std::string timeToString(long seconds);
 /// @return      the seconds, truncated toward zero and kept to their low 32 bits. 0 when they do not fit into
 ///              64 bits or the text begins with no number
 std::uint32_t stringToTime(const std::string& text);
+
+#pragma GCC visibility pop
