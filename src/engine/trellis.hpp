@@ -14,30 +14,30 @@ namespace quarzel::trellis {
 inline constexpr std::size_t states = 8;
 
 /// Target of the + branch of each state.
-inline constexpr std::array<std::size_t, states> plusTarget = {4, 0, 1, 5, 6, 2, 3, 7};
+inline constexpr std::size_t plusTarget[states] = {4, 0, 1, 5, 6, 2, 3, 7};
 
-/// Target of the - branch: the other of the two.
-constexpr std::size_t minusTarget(std::size_t state) {
-    return plusTarget[state] ^ 4U;
-}
+/// Where the branches of each state lead and come from, all told by the table above.
+struct Links {
+    std::size_t plusTarget[states];    ///< target of the + branch
+    std::size_t minusTarget[states];   ///< target of the - branch: the other of the two
+    std::size_t plusSource[states];    ///< the state whose + branch arrives here
+    std::size_t minusSource[states];   ///< the state whose - branch arrives here
+    std::size_t branchMetric[states];  ///< index of the metric that both branches of a state carry
+};
 
-/// Index of the branch metric that both branches of a state carry.
-constexpr std::size_t branchMetric(std::size_t state) {
-    return state / 2;
-}
-
-/// The state whose + branch arrives at `state`.
-constexpr std::size_t plusSource(std::size_t state) {
-    std::size_t source = 0;
-    while (plusTarget[source] != state) {
-        ++source;
+constexpr Links makeLinks() {
+    Links links{};
+    for (std::size_t state = 0; state < states; ++state) {
+        const std::size_t plus = plusTarget[state];
+        links.plusTarget[state] = plus;
+        links.minusTarget[state] = plus ^ 4U;
+        links.plusSource[plus] = state;
+        links.minusSource[plus ^ 4U] = state;
+        links.branchMetric[state] = state / 2;
     }
-    return source;
+    return links;
 }
 
-/// The state whose - branch arrives at `state`: the two sources of a state differ in their lowest bit.
-constexpr std::size_t minusSource(std::size_t state) {
-    return plusSource(state) ^ 1U;
-}
+inline constexpr Links links = makeLinks();
 
 }  // namespace quarzel::trellis

@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: MIT
 #include "fixed/number_format.hpp"
 
+#include <limits>
 #include <locale>
 #include <ostream>
 #include <sstream>
@@ -33,11 +34,13 @@ TNumberFormat* TNumberFormat::create(const std::string& properties) {
     const auto [head, rest] = splitString(properties, "_");
     std::istringstream stream(rest);
     stream.imbue(std::locale::classic());
-    std::uint32_t nbits = 0;
-    std::uint32_t binpt = 0;
+    // Signed and wider than the fields, so that a negative number does not wrap into their range.
+    std::int64_t nbits = 0;
+    std::int64_t binpt = 0;
+    constexpr std::int64_t most = std::numeric_limits<std::uint32_t>::max();
     char separator = '\0';
     stream >> nbits >> separator >> binpt;
-    if (head != "Fix" || stream.fail() || separator != '_') {
+    if (head != "Fix" || stream.fail() || separator != '_' || nbits > most || binpt > most) {
         errorLine("ERROR:TNumberFormat:Unexpected property string:" + properties);
         return nullptr;
     }
@@ -49,7 +52,7 @@ TNumberFormat* TNumberFormat::create(const std::string& properties) {
         errorLine("ERROR:TNumberFormat:binpt must be in range [1:16] and <nbits");
         return nullptr;
     }
-    return new TNumberFormat(nbits, binpt);
+    return new TNumberFormat(static_cast<std::uint32_t>(nbits), static_cast<std::uint32_t>(binpt));
 }
 
 std::string TNumberFormat::getProperties() const {

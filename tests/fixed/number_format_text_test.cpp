@@ -126,7 +126,8 @@ TEST(NumberFormatText, IsEchoedWhenItHasAnotherShape) {
 }
 
 TEST(NumberFormatText, IsRefusedWithALineForNegativeNumbers) {
-    for (const std::string properties : {"Fix_-6_2", "Fix_6_-2", "Fix_-6_-2"}) {
+    for (const std::string properties :
+         {"Fix_-6_2", "Fix_6_-2", "Fix_-6_-2", "Fix_-4294967290_2", "Fix_6_-4294967294"}) {
         const std::string line = refusal(properties);
         EXPECT_TRUE(line == widthLine || line == binaryPointLine || line == unexpectedLine(properties))
             << line;
