@@ -7,6 +7,7 @@
  *   1. vardel_ip_quarzel_get_default_generics   fill a record that describes the core
  *   2. vardel_ip_quarzel_create_state           make a model of that core
  *   3. vardel_ip_quarzel_bitacc_simulate        decode one code block; call it as often as needed
+ *      vardel_ip_quarzel_bitacc_simulate_batch  decode many code blocks, faster
  *      vardel_ip_quarzel_bitacc_dump_config     (C++ or GNU C) print a trace of the next passes
  *   4. vardel_ip_quarzel_destroy_state          free the model
  *
@@ -147,6 +148,28 @@ VARDEL_IP_QUARZEL_API vardel_ip_quarzel_state* vardel_ip_quarzel_create_state(
 VARDEL_IP_QUARZEL_API int vardel_ip_quarzel_bitacc_simulate(vardel_ip_quarzel_state* state,
                                                             vardel_ip_quarzel_outputs* outputs,
                                                             vardel_ip_quarzel_inputs inputs);
+
+/**
+ * Decode many code blocks: the effect of `count` calls of vardel_ip_quarzel_bitacc_simulate in their order,
+ * to the last bit, status, message and warning. Blocks of equal length and iterations are decoded together,
+ * however they are mixed, which is faster than a call for each. A failing block spoils no other.
+ *
+ * @param state     the model
+ * @param outputs   `count` records, each as for simulate
+ * @param inputs    `count` records, each as for simulate
+ * @param count     blocks, 0 or more
+ * @param statuses  receives the `count` statuses; may be null
+ * @return          the first status that is not 0, or 0. Also 1, with nothing done, after one of
+ *
+ *   ERROR:decoder:Simulate batch called with null state structure
+ *   ERROR:decoder:count must not be negative
+ *   ERROR:decoder:Simulate batch called with null output structures
+ *   ERROR:decoder:Simulate batch called with null input structures
+ */
+VARDEL_IP_QUARZEL_API int vardel_ip_quarzel_bitacc_simulate_batch(vardel_ip_quarzel_state* state,
+                                                                  vardel_ip_quarzel_outputs* outputs,
+                                                                  const vardel_ip_quarzel_inputs* inputs,
+                                                                  int count, int* statuses);
 
 /** Free a model and all it owns. Null is allowed and does nothing. */
 VARDEL_IP_QUARZEL_API void vardel_ip_quarzel_destroy_state(vardel_ip_quarzel_state* state);

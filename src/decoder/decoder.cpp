@@ -25,7 +25,7 @@ std::vector<std::string> TDecoder::getNames() {
     return {"3GPPPU"};
 }
 
-bool TDecoder::allocate(unsigned blockSize) {
+void TDecoder::growMetricStore(unsigned blockSize) {
     constexpr std::size_t alignment = 16;
     const std::size_t steps = (std::size_t{blockSize} + 63) / 64 * 64;
     const std::size_t size = 3 * steps * sizeof(T8) + alignment;
@@ -40,6 +40,10 @@ bool TDecoder::allocate(unsigned blockSize) {
         itsBeta = itsAlpha + steps;
         itsGamma = itsBeta + steps;
     }
+}
+
+bool TDecoder::allocate(unsigned blockSize) {
+    growMetricStore(blockSize);
     itsIntrinsic.assign(blockSize, 0);
     itsLLR.assign(blockSize, 0);
     itsExtrinsic.assign(blockSize, 0);
@@ -60,6 +64,13 @@ bool TDecoder::decode(const std::vector<short>& soft, const std::vector<unsigned
     blockErrors.back() += errors != 0 ? 1 : 0;
     return true;
 }
+
+bool TDecoder::takesLanes(unsigned /*K*/) {
+    return false;
+}
+
+void TDecoder::decodeLanes(unsigned /*K*/, unsigned /*iterations*/,
+                           std::span<const quarzel::LaneBlock> /*blocks*/) {}
 
 void TDecoder::dump(std::ostream& /*stream*/) {}
 

@@ -13,6 +13,10 @@
 class TCalculationEngine;
 class TInterleaver;
 
+namespace quarzel {
+struct LaneBlock;
+}
+
 /// A turbo decoder: the work storage of a block, the counters and the trace settings, and two ways to decode.
 ///
 /// Soft values are 16-bit words of the engine's state format, the units of LLRs and extrinsic values too.
@@ -70,6 +74,22 @@ class TDecoder {
     /// @return false when decoding is to stop because the last requested dump has been written
     bool checkDump(unsigned siso);
 
+    /// Take the fast road where it can be taken, by the best instruction set of this machine. Off until
+    /// called: the fast road leaves the work storage as it is, so it is for callers who want decisions alone.
+    /// The base has none.
+    virtual void enableLanes() {}
+
+    /// Decode literally from now on.
+    virtual void disableLanes() {}
+
+    /// Whether `decodeLanes` may be called for blocks of K information bits: the fast road is on, and nothing
+    /// could tell it from a literal decode.
+    virtual bool takesLanes(unsigned K);
+
+    /// Decode blocks of one size, for which `takesLanes` has just held, by the fast road.
+    /// @param iterations  at least 1
+    virtual void decodeLanes(unsigned K, unsigned iterations, std::span<const quarzel::LaneBlock> blocks);
+
     /// Hand the decoder its interleaver and engine. They are not owned and must outlive it.
     void connect(TInterleaver* interleaver, TCalculationEngine* engine) {
         itsInterleaver = interleaver;
@@ -111,6 +131,9 @@ class TDecoder {
 
   protected:
     TDecoder();
+
+    /// Have a metric store for so many trellis steps. A new one is zero; one that is large enough is kept.
+    void growMetricStore(unsigned blockSize);
 
     TInterleaver* itsInterleaver = nullptr;
     TCalculationEngine* itsEngine = nullptr;

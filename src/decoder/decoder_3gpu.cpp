@@ -6,7 +6,9 @@
 #include <optional>
 #include <sstream>
 
+#include "decoder/lane_decode.hpp"
 #include "decoder/segment_trace.hpp"
+#include "decoder/tail_metrics.hpp"
 #include "fixed/text_output.hpp"
 #include "fixed/wrap16.hpp"
 
@@ -23,6 +25,11 @@ T8 toBoundary(T8 metrics) {
 }
 
 }  // namespace
+
+TDecoder3GPU::TDecoder3GPU(bool is3GPP2, unsigned numPU, unsigned numThreads)
+    : TDecoder3G(is3GPP2), itsNumPU(numPU), itsNumThreads(numThreads) {}
+
+TDecoder3GPU::~TDecoder3GPU() = default;
 
 TDecoder3GPU* TDecoder3GPU::create(bool is3GPP2, const std::string& properties) {
     unsigned numPU = 4;
@@ -98,25 +105,14 @@ bool TDecoder3GPU::preCalcBeta(unsigned siso, unsigned step, T8* out) {
 
 bool TDecoder3GPU::preCalcBetaTail(unsigned siso, T8* out) const {
     const unsigned set = inputSet(siso);
-    const unsigned K = itsBlockSize - tailSteps;
-    // Value of a termination step with the signs of its two parities.
-    const auto tail = [&](unsigned step, int parity0, int parity1) {
-        return itsSys[set][K + step] + parity0 * itsPar0[set][K + step] + parity1 * itsPar1[set][K + step];
-    };
-    const std::int32_t T = tail(2, 1, 1);
-    const std::int32_t U2 = tail(1, 1, 1);
-    const std::int32_t V2 = tail(1, -1, 1);
-    const std::int32_t U1 = tail(0, 1, 1);
-    const std::int32_t W1 = tail(0, 1, -1);
-    const std::int32_t V1 = tail(0, -1, 1);
-    const std::int32_t X1 = tail(0, -1, -1);
-    // The sums fit 32 bits, so that one wrap at the end is the wrap of every step.
-    const std::int32_t metrics[8] = {-T - U2 - U1, -T - U2 + U1, U2 - T + V1, U2 - T - V1,
-                                     T + V2 - X1,  T + V2 + X1,  T - V2 + W1, T - V2 - W1};
-    for (unsigned state = 0; state < 8; ++state) {
-        (*out)[state] = quarzel::wrap16(metrics[state]);
+    quarzel::TailValues tail{};
+    for (unsigned step = 0; step < tailSteps; ++step) {
+        const unsigned at = itsBlockSize - tailSteps + step;
+        tail.systematic[step] = itsSys[set][at];
+        tail.parity0[step] = itsPar0[set][at];
+        tail.parity1[step] = itsPar1[set][at];
     }
-    *out = toBoundary(*out);
+    *out = quarzel::tailMetrics(tail);
     return true;
 }
 

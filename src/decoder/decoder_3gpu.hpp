@@ -1,8 +1,19 @@
 // SPDX-License-Identifier: MIT
 #pragma once
 
+#include <functional>
+#include <map>
+#include <memory>
+
 #include "decoder/decoder_3g.hpp"
 #include "decoder/segments.hpp"
+
+namespace quarzel {
+class LaneDecoder;
+namespace lanes {
+struct Candidate;
+}
+}  // namespace quarzel
 
 /// The turbo decoder with parallel processing units.
 ///
@@ -19,8 +30,8 @@ class TDecoder3GPU : public TDecoder3G {
     /// @return a new decoder that the caller deletes, or null after a line on the standard error stream
     static TDecoder3GPU* create(bool is3GPP2, const std::string& properties);
 
-    TDecoder3GPU(bool is3GPP2, unsigned numPU, unsigned numThreads)
-        : TDecoder3G(is3GPP2), itsNumPU(numPU), itsNumThreads(numThreads) {}
+    TDecoder3GPU(bool is3GPP2, unsigned numPU, unsigned numThreads);
+    ~TDecoder3GPU() override;
 
     /// Cut the block as well, and clear all boundary metrics.
     /// @return false, after a line on the standard error stream, when the segments would not be equal
@@ -33,6 +44,18 @@ class TDecoder3GPU : public TDecoder3G {
     bool calcGamma(unsigned siso) override;
     bool calcAlpha(unsigned siso) override;
     bool calcBeta(unsigned siso) override;
+
+    void enableLanes() override;
+    void disableLanes() override;
+
+    /// The same by an instruction set of the caller's choice.
+    void enableLanes(const quarzel::lanes::Candidate& candidate);
+
+    bool takesLanes(unsigned K) override;
+    void decodeLanes(unsigned K, unsigned iterations, std::span<const quarzel::LaneBlock> blocks) override;
+
+    /// Blocks that the fast road decoded are decoded again first, as far as their metrics could show.
+    bool extract(const std::vector<short>& soft) override;
 
     /// Thread segments of the block last allocated.
     unsigned threadCount() const { return itsNT; }
@@ -51,6 +74,10 @@ class TDecoder3GPU : public TDecoder3G {
     /// Start of the block's last window: the backward metrics that the three termination steps give.
     bool preCalcBetaTail(unsigned siso, T8* out) const;
 
+    int laneAlgorithm() const;
+    void rememberLaneBlock(std::uint32_t next);
+    void settleLaneBlocks();
+
     const std::uint32_t itsNumPU;
     const std::uint32_t itsNumThreads;
     std::uint32_t itsNT = 0;  ///< thread segments of the block
@@ -60,4 +87,14 @@ class TDecoder3GPU : public TDecoder3G {
     std::array<std::vector<T8>, 2> itsAlphaInit;  ///< per input set, the start of each forward segment
     std::array<std::vector<T8>, 2> itsBetaInit;   ///< per input set, the start of each backward window
     std::vector<T8> itsBetaWork;                  ///< per thread, the start of its next window
+
+    /// A block of the fast road whose metrics a literal decode would have left in the store.
+    struct LaneRecord {
+        bool live = false;
+        unsigned iterations = 0;
+        std::vector<std::int8_t> soft;
+    };
+    std::unique_ptr<quarzel::LaneDecoder> itsLanes;  ///< null while the fast road is off
+    /// By size, largest first, which is oldest first: a block hides those of its size and below.
+    std::map<std::uint32_t, LaneRecord, std::greater<>> itsLaneRecords;
 };

@@ -21,6 +21,11 @@ class TCalculationEngineModHash : public TCalculationEngineModBase {
     /// @return false, with the engine as it was, when there is no such table
     bool initialise() override;
 
+    std::uint32_t points() const { return itsPoints; }
+
+    /// Whether `initialise` has built the table.
+    bool initialised() const { return !itsLUT.empty(); }
+
   private:
     explicit TCalculationEngineModHash(std::uint32_t points) : itsPoints(points) {}
 

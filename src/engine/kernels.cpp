@@ -59,8 +59,7 @@ template <class Rule>
 T8* betaLoop(unsigned n, const T8* gamma, T8* beta, const Rule& rule) {
     StateMetrics<Rule> metrics = load<Rule>(*beta--);
     for (unsigned step = 1; step < n; ++step) {
-        metrics =
-            quarzel::betaStep(quarzel::backwardCandidates<Rule>(metrics, branchMetrics(*gamma--)), rule);
+        metrics = quarzel::betaStep(metrics, branchMetrics(*gamma--), rule);
         store<Rule>(metrics, *beta--);
     }
     return beta;

@@ -7,6 +7,7 @@
 #include <cstdint>
 
 #include "engine/trellis.hpp"
+#include "fixed/unrolled.hpp"
 #include "fixed/wrap16.hpp"
 
 /// The arithmetic of ONE trellis step. Each function is a template over the rule of the maximum
@@ -39,42 +40,28 @@ template <class Rule>
 constexpr StateMetrics<Rule> alphaStep(const StateMetrics<Rule>& a,
                                        const BranchMetrics<typename Rule::Word>& g, const Rule& rule) {
     StateMetrics<Rule> next{};
-    for (std::size_t state = 0; state < trellis::states; ++state) {
-        const std::size_t plus = trellis::links.plusSource[state];
-        const std::size_t minus = trellis::links.minusSource[state];
+    // The two states that a pair of sources leads to are taken together, so that few values are alive at a
+    // time.
+    unrolled<trellis::states>([&](auto i) {
+        constexpr std::size_t state = i / 2 + 4 * (i % 2);
+        constexpr std::size_t plus = trellis::links.plusSource[state];
+        constexpr std::size_t minus = trellis::links.minusSource[state];
         const auto metric = g[trellis::links.branchMetric[plus]];
         next[state] = rule.larger(Rule::plus(a[plus], metric), Rule::minus(a[minus], metric));
-    }
+    });
     return next;
 }
 
-/// The backward metrics at the ends of the two branches of each state, with the branch metric added: the
-/// candidates of the backward recursion.
+/// Backward recursion: the metrics before a step from those after it.
 template <class Rule>
-struct BackwardCandidates {
-    StateMetrics<Rule> plus;
-    StateMetrics<Rule> minus;
-};
-
-template <class Rule>
-constexpr BackwardCandidates<Rule> backwardCandidates(const StateMetrics<Rule>& b,
-                                                      const BranchMetrics<typename Rule::Word>& g) {
-    BackwardCandidates<Rule> candidates{};
-    for (std::size_t state = 0; state < trellis::states; ++state) {
-        const auto metric = g[trellis::links.branchMetric[state]];
-        candidates.plus[state] = Rule::plus(b[trellis::links.plusTarget[state]], metric);
-        candidates.minus[state] = Rule::minus(b[trellis::links.minusTarget[state]], metric);
-    }
-    return candidates;
-}
-
-/// Backward recursion: the metrics before a step.
-template <class Rule>
-constexpr StateMetrics<Rule> betaStep(const BackwardCandidates<Rule>& candidates, const Rule& rule) {
+constexpr StateMetrics<Rule> betaStep(const StateMetrics<Rule>& b,
+                                      const BranchMetrics<typename Rule::Word>& g, const Rule& rule) {
     StateMetrics<Rule> previous{};
-    for (std::size_t state = 0; state < trellis::states; ++state) {
-        previous[state] = rule.larger(candidates.plus[state], candidates.minus[state]);
-    }
+    unrolled<trellis::states>([&](auto state) {
+        const auto metric = g[trellis::links.branchMetric[state]];
+        previous[state] = rule.larger(Rule::plus(b[trellis::links.plusTarget[state]], metric),
+                                      Rule::minus(b[trellis::links.minusTarget[state]], metric));
+    });
     return previous;
 }
 
@@ -96,9 +83,9 @@ constexpr typename Rule::Word llrStep(const StateWords<typename Rule::Word>& a,
                                       const BranchMetrics<typename Rule::Word>& g, const Rule& rule) {
     std::array<typename Rule::Metric, 4> plus{};
     std::array<typename Rule::Metric, 4> minus{};
-    for (std::size_t pair = 0; pair < 4; ++pair) {
-        const std::size_t even = 2 * pair;
-        const std::size_t odd = even + 1;
+    unrolled<4>([&](auto pair) {
+        constexpr std::size_t even = 2 * pair;
+        constexpr std::size_t odd = even + 1;
         const auto path = [&](std::size_t from, const std::size_t* target) {
             return Rule::load(add(a[from], b[target[from]]));
         };
@@ -107,29 +94,50 @@ constexpr typename Rule::Word llrStep(const StateWords<typename Rule::Word>& a,
         };
         plus[pair] = Rule::plus(larger(trellis::links.plusTarget), g[pair]);
         minus[pair] = Rule::minus(larger(trellis::links.minusTarget), g[pair]);
-    }
+    });
     return sub(bestOfPairs(plus, rule), bestOfPairs(minus, rule));
 }
 
-/// The same ratio from the candidates that the backward recursion has formed already. Adding the branch
-/// metric before the first maximum rather than after it changes neither a wrapped difference nor a wrapped
-/// sum.
-template <class Rule, class BackwardRule>
-constexpr typename Rule::Word llrStep(const StateWords<typename Rule::Word>& a,
-                                      const BackwardCandidates<BackwardRule>& candidates, const Rule& rule) {
-    std::array<typename Rule::Metric, 4> plus{};
-    std::array<typename Rule::Metric, 4> minus{};
-    for (std::size_t pair = 0; pair < 4; ++pair) {
-        const std::size_t even = 2 * pair;
-        const std::size_t odd = even + 1;
-        const auto larger = [&](const StateMetrics<BackwardRule>& ends) {
-            return rule.larger(Rule::load(add(a[odd], BackwardRule::store(ends[odd]))),
-                               Rule::load(add(a[even], BackwardRule::store(ends[even]))));
-        };
-        plus[pair] = larger(candidates.plus);
-        minus[pair] = larger(candidates.minus);
-    }
-    return sub(bestOfPairs(plus, rule), bestOfPairs(minus, rule));
+template <class Rule>
+struct BackwardResult {
+    StateMetrics<Rule> beta;
+    typename Rule::Word llr;
+};
+
+/// Backward recursion and log-likelihood ratio of a step in one: the candidates of the recursion are the ends
+/// of the paths that the ratio compares. Adding the branch metric before the first maximum rather than after
+/// it changes neither a wrapped difference nor a wrapped sum. State pairs are taken one after the other, so
+/// that few values are alive at a time.
+///
+/// @param alpha    gives the word of a state before the step
+/// @param llrRule  the rule of the maxima in the ratio
+template <class Rule, class LlrRule, class Alpha>
+constexpr BackwardResult<Rule> backwardStep(const StateMetrics<Rule>& b,
+                                            const BranchMetrics<typename Rule::Word>& g, const Alpha& alpha,
+                                            const Rule& rule, const LlrRule& llrRule) {
+    BackwardResult<Rule> result{};
+    std::array<typename LlrRule::Metric, 4> plusPairs{};
+    std::array<typename LlrRule::Metric, 4> minusPairs{};
+    unrolled<4>([&](auto pair) {
+        constexpr std::size_t even = 2 * pair;
+        constexpr std::size_t odd = even + 1;
+        const auto& evenEnd = b[trellis::links.plusTarget[even]];  // and the end of the odd state's - branch
+        const auto& oddEnd = b[trellis::links.plusTarget[odd]];
+        const auto evenPlus = Rule::plus(evenEnd, g[pair]);
+        const auto evenMinus = Rule::minus(oddEnd, g[pair]);
+        const auto oddPlus = Rule::plus(oddEnd, g[pair]);
+        const auto oddMinus = Rule::minus(evenEnd, g[pair]);
+        result.beta[even] = rule.larger(evenPlus, evenMinus);
+        result.beta[odd] = rule.larger(oddPlus, oddMinus);
+        const auto evenAlpha = alpha(even);
+        const auto oddAlpha = alpha(odd);
+        plusPairs[pair] = llrRule.larger(LlrRule::load(add(oddAlpha, Rule::store(oddPlus))),
+                                         LlrRule::load(add(evenAlpha, Rule::store(evenPlus))));
+        minusPairs[pair] = llrRule.larger(LlrRule::load(add(oddAlpha, Rule::store(oddMinus))),
+                                          LlrRule::load(add(evenAlpha, Rule::store(evenMinus))));
+    });
+    result.llr = sub(bestOfPairs(plusPairs, llrRule), bestOfPairs(minusPairs, llrRule));
+    return result;
 }
 
 }  // namespace quarzel

@@ -100,6 +100,7 @@ const char* fillState(vardel_ip_quarzel_state& state) {
     }
     state.decoder->connect(state.interleaver, state.engine);
     state.decoder->setExtrinsicScale(algorithm == 1 ? 0.75 : 1.0);
+    state.decoder->enableLanes();
     return nullptr;
 }
 

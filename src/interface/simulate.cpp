@@ -3,15 +3,12 @@
 #include <vector>
 
 #include "decoder/decoder.hpp"
+#include "interface/block_call.hpp"
 #include "interface/messages.hpp"
 #include "interface/soft_input.hpp"
-#include "interface/state.hpp"
 
-using quarzel::decoderError;
+namespace quarzel {
 
-namespace {
-
-/// The text for the first argument that is wrong, or null.
 const char* findFault(const vardel_ip_quarzel_state* state, const vardel_ip_quarzel_outputs* outputs,
                       const vardel_ip_quarzel_inputs& inputs) {
     if (state == nullptr) {
@@ -41,42 +38,106 @@ const char* findFault(const vardel_ip_quarzel_state* state, const vardel_ip_quar
     return nullptr;
 }
 
+void reportSaturation(vardel_ip_quarzel_state& state, const vardel_ip_quarzel_inputs& inputs) {
+    if (state.saturation_reported != 0) {
+        return;
+    }
+    if (const auto saturation = findSaturation(inputs, *state.input_format)) {
+        warnSaturation(*saturation);
+        state.saturation_reported = 1;
+    }
+}
+
+namespace {
+
+/// A negative size counts as boundless: the comparison is unsigned.
+bool hasRoom(const vardel_ip_quarzel_outputs& outputs, std::size_t bits) {
+    return static_cast<std::size_t>(outputs.dout_alloc_size) >= bits;
+}
+
 }  // namespace
 
-int vardel_ip_quarzel_bitacc_simulate(vardel_ip_quarzel_state* state, vardel_ip_quarzel_outputs* outputs,
-                                      vardel_ip_quarzel_inputs inputs) {
-    if (const char* fault = findFault(state, outputs, inputs)) {
-        decoderError(fault);
-        return 1;
-    }
-    std::vector<short> soft;
-    const auto saturation = quarzel::toSoftValues(inputs, *state->input_format, *state->state_format, soft);
-    if (saturation && state->saturation_reported == 0) {
-        quarzel::warnSaturation(*saturation);
-        state->saturation_reported = 1;
-    }
+bool takesLanes(vardel_ip_quarzel_state& state, const vardel_ip_quarzel_outputs& outputs,
+                const vardel_ip_quarzel_inputs& inputs) {
+    return inputs.din_size > 4 && hasRoom(outputs, blockSize(inputs)) &&
+           state.decoder->takesLanes(blockSize(inputs));
+}
 
+void reportTruncation(vardel_ip_quarzel_state& state, const vardel_ip_quarzel_inputs& inputs) {
+    if ((inputs.tag & state.tag_mask) != inputs.tag && state.tag_truncation_reported == 0) {
+        warnTagTruncation(state.generics.C_TAG_WIDTH);
+        state.tag_truncation_reported = 1;
+    }
+}
+
+void fillRecord(const vardel_ip_quarzel_state& state, vardel_ip_quarzel_outputs& outputs,
+                const vardel_ip_quarzel_inputs& inputs, std::size_t bits) {
+    outputs.dout_size = static_cast<int>(bits);
+    outputs.tag = inputs.tag & state.tag_mask;
+}
+
+namespace {
+
+/// Decode a block by the literal road.
+/// @return the status; the outputs are filled when it is 0
+int decodeLiterally(vardel_ip_quarzel_state& state, vardel_ip_quarzel_outputs& outputs,
+                    const vardel_ip_quarzel_inputs& inputs) {
+    std::vector<short> soft;
+    toSoftValues(inputs, *state.input_format, *state.state_format, soft);
     std::vector<unsigned char> hard;
     try {
-        if (!state->decoder->decode(soft, hard, static_cast<unsigned>(inputs.iterations))) {
+        if (!state.decoder->decode(soft, hard, static_cast<unsigned>(inputs.iterations))) {
             return 2;
         }
     } catch (...) {
         decoderError("Unhandled exception has occurred");
         return 99;
     }
-
-    // A negative size counts as boundless: the comparison is unsigned.
-    if (static_cast<std::size_t>(outputs->dout_alloc_size) < hard.size()) {
+    if (!hasRoom(outputs, hard.size())) {
         decoderError("Insufficient allocated space for output array");
         return 1;
     }
-    std::copy(hard.begin(), hard.end(), outputs->dout);
-    outputs->dout_size = static_cast<int>(hard.size());
-    outputs->tag = inputs.tag & state->tag_mask;
-    if (outputs->tag != inputs.tag && state->tag_truncation_reported == 0) {
-        quarzel::warnTagTruncation(state->generics.C_TAG_WIDTH);
-        state->tag_truncation_reported = 1;
+    std::copy(hard.begin(), hard.end(), outputs.dout);
+    fillRecord(state, outputs, inputs, hard.size());
+    return 0;
+}
+
+/// Decode a block by the fast road.
+/// @return whether it was taken
+bool decodeInLanes(vardel_ip_quarzel_state& state, vardel_ip_quarzel_outputs& outputs,
+                   const vardel_ip_quarzel_inputs& inputs) {
+    if (!takesLanes(state, outputs, inputs)) {
+        return false;
     }
+    const LaneBlock block = laneBlock(outputs, inputs);
+    state.decoder->decodeLanes(blockSize(inputs), static_cast<unsigned>(inputs.iterations), {&block, 1});
+    fillRecord(state, outputs, inputs, blockSize(inputs));
+    return true;
+}
+
+}  // namespace
+
+}  // namespace quarzel
+
+int vardel_ip_quarzel_bitacc_simulate(vardel_ip_quarzel_state* state, vardel_ip_quarzel_outputs* outputs,
+                                      vardel_ip_quarzel_inputs inputs) {
+    if (const char* fault = quarzel::findFault(state, outputs, inputs)) {
+        quarzel::decoderError(fault);
+        return 1;
+    }
+    quarzel::reportSaturation(*state, inputs);
+    bool decoded = false;
+    try {
+        decoded = quarzel::decodeInLanes(*state, *outputs, inputs);
+    } catch (...) {
+        quarzel::decoderError("Unhandled exception has occurred");
+        return 99;
+    }
+    if (!decoded) {
+        if (const int status = quarzel::decodeLiterally(*state, *outputs, inputs)) {
+            return status;
+        }
+    }
+    quarzel::reportTruncation(*state, inputs);
     return 0;
 }

@@ -43,8 +43,10 @@ constexpr short toSoftValue(int value, const TNumberFormat& input, const TNumber
 /// Convert a block: position by position systematic, parity 1, parity 2.
 ///
 /// @param soft  receives 3 * din_size words of the state format
-/// @return      the first value that was saturated, if any was
-std::optional<Saturation> toSoftValues(const vardel_ip_quarzel_inputs& inputs, const TNumberFormat& input,
-                                       const TNumberFormat& state, std::vector<short>& soft);
+void toSoftValues(const vardel_ip_quarzel_inputs& inputs, const TNumberFormat& input,
+                  const TNumberFormat& state, std::vector<short>& soft);
+
+/// The first value of a block that the conversion saturates, in position order.
+std::optional<Saturation> findSaturation(const vardel_ip_quarzel_inputs& inputs, const TNumberFormat& input);
 
 }  // namespace quarzel

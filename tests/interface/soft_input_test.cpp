@@ -65,14 +65,16 @@ TEST(SoftInput, OtherFormatsAreRequantisedToTheStateFormat) {
 TEST(SoftInput, PositionsInterleaveTheThreeStreams) {
     const Block block({1, 2, 3}, {4, 5, 6}, {7, 8, 9}, 1, 0);
     std::vector<short> soft;
-    EXPECT_FALSE(toSoftValues(block.inputs(), inputFormat, stateFormat, soft));
+    toSoftValues(block.inputs(), inputFormat, stateFormat, soft);
+    EXPECT_FALSE(findSaturation(block.inputs(), inputFormat));
     EXPECT_EQ(soft, (std::vector<short>{16, 64, 112, 32, 80, 128, 48, 96, 144}));
 }
 
 TEST(SoftInput, TellsTheFirstSaturatedValueInPositionOrder) {
     const Block block({1, 2, -500}, {4, 5, 6}, {7, 300, 9}, 1, 0);
     std::vector<short> soft;
-    const auto first = toSoftValues(block.inputs(), inputFormat, stateFormat, soft);
+    toSoftValues(block.inputs(), inputFormat, stateFormat, soft);
+    const auto first = findSaturation(block.inputs(), inputFormat);
     ASSERT_TRUE(first);
     EXPECT_EQ(first->position, 1);
     EXPECT_EQ(first->stream, 2U);

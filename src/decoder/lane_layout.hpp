@@ -1,0 +1,61 @@
+// SPDX-License-Identifier: MIT
+#pragma once
+
+#include <cstdint>
+#include <optional>
+#include <vector>
+
+#include "engine/lanes/lane_group.hpp"
+
+namespace quarzel {
+
+/// The distinct shuffles of all layouts of a decoder.
+class ShuffleSet {
+  public:
+    /// The index of a shuffle, which is added when it is new.
+    std::uint16_t indexOf(const lanes::Shuffle& shuffle);
+
+    const lanes::Shuffle* data() const { return itsShuffles.data(); }
+
+  private:
+    std::vector<lanes::Shuffle> itsShuffles;
+};
+
+/// How the lanes of a block size are laid out, and how the permutation between the codes moves them.
+struct LaneLayout {
+    /// For each row of a code, where its lanes are found in the rows of the other code.
+    struct Sources {
+        std::vector<std::uint16_t> row;
+        std::vector<lanes::OctetSource> octets;
+    };
+
+    std::uint32_t K;
+    std::uint32_t segments;  ///< thread segments of a block
+    std::uint32_t steps;     ///< trellis steps of a segment
+    std::vector<std::uint16_t> windowLength;
+    Sources natural;
+    Sources interleaved;
+
+    std::uint32_t octets() const { return segments >= lanes::octetLanes ? segments / lanes::octetLanes : 1; }
+    std::uint32_t blocksPerBundle() const {
+        return segments >= lanes::octetLanes ? 1 : lanes::octetLanes / segments;
+    }
+    /// The segment in a lane of an octet, and the block of the bundle that it belongs to.
+    std::uint32_t segmentOf(std::uint32_t octet, std::uint32_t lane) const {
+        return segments >= lanes::octetLanes ? lane * octets() + octet : lane % segments;
+    }
+    std::uint32_t blockOf(std::uint32_t lane) const {
+        return segments >= lanes::octetLanes ? 0 : lane / segments;
+    }
+};
+
+/// Lay out a block size.
+///
+/// @param permutation  of K entries: the natural position read at each interleaved one
+/// @param segments     thread segments, a power of two that divides K
+/// @return nothing when the permutation does not keep the rows and octets of such a layout. A quadratic
+///         permutation polynomial keeps them.
+std::optional<LaneLayout> makeLaneLayout(const std::vector<std::uint32_t>& permutation,
+                                         std::uint32_t segments, ShuffleSet& shuffles);
+
+}  // namespace quarzel

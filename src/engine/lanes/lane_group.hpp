@@ -1,0 +1,94 @@
+// SPDX-License-Identifier: MIT
+#pragma once
+
+#include <cstddef>
+#include <cstdint>
+
+/// A group of code blocks of one size, laid out for decoding with every thread segment of every block in a
+/// lane of its own. Plain data only: the files of the instruction sets include it.
+///
+/// Row t holds trellis step t of every segment. Lanes come in octets, eight 16-bit words each; the
+/// permutation between the codes moves whole octets and shuffles lanes inside them, never across.
+///
+/// - A block with 8 or more segments takes segments / 8 octets: segment i is lane i / octets of octet i
+/// modulo
+///   octets. A bundle is one such block.
+/// - With fewer segments, a bundle is an octet that holds 8 / segments blocks side by side.
+///
+/// Octet o of bundle b starts at lane 8 * (o * bundles + b) of a row.
+namespace quarzel::lanes {
+
+inline constexpr std::size_t octetLanes = 8;
+
+/// Backward windows have at most this many steps.
+inline constexpr std::size_t maxWindow = 64;
+
+/// Where a pass finds the lanes of an octet: in octet `octet` of the source row, after shuffle `shuffle`.
+struct OctetSource {
+    std::uint16_t octet;
+    std::uint16_t shuffle;
+};
+
+/// Where a pass finds the extrinsic values of each row in the rows of the other code.
+struct RowSources {
+    const std::uint16_t* row;   ///< [steps] the row
+    const OctetSource* octets;  ///< [steps][octets] its octets
+};
+
+/// Sixteen byte positions inside an octet.
+struct Shuffle {
+    alignas(16) std::uint8_t bytes[16];
+};
+
+struct LaneGroup {
+    std::size_t steps;                  ///< trellis steps of a segment, the number of rows
+    std::size_t octets;                 ///< octets of a bundle
+    std::size_t bundles;                ///< bundles of the group
+    std::size_t windows;                ///< backward windows of a segment
+    const std::uint16_t* windowLength;  ///< [windows]
+    unsigned iterations;
+    const Shuffle* shuffles;
+    RowSources natural;      ///< where code 1 finds what code 2 gave
+    RowSources interleaved;  ///< where code 2 finds what code 1 gave
+
+    /// Lanes 0 or -1: which lanes of a bundle's first octet hold the first segment of a block, and which of
+    /// its last octet the last one.
+    alignas(16) std::int16_t firstSegment[octetLanes];
+    alignas(16) std::int16_t lastSegment[octetLanes];
+
+    /// [3][octets * bundles][8]: for each stream of the caller (systematic, parity 1, parity 2) and lane, the
+    /// segment's first value. A lane without a block points to `steps` zeros.
+    const int* const* inputs;
+
+    /// [octets * bundles][8]: where the segment's decisions go, a byte a bit; null for a lane without a
+    /// block.
+    unsigned char* const* outputs;
+
+    /// @name Work storage; a row is 8 * octets * bundles words
+    /// @{
+    std::int16_t* systematic;  ///< [steps] rows, natural order
+    std::int16_t* parity[2];   ///< [steps] rows of code 1 and of code 2
+    std::int16_t* channel;     ///< [steps] rows: systematic plus extrinsic of code 1, halved; at the end LLRs
+    std::int16_t* extrinsic;   ///< [steps] rows: extrinsic of code 2, halved
+    std::int16_t* alphaState;  ///< [16] rows: forward metrics and pending corrections between windows
+    std::int16_t* alphaStart[2];  ///< per code, [8] rows: starts of the next pass
+    std::int16_t* betaStart[2];   ///< per code, [windows][8] rows: starts of the next pass
+    std::int16_t* boundary;       ///< [8] rows: the last metrics of each segment in the direction at hand
+    std::int16_t* alphaRows;      ///< [maxWindow][8] vectors
+    std::int16_t* channelRows;    ///< [maxWindow] vectors
+    /// @}
+};
+
+/// How a group is decoded by one instruction set at one width.
+struct LaneKernel {
+    std::size_t width;  ///< lanes of a vector: 8, 16 or 32
+
+    /// Decode a group whose vectors hold the same octet of width / 8 bundles: bundles == width / 8.
+    /// [algorithm type 0, 1, 2]
+    void (*acrossBundles[3])(const LaneGroup&);
+
+    /// Decode one bundle whose vectors hold width / 8 of its octets. Null at a width of 8.
+    void (*acrossOctets[3])(const LaneGroup&);
+};
+
+}  // namespace quarzel::lanes

@@ -1,0 +1,372 @@
+// SPDX-License-Identifier: MIT
+#pragma once
+
+// How a group is decoded: the one text of all instruction sets and widths. A file of an instruction set
+// includes it and names the widths.
+
+#include <utility>
+
+#include "engine/lanes/lane_rules.hpp"
+#include "engine/lanes/lane_transpose.hpp"
+#include "engine/steps.hpp"
+
+namespace quarzel::lanes {
+namespace {
+
+/// Soft values as channel and extrinsic halves are bounded by the branch format, left-aligned in the state's.
+constexpr std::int16_t lowest = -2048;
+constexpr std::int16_t highest = 2032;
+
+/// Boundary metrics and the steps of the normalisation are multiples of 128, so that neither disturbs the
+/// other.
+constexpr std::int16_t boundaryGrain = -128;
+
+/// Rows after which the metrics are normalised, and rows after a start for which their spread is not bounded.
+constexpr std::size_t normalisedRows = 8;
+constexpr std::size_t unboundedRows = 3;
+
+template <std::size_t W>
+using Metrics = StateWords<Lanes<W>>;
+
+template <std::size_t W>
+inline Lanes<W> largest(const Metrics<W>& m) {
+    return max(max(max(m[0], m[1]), max(m[2], m[3])), max(max(m[4], m[5]), max(m[6], m[7])));
+}
+
+template <std::size_t W>
+inline Metrics<W> loadMetrics(const std::int16_t* from, std::size_t stride) {
+    Metrics<W> m;
+    unrolled<8>([&](auto state) { m[state] = Lanes<W>::load(from + state * stride); });
+    return m;
+}
+
+template <std::size_t W>
+inline void storeMetrics(const Metrics<W>& m, std::int16_t* to, std::size_t stride) {
+    unrolled<8>([&](auto state) { m[state].store(to + state * stride); });
+}
+
+/// The lanes of an octet that a mask names from one place, the others from another.
+inline Lanes<8> choose(const std::int16_t* mask, Lanes<8> where, Lanes<8> elsewhere) {
+    const Lanes<8> m = Lanes<8>::load(mask);
+    return {(m.v & where.v) | (~m.v & elsewhere.v)};
+}
+
+/// Decodes one group at one width. `AcrossOctets` tells whether a vector holds octets of one bundle rather
+/// than one octet of several bundles.
+template <std::size_t W, bool AcrossOctets, int Algorithm>
+class GroupDecoder {
+    using Word = Lanes<W>;
+    using Rules = LaneRules<W, Algorithm>;
+    using Recursion = typename Rules::Recursion;
+    using State = StateMetrics<Recursion>;
+    static constexpr std::size_t slots = W / octetLanes;
+    static constexpr std::size_t states = trellis::states;
+
+  public:
+    explicit GroupDecoder(const LaneGroup& group)
+        : itsGroup(group), itsRow(octetLanes * group.octets * group.bundles), itsColumns(itsRow / W) {}
+
+    void decode() {
+        readInputs(itsGroup);
+        for (unsigned iteration = 0; iteration < itsGroup.iterations; ++iteration) {
+            pass<1>(iteration == 0, false);
+            pass<0>(iteration == 0, iteration + 1 == itsGroup.iterations);
+        }
+        writeDecisions(itsGroup);
+    }
+
+  private:
+    const LaneGroup& itsGroup;
+    const std::size_t itsRow;      ///< words in a row
+    const std::size_t itsColumns;  ///< vectors in a row
+
+    /// The window that a recursion is at.
+    struct Window {
+        std::size_t bottom;
+        std::size_t length;
+        bool first;
+        bool last;
+    };
+
+    /// One pass of a constituent code over all windows, from the lowest up.
+    template <int Code>
+    void pass(bool firstIteration, bool lastPass) {
+        const std::size_t boundaryWords = states * itsRow;
+        std::int16_t* const starts = itsGroup.betaStart[Code];
+        std::int16_t* const lastStarts = starts + (itsGroup.windows - 1) * boundaryWords;
+        // What the first windows end with starts the last ones of the segments below: in this pass when other
+        // windows run in between, else in the next one. In the first iteration no start is known.
+        const bool handDownAtOnce = itsGroup.windows >= 3 && !firstIteration;
+        std::size_t bottom = 0;
+        for (std::size_t w = 0; w < itsGroup.windows; ++w) {
+            const Window window{bottom, itsGroup.windowLength[w], w == 0, w + 1 == itsGroup.windows};
+            std::int16_t* const ends = w == 0 ? itsGroup.boundary : starts + (w - 1) * boundaryWords;
+            for (std::size_t column = 0; column < itsColumns; ++column) {
+                const std::size_t at = column * W;
+                forward<Code>(window, column, firstIteration);
+                const State end = backward<Code>(window, column, starts + w * boundaryWords + at, lastPass);
+                storeBoundary(end, ends + at);
+            }
+            if (w == 0 && handDownAtOnce) {
+                handDown(lastStarts);
+            }
+            bottom += window.length;
+        }
+        if (!handDownAtOnce) {
+            handDown(lastStarts);
+        }
+        handUp(itsGroup.alphaStart[Code]);
+    }
+
+    /// Forward over a window: keep the metrics before each step, and the state after the last.
+    template <int Code>
+    [[gnu::flatten]] void forward(const Window& window, std::size_t column, bool firstIteration) const {
+        const Recursion rule = Rules::recursion();
+        const std::size_t at = column * W;
+        State state = window.first ? load(loadMetrics<W>(itsGroup.alphaStart[Code] + at, itsRow))
+                                   : loadAlphaState(itsGroup.alphaState + at);
+        const auto step = [&](std::size_t t) {
+            const Word channel = channelValue<Code>(window.bottom + t, column, firstIteration);
+            channel.store(itsGroup.channelRows + t * W);
+            storeMetrics<W>(words(state), itsGroup.alphaRows + t * states * W, W);
+            state = alphaStep<Recursion>(
+                state, branchMetrics(channel, parity<Code>(window.bottom + t, column)), rule);
+        };
+        std::size_t t = 0;
+        while (t + normalisedRows <= window.length) {
+            for (std::size_t i = 0; i < normalisedRows; ++i) {
+                step(t++);
+            }
+            normalise(state);
+        }
+        while (t < window.length) {
+            step(t++);
+        }
+        normalise(state);
+        if (window.last) {
+            storeBoundary(state, itsGroup.alphaState + at);
+        } else {
+            storeAlphaState(state, itsGroup.alphaState + at);
+        }
+    }
+
+    /// Backward over a window, with the LLR and the extrinsic value of each step.
+    /// @return the state below its lowest step
+    template <int Code>
+    [[gnu::flatten]] State backward(const Window& window, std::size_t column, const std::int16_t* start,
+                                    bool lastPass) const {
+        const Recursion rule = Rules::recursion();
+        State state = load(loadMetrics<W>(start, itsRow));
+        const auto step = [&](std::size_t t, const auto& llrRule) {
+            const std::size_t row = window.bottom + t;
+            const Word channel = Word::load(itsGroup.channelRows + t * W);
+            const std::int16_t* alphaRow = itsGroup.alphaRows + t * states * W;
+            const auto alpha = [alphaRow](std::size_t i) { return Word::load(alphaRow + i * W); };
+            const auto result =
+                backwardStep(state, branchMetrics(channel, parity<Code>(row, column)), alpha, rule, llrRule);
+            state = result.beta;
+            output<Code>(row, column, result.llr, channel, lastPass);
+        };
+        const std::size_t floor = window.first ? unboundedRows : 0;
+        std::size_t t = window.length;
+        for (std::size_t i = 0; i < normalisedRows; ++i) {
+            --t;
+            if (i < unboundedRows) {
+                step(t, Rules::llrNearStart());
+            } else {
+                step(t, Rules::llr());
+            }
+        }
+        normalise(state);
+        while (t >= floor + normalisedRows) {
+            for (std::size_t i = 0; i < normalisedRows; ++i) {
+                step(--t, Rules::llr());
+            }
+            normalise(state);
+        }
+        while (t > floor) {
+            step(--t, Rules::llr());
+        }
+        while (t > 0) {
+            step(--t, Rules::llrNearStart());
+        }
+        return state;
+    }
+
+    template <int Code>
+    void output(std::size_t row, std::size_t column, Word llr, Word channel, bool lastPass) const {
+        const std::size_t at = row * itsRow + column * W;
+        if constexpr (Code == 1) {
+            halfExtrinsic(llr, channel).store(itsGroup.extrinsic + at);
+        } else if (lastPass) {
+            llr.store(itsGroup.channel + at);
+        } else {
+            add(Word::load(itsGroup.systematic + at), halfExtrinsic(llr, channel))
+                .store(itsGroup.channel + at);
+        }
+    }
+
+    template <int Code>
+    Word parity(std::size_t row, std::size_t column) const {
+        return Word::load(itsGroup.parity[Code] + row * itsRow + column * W);
+    }
+
+    /// The channel value plus half the extrinsic value of the other code, in the order of this one: twice the
+    /// intrinsic value.
+    template <int Code>
+    Word channelValue(std::size_t row, std::size_t column, bool firstIteration) const {
+        const RowSources& sources = Code == 0 ? itsGroup.natural : itsGroup.interleaved;
+        const std::int16_t* given = Code == 0        ? itsGroup.extrinsic
+                                    : firstIteration ? itsGroup.systematic
+                                                     : itsGroup.channel;
+        const Word value = permuted(given + sources.row[row] * itsRow, sources.octets + row * itsGroup.octets,
+                                    column, std::make_index_sequence<slots>());
+        if constexpr (Code == 0) {
+            return add(value, Word::load(itsGroup.systematic + row * itsRow + column * W));
+        } else {
+            return value;
+        }
+    }
+
+    /// A vector of the source row's lanes, where this row wants them.
+    template <std::size_t... Slot>
+    Word permuted(const std::int16_t* from, const OctetSource* sources, std::size_t column,
+                  std::index_sequence<Slot...>) const {
+        if constexpr (AcrossOctets) {
+            sources += column * slots;
+            return shuffleOctets(joinOctets(Lanes<8>::load(from + sources[Slot].octet * octetLanes)...),
+                                 joinOctets(loadShuffle(itsGroup.shuffles[sources[Slot].shuffle])...));
+        } else {
+            const OctetSource source = sources[column];
+            const Lanes<8> shuffle = loadShuffle(itsGroup.shuffles[source.shuffle]);
+            return shuffleOctets(Word::load(from + source.octet * W), joinOctets(((void)Slot, shuffle)...));
+        }
+    }
+
+    /// Branch metrics. Without a second parity only two are distinct.
+    static BranchMetrics<Word> branchMetrics(Word channel, Word parity) {
+        const auto clamp = [](Word sum) { return max(min(sum, Word::of(highest)), Word::of(lowest)); };
+        const Word same = clamp(add(channel, parity));
+        const Word opposite = clamp(sub(channel, parity));
+        return {same, opposite, opposite, same};
+    }
+
+    /// Half the extrinsic value, kept to the state format's precision: the LLR less four times the intrinsic
+    /// value, scaled, clamped and halved. Every value is a multiple of 16, so that the truncating divisions
+    /// of the definition are exact and their order does not matter.
+    static Word halfExtrinsic(Word llr, Word channel) {
+        const Word half = sub(llr >> 1, channel);
+        const Word scaled = Rules::scaled ? sub(half, half >> 2) : half;
+        return max(min(scaled & Word::of(-16), Word::of((highest / 2) & -16)), Word::of(lowest / 2));
+    }
+
+    static void normalise(State& state) {
+        if constexpr (Rules::normalised) {
+            const Word offset = largest<W>(state) & Word::of(boundaryGrain);
+            unrolled<states>([&](auto i) { state[i] = sub(state[i], offset); });
+        }
+    }
+
+    static Metrics<W> words(const State& state) {
+        Metrics<W> m;
+        unrolled<states>([&](auto i) { m[i] = Recursion::store(state[i]); });
+        return m;
+    }
+
+    static State load(const Metrics<W>& m) {
+        State state;
+        unrolled<states>([&](auto i) { state[i] = Recursion::load(m[i]); });
+        return state;
+    }
+
+    /// Keep metrics as a boundary: low bits cleared, the largest one at 0.
+    void storeBoundary(const State& state, std::int16_t* to) const {
+        Metrics<W> m = words(state);
+        for (Word& metric : m) {
+            metric = metric & Word::of(boundaryGrain);
+        }
+        if constexpr (Rules::normalised) {
+            const Word top = largest<W>(m);
+            for (Word& metric : m) {
+                metric = sub(metric, top);
+            }
+        }
+        storeMetrics<W>(m, to, itsRow);
+    }
+
+    State loadAlphaState(const std::int16_t* from) const {
+        State state = load(loadMetrics<W>(from, itsRow));
+        if constexpr (!Rules::normalised) {
+            for (std::size_t i = 0; i < states; ++i) {
+                state[i].pending = Word::load(from + (states + i) * itsRow);
+            }
+        }
+        return state;
+    }
+
+    void storeAlphaState(const State& state, std::int16_t* to) const {
+        storeMetrics<W>(words(state), to, itsRow);
+        if constexpr (!Rules::normalised) {
+            for (std::size_t i = 0; i < states; ++i) {
+                state[i].pending.store(to + (states + i) * itsRow);
+            }
+        }
+    }
+
+    /// Start each segment where the one below it ended; a block's first one keeps its start.
+    void handUp(std::int16_t* starts) const {
+        for (std::size_t metric = 0; metric < states; ++metric) {
+            for (std::size_t bundle = 0; bundle < itsGroup.bundles; ++bundle) {
+                const auto at = [&](std::size_t octet) {
+                    return metric * itsRow + octetLanes * (octet * itsGroup.bundles + bundle);
+                };
+                for (std::size_t octet = 1; octet < itsGroup.octets; ++octet) {
+                    Lanes<8>::load(itsGroup.alphaState + at(octet - 1)).store(starts + at(octet));
+                }
+                const Lanes<8> top = Lanes<8>::load(itsGroup.alphaState + at(itsGroup.octets - 1));
+                const Lanes<8> moved{__builtin_shufflevector(top.v, top.v, 7, 0, 1, 2, 3, 4, 5, 6)};
+                choose(itsGroup.firstSegment, Lanes<8>::load(starts + at(0)), moved).store(starts + at(0));
+            }
+        }
+    }
+
+    /// Start the last window of each segment where the first one of the segment above it ended; a block's
+    /// last one keeps its start.
+    void handDown(std::int16_t* starts) const {
+        for (std::size_t metric = 0; metric < states; ++metric) {
+            for (std::size_t bundle = 0; bundle < itsGroup.bundles; ++bundle) {
+                const auto at = [&](std::size_t octet) {
+                    return metric * itsRow + octetLanes * (octet * itsGroup.bundles + bundle);
+                };
+                const std::size_t last = itsGroup.octets - 1;
+                for (std::size_t octet = 0; octet < last; ++octet) {
+                    Lanes<8>::load(itsGroup.boundary + at(octet + 1)).store(starts + at(octet));
+                }
+                const Lanes<8> low = Lanes<8>::load(itsGroup.boundary + at(0));
+                const Lanes<8> moved{__builtin_shufflevector(low.v, low.v, 1, 2, 3, 4, 5, 6, 7, 0)};
+                choose(itsGroup.lastSegment, Lanes<8>::load(starts + at(last)), moved)
+                    .store(starts + at(last));
+            }
+        }
+    }
+};
+
+template <std::size_t W, bool AcrossOctets, int Algorithm>
+void decodeGroup(const LaneGroup& group) {
+    GroupDecoder<W, AcrossOctets, Algorithm>(group).decode();
+}
+
+/// The kernel of one width.
+template <std::size_t W>
+constexpr LaneKernel kernelOf() {
+    LaneKernel kernel{W, {decodeGroup<W, false, 0>, decodeGroup<W, false, 1>, decodeGroup<W, false, 2>}, {}};
+    if constexpr (W > octetLanes) {
+        kernel.acrossOctets[0] = decodeGroup<W, true, 0>;
+        kernel.acrossOctets[1] = decodeGroup<W, true, 1>;
+        kernel.acrossOctets[2] = decodeGroup<W, true, 2>;
+    }
+    return kernel;
+}
+
+}  // namespace
+}  // namespace quarzel::lanes

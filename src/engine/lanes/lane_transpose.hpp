@@ -1,0 +1,101 @@
+// SPDX-License-Identifier: MIT
+#pragma once
+
+#include <array>
+
+#include "engine/lanes/lane_word.hpp"
+
+// Between the caller's arrays, where the steps of a segment stand in a row, and the rows of a group, where
+// the segments of a step do: eight by eight at a time.
+namespace quarzel::lanes {
+namespace {
+
+using Square = std::array<Lanes<8>, 8>;
+
+/// Interleave each vector with the one four further on; done three times, rows become columns.
+inline Square interleaveHalves(const Square& x) {
+    Square y;
+    for (std::size_t i = 0; i < 4; ++i) {
+        y[2 * i].v = __builtin_shufflevector(x[i].v, x[i + 4].v, 0, 8, 1, 9, 2, 10, 3, 11);
+        y[2 * i + 1].v = __builtin_shufflevector(x[i].v, x[i + 4].v, 4, 12, 5, 13, 6, 14, 7, 15);
+    }
+    return y;
+}
+
+inline Square transpose(const Square& x) {
+    return interleaveHalves(interleaveHalves(interleaveHalves(x)));
+}
+
+/// Eight of the caller's values, saturated to the input format, as words of the state format. Bits that the
+/// first shift moves out are lost before the comparison, as in the core.
+inline Lanes<8> toWords(const int* values) {
+    typedef std::int32_t Ints __attribute__((vector_size(32)));
+    typedef std::uint32_t Unsigned __attribute__((vector_size(32)));
+    constexpr std::int32_t most = 32512;
+    constexpr std::int32_t least = -32768;
+    Ints x;
+    std::memcpy(&x, values, sizeof x);
+    x = (Ints)((Unsigned)x << 8);
+    x = x > most ? Ints{} + most : x;
+    x = x < least ? Ints{} + least : x;
+    return {__builtin_convertvector(x >> 4, Lanes<8>::Signed)};
+}
+
+/// Call `block` for the rows from t to t + 7, for every t that it takes to cover all rows. The last eight may
+/// overlap those before.
+template <class Block>
+inline void forEightRows(std::size_t rows, Block block) {
+    for (std::size_t t = 0; t + 8 < rows; t += 8) {
+        block(t);
+    }
+    block(rows - 8);
+}
+
+/// Fill the rows of the soft inputs from the caller's arrays.
+inline void readInputs(const LaneGroup& group) {
+    const std::size_t octets = group.octets * group.bundles;
+    const std::size_t row = octetLanes * octets;
+    std::int16_t* const rows[3] = {group.systematic, group.parity[0], group.parity[1]};
+    for (std::size_t stream = 0; stream < 3; ++stream) {
+        for (std::size_t octet = 0; octet < octets; ++octet) {
+            const int* const* lanes = group.inputs + (stream * octets + octet) * octetLanes;
+            forEightRows(group.steps, [&](std::size_t t) {
+                Square square;
+                for (std::size_t lane = 0; lane < octetLanes; ++lane) {
+                    square[lane] = toWords(lanes[lane] + t);
+                }
+                square = transpose(square);
+                for (std::size_t i = 0; i < square.size(); ++i) {
+                    square[i].store(rows[stream] + (t + i) * row + octet * octetLanes);
+                }
+            });
+        }
+    }
+}
+
+/// Write a byte for every LLR in the channel rows: 1 where it is not negative.
+inline void writeDecisions(const LaneGroup& group) {
+    typedef std::uint8_t Bytes __attribute__((vector_size(8)));
+    const std::size_t octets = group.octets * group.bundles;
+    const std::size_t row = octetLanes * octets;
+    for (std::size_t octet = 0; octet < octets; ++octet) {
+        unsigned char* const* lanes = group.outputs + octet * octetLanes;
+        forEightRows(group.steps, [&](std::size_t t) {
+            Square square;
+            for (std::size_t i = 0; i < square.size(); ++i) {
+                square[i] = Lanes<8>::load(group.channel + (t + i) * row + octet * octetLanes);
+            }
+            square = transpose(square);
+            for (std::size_t lane = 0; lane < octetLanes; ++lane) {
+                if (lanes[lane] != nullptr) {
+                    const auto signs = ~(Lanes<8>::Unsigned)square[lane].v >> 15;
+                    const auto bits = __builtin_convertvector(signs, Bytes);
+                    std::memcpy(lanes[lane] + t, &bits, sizeof bits);
+                }
+            }
+        });
+    }
+}
+
+}  // namespace
+}  // namespace quarzel::lanes

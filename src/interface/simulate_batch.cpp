@@ -1,0 +1,176 @@
+// SPDX-License-Identifier: MIT
+#include <algorithm>
+#include <cstdint>
+#include <map>
+#include <span>
+#include <utility>
+#include <vector>
+
+#include "decoder/decoder.hpp"
+#include "interface/block_call.hpp"
+#include "interface/messages.hpp"
+
+namespace quarzel {
+
+namespace {
+
+/// The arrays of a batch.
+struct Batch {
+    vardel_ip_quarzel_state* state;
+    vardel_ip_quarzel_outputs* outputs;
+    const vardel_ip_quarzel_inputs* inputs;
+    int* statuses;
+};
+
+/// Whether a buffer for decisions shares bytes with anything else of the batch. Then the order of the writes
+/// shows, and the blocks have to be decoded one after the other.
+bool outputsOverlap(const Batch& batch, int count) {
+    struct Range {
+        std::uintptr_t first;
+        std::uintptr_t end;
+        bool written;
+        bool operator<(const Range& other) const { return first < other.first; }
+    };
+    std::vector<Range> ranges;
+    ranges.reserve(4 * static_cast<std::size_t>(count));
+    const auto add = [&ranges](const void* first, std::size_t bytes, bool written) {
+        const auto start = reinterpret_cast<std::uintptr_t>(first);
+        ranges.push_back({start, start + bytes, written});
+    };
+    for (int i = 0; i < count; ++i) {
+        const auto& in = batch.inputs[i];
+        const auto size = static_cast<std::size_t>(std::max(in.din_size, 0));
+        add(batch.outputs[i].dout, size, true);
+        add(in.rsc1_sys, size * sizeof(int), false);
+        add(in.rsc1_par, size * sizeof(int), false);
+        add(in.rsc2_par, size * sizeof(int), false);
+    }
+    std::sort(ranges.begin(), ranges.end());
+    std::uintptr_t readEnd = 0;
+    std::uintptr_t writtenEnd = 0;
+    for (const Range& range : ranges) {
+        if (range.first == 0 || range.first == range.end) {
+            continue;
+        }
+        if (range.first < writtenEnd || (range.written && range.first < readEnd)) {
+            return true;
+        }
+        std::uintptr_t& end = range.written ? writtenEnd : readEnd;
+        end = std::max(end, range.end);
+    }
+    return false;
+}
+
+/// Blocks that wait for others of their size, to be decoded together.
+class WaitingBlocks {
+  public:
+    explicit WaitingBlocks(const Batch& batch) : itsBatch(batch) {}
+
+    void add(int index) {
+        const vardel_ip_quarzel_inputs& in = itsBatch.inputs[index];
+        itsClasses[{blockSize(in), in.iterations}].push_back(index);
+    }
+
+    /// Decode all that wait. Sizes are taken in the order of their last blocks, so that what the decoder
+    /// keeps of the blocks is what the order of the calls would have left.
+    void decode() {
+        std::vector<const Class*> order;
+        for (const Class& blocks : itsClasses) {
+            order.push_back(&blocks);
+        }
+        std::sort(order.begin(), order.end(),
+                  [](const Class* x, const Class* y) { return x->second.back() < y->second.back(); });
+        for (const Class* blocks : order) {
+            decode(*blocks);
+        }
+        itsClasses.clear();
+    }
+
+  private:
+    using Class = std::pair<const std::pair<unsigned, int>, std::vector<int>>;
+
+    void decode(const Class& blocks) {
+        const auto& [size, iterations] = blocks.first;
+        itsBlocks.clear();
+        for (const int index : blocks.second) {
+            itsBlocks.push_back(laneBlock(itsBatch.outputs[index], itsBatch.inputs[index]));
+        }
+        int status = 0;
+        try {
+            itsBatch.state->decoder->decodeLanes(size, static_cast<unsigned>(iterations), itsBlocks);
+        } catch (...) {
+            status = 99;
+        }
+        for (const int index : blocks.second) {
+            itsBatch.statuses[index] = status;
+            if (status == 0) {
+                fillRecord(*itsBatch.state, itsBatch.outputs[index], itsBatch.inputs[index], size);
+            } else {
+                decoderError("Unhandled exception has occurred");
+            }
+        }
+    }
+
+    const Batch& itsBatch;
+    std::map<std::pair<unsigned, int>, std::vector<int>> itsClasses;
+    std::vector<LaneBlock> itsBlocks;
+};
+
+void simulateAll(const Batch& batch, int count) {
+    const bool together = !outputsOverlap(batch, count);
+    WaitingBlocks waiting(batch);
+    for (int i = 0; i < count; ++i) {
+        const vardel_ip_quarzel_inputs& in = batch.inputs[i];
+        if (const char* fault = findFault(batch.state, &batch.outputs[i], in)) {
+            decoderError(fault);
+            batch.statuses[i] = 1;
+        } else if (together && takesLanes(*batch.state, batch.outputs[i], in)) {
+            // Everything that a block says, it says here, in the order of the calls.
+            reportSaturation(*batch.state, in);
+            reportTruncation(*batch.state, in);
+            waiting.add(i);
+        } else {
+            waiting.decode();
+            batch.statuses[i] = vardel_ip_quarzel_bitacc_simulate(batch.state, &batch.outputs[i], in);
+        }
+    }
+    waiting.decode();
+}
+
+}  // namespace
+
+}  // namespace quarzel
+
+int vardel_ip_quarzel_bitacc_simulate_batch(vardel_ip_quarzel_state* state,
+                                            vardel_ip_quarzel_outputs* outputs,
+                                            const vardel_ip_quarzel_inputs* inputs, int count,
+                                            int* statuses) {
+    const auto refuse = [](const char* text) {
+        quarzel::decoderError(text);
+        return 1;
+    };
+    if (state == nullptr) {
+        return refuse("Simulate batch called with null state structure");
+    }
+    if (count < 0) {
+        return refuse("count must not be negative");
+    }
+    if (count == 0) {
+        return 0;
+    }
+    if (outputs == nullptr) {
+        return refuse("Simulate batch called with null output structures");
+    }
+    if (inputs == nullptr) {
+        return refuse("Simulate batch called with null input structures");
+    }
+    std::vector<int> ownStatuses;
+    if (statuses == nullptr) {
+        ownStatuses.resize(static_cast<std::size_t>(count));
+        statuses = ownStatuses.data();
+    }
+    quarzel::simulateAll({state, outputs, inputs, statuses}, count);
+    const std::span all(statuses, static_cast<std::size_t>(count));
+    const auto failed = std::find_if(all.begin(), all.end(), [](int status) { return status != 0; });
+    return failed == all.end() ? 0 : *failed;
+}
