@@ -224,7 +224,7 @@ void LaneDecoder::readLast(std::vector<std::int8_t>& soft) const {
             }
         }
     });
-    std::transform(std::begin(itsLast.tail), std::end(itsLast.tail), soft.end() - std::size(itsLast.tail),
+    std::transform(std::begin(itsLast.tail), std::end(itsLast.tail), soft.end() - std::ssize(itsLast.tail),
                    value);
 }
 

@@ -53,9 +53,9 @@ TEST(DecoderFactory, IllegalCountsAreRefused) {
                  {"3GPPPU:4,0", "ERROR:TDecoder3GPU:Illegal number of threads per processing unit:0\n"},
                  {"3GPPPU:4,", "ERROR:TDecoder3GPU:Illegal number of threads per processing unit:4\n"},
                  {"3GPPPU:4,x", "ERROR:TDecoder3GPU:Illegal number of threads per processing unit:0\n"}};
-    for (const auto& [given, error] : cases) {
-        const Output output = capture([&] { EXPECT_EQ(create(given), nullptr); });
-        EXPECT_EQ(output.err, error) << given;
+    for (const auto& refused : cases) {
+        const Output output = capture([&] { EXPECT_EQ(create(refused.given), nullptr); });
+        EXPECT_EQ(output.err, refused.error) << refused.given;
     }
 }
 
