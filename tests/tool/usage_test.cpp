@@ -1,0 +1,86 @@
+// SPDX-License-Identifier: MIT
+#include <gtest/gtest.h>
+
+#include "run_tool.hpp"
+
+namespace quarzel::test {
+
+namespace {
+
+/// A command line that is wrong, and what the tool says of it after "quarzel: error: ".
+struct BadUsage {
+    const char* title;
+    std::vector<std::string> arguments;
+    std::string message;
+};
+
+void PrintTo(const BadUsage& bad, std::ostream* stream) {
+    *stream << bad.title;
+}
+
+const std::string seeHelp = "; see 'quarzel --help'";
+const std::string seeDecode = "; see 'quarzel decode --help'";
+const std::string seeInfo = "; see 'quarzel info --help'";
+
+const std::vector<BadUsage> badUsages = {
+    {"Nothing", {}, "a command is missing" + seeHelp},
+    {"UnknownCommand", {"decide"}, "'decide' is not understood" + seeHelp},
+    {"UnknownOption", {"--fast"}, "'--fast' is not understood" + seeHelp},
+    {"NoCapture", {"decode"}, "CAPTURE is required" + seeDecode},
+    {"TwoCaptures", {"decode", "a", "b"}, "'b' is not understood" + seeDecode},
+    {"UnknownDecodeOption", {"decode", "a", "--fast"}, "'--fast' is not understood" + seeDecode},
+    {"NoValue", {"decode", "a", "--units"}, "--units: exactly one value is needed" + seeDecode},
+    {"TwoValues",
+     {"decode", "a", "--units", "2", "--units", "4"},
+     "--units: exactly one value is needed" + seeDecode},
+    {"ThreeUnits", {"decode", "a", "--units", "3"}, "--units: '3' is not 2, 4 or 8" + seeDecode},
+    {"Algorithm3", {"decode", "a", "--algorithm", "3"}, "--algorithm: '3' is not 0, 1 or 2" + seeDecode},
+    {"AlgorithmInWords",
+     {"decode", "a", "--algorithm", "max"},
+     "--algorithm: 'max' is not 0, 1 or 2" + seeDecode},
+    {"NoIteration",
+     {"decode", "a", "--iterations", "0"},
+     "--iterations: '0' is not a number from 1 to 15" + seeDecode},
+    {"SixteenIterations",
+     {"decode", "a", "--iterations", "16"},
+     "--iterations: '16' is not a number from 1 to 15" + seeDecode},
+    {"NegativeIterations",
+     {"decode", "a", "--iterations", "-1"},
+     "--iterations: '-1' is not a number from 1 to 15" + seeDecode},
+    {"HalfAnIteration",
+     {"decode", "a", "--iterations", "1.5"},
+     "--iterations: '1.5' is not a number from 1 to 15" + seeDecode},
+    {"OutputIsCapture", {"decode", ".", "-o", "."}, "-o: . is also read; give another name"},
+    {"OutputIsReference",
+     {"decode", "a", "--reference", ".", "-o", "./"},
+     "-o: ./ is also read; give another name"},
+    {"SizeBetweenTwo", {"info", "41"}, "K: 41 is no block size of LTE; the nearest: 40, 48"},
+    {"SizeBelowAll", {"info", "0"}, "K: 0 is no block size of LTE; the nearest: 40"},
+    {"SizeAboveAll", {"info", "6208"}, "K: 6208 is no block size of LTE; the nearest: 6144"},
+    {"SizeBeyond64Bits",
+     {"info", "99999999999999999999"},
+     "K: '99999999999999999999' is not a whole number" + seeInfo},
+    {"NegativeSize", {"info", "-40"}, "K: '-40' is not a whole number" + seeInfo},
+    {"HexadecimalSize", {"info", "0x28"}, "K: '0x28' is not a whole number" + seeInfo},
+    {"TwoSizes", {"info", "40", "48"}, "'48' is not understood" + seeInfo},
+};
+
+class BadUsageTest : public testing::TestWithParam<BadUsage> {};
+
+}  // namespace
+
+TEST_P(BadUsageTest, EndsWithOneLineThatTellsWhatIsWrong) {
+    const ToolRun run = runTool(GetParam().arguments);
+    EXPECT_EQ(run.err, "quarzel: error: " + GetParam().message + '\n');
+    EXPECT_EQ(run.out, "");
+    EXPECT_EQ(run.exitCode, 2);
+}
+
+INSTANTIATE_TEST_SUITE_P(, BadUsageTest, testing::ValuesIn(badUsages),
+                         [](const auto& test) { return std::string(test.param.title); });
+
+TEST(Usage, ReadsNumbersInDecimalWhateverZerosTheyBeginWith) {
+    EXPECT_EQ(runTool({"info", "0040"}).out, runTool({"info", "40"}).out);
+}
+
+}  // namespace quarzel::test

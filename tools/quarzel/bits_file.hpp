@@ -1,0 +1,39 @@
+// SPDX-License-Identifier: MIT
+#pragma once
+
+#include <cstddef>
+#include <cstdint>
+#include <string>
+#include <vector>
+
+namespace quarzel::tool {
+
+/// The information bits of code blocks, 8 to a byte, the first bit highest: the order of numpy.packbits.
+struct PackedBits {
+    std::size_t bytesPerBlock;        ///< K / 8; every valid K is a multiple of 8
+    std::vector<std::uint8_t> bytes;  ///< block after block
+
+    std::size_t blocks() const { return bytes.size() / bytesPerBlock; }
+
+    /// Append a block of 8 * bytesPerBlock bits, each a byte of 0 or 1.
+    void append(const std::vector<unsigned char>& bits);
+};
+
+/// Read an npy file of uint8 values of shape (blocks, bytesPerBlock).
+/// @throws ToolError when the file cannot be read, is not well-formed or has another type or shape
+PackedBits readBits(const std::string& file, std::size_t blocks, std::size_t bytesPerBlock);
+
+/// Write an npy file of uint8 values of shape (blocks, bytesPerBlock), whole or not at all.
+/// @throws ToolError when that fails
+void writeBits(const std::string& file, const PackedBits& bits);
+
+/// How two sets of blocks differ.
+struct BitErrors {
+    std::size_t bits = 0;    ///< bits that differ
+    std::size_t blocks = 0;  ///< blocks with a bit that differs
+};
+
+/// Count the differences of two sets of the same shape.
+BitErrors countErrors(const PackedBits& decided, const PackedBits& sent);
+
+}  // namespace quarzel::tool

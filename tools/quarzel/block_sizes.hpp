@@ -1,0 +1,34 @@
+// SPDX-License-Identifier: MIT
+#pragma once
+
+#include <cstdint>
+#include <string>
+#include <vector>
+
+#include "interleaver/lte_params.hpp"
+
+namespace quarzel::tool {
+
+/// The row of the parameter table for a block size, or null when LTE has no such size.
+const LteParams* findBlockSize(std::uint64_t K);
+
+/// The valid block sizes next to one that is not valid, in ascending order: one on each side, or only one
+/// when K lies outside the table.
+std::vector<std::uint32_t> nearestBlockSizes(std::uint64_t K);
+
+/// The block size K whose blocks have this many positions, K + 4, in each stream.
+/// @param where  the file, and the line when it is known, for the error message
+/// @throws ToolError naming the nearest valid numbers when no K fits
+std::uint32_t blockSizeOf(std::uint64_t positions, const std::string& where);
+
+/// Equally spaced block sizes.
+struct BlockSizeRange {
+    std::uint32_t first;
+    std::uint32_t last;
+    std::uint32_t step;
+};
+
+/// The valid block sizes as ranges, in ascending order.
+std::vector<BlockSizeRange> blockSizeRanges();
+
+}  // namespace quarzel::tool

@@ -1,0 +1,85 @@
+// SPDX-License-Identifier: MIT
+#include "command_line.hpp"
+
+#include <fmt/format.h>
+
+#include <CLI/CLI.hpp>
+#include <memory>
+#include <string>
+#include <vector>
+
+#include "decode_command.hpp"
+#include "info_command.hpp"
+#include "tool_error.hpp"
+
+namespace quarzel::tool {
+
+namespace {
+
+constexpr const char* description = "A bit-accurate model of a hardware turbo decoder core for 3GPP LTE";
+
+constexpr const char* footer = R"('quarzel COMMAND --help' tells what a command reads, writes and prints.
+Results go to standard output; errors, warnings and a progress bar to standard
+error.
+
+Examples:
+  quarzel info 6144
+  quarzel decode capture.npy --units 8 --reference sent.npy
+)";
+
+class HelpFormatter : public CLI::Formatter {
+  public:
+    HelpFormatter() {
+        column_width(20);
+        label("SUBCOMMAND", "COMMAND");
+        label("Positionals", "Arguments");
+        label("REQUIRED", "");
+    }
+
+    std::string make_usage(const CLI::App* app, std::string name) const override {
+        return '\n' + Formatter::make_usage(app, name);
+    }
+};
+
+/// What is wrong with a command line, in our words where CLI11 speaks of its own notions.
+std::string problemWith(const CLI::App& app, const CLI::ParseError& error) {
+    std::string text = error.what();
+    const std::vector<std::string> leftOver = app.remaining(true);
+    if (!leftOver.empty()) {
+        return fmt::format("'{}' is not understood", leftOver.front());
+    }
+    if (app.get_subcommands().empty()) {
+        return "a command is missing";
+    }
+    if (dynamic_cast<const CLI::ArgumentMismatch*>(&error) != nullptr) {
+        return text.substr(0, text.find(':')) + ": exactly one value is needed";
+    }
+    return text;
+}
+
+}  // namespace
+
+void runCommandLine(int argc, const char* const* argv, std::ostream& results) {
+    CLI::App app(description, "quarzel");
+    app.formatter(std::make_shared<HelpFormatter>());
+    app.set_help_flag("-h,--help", "Print help");
+    app.set_version_flag("--version", "quarzel " QUARZEL_VERSION, "Print version");
+    app.footer(std::string(footer) + '\n' + exitCodesHelp);
+    app.require_subcommand(1);
+    addDecodeCommand(app, results);
+    addInfoCommand(app, results);
+    try {
+        app.parse(argc, argv);
+    } catch (const CLI::CallForHelp&) {
+        results << app.help();
+    } catch (const CLI::CallForVersion& version) {
+        results << version.what() << '\n';
+    } catch (const CLI::ParseError& error) {
+        const std::string command =
+            app.get_subcommands().empty() ? "" : app.get_subcommands()[0]->get_name() + ' ';
+        throw ToolError(ExitCode::usage, "", problemWith(app, error),
+                        fmt::format("see 'quarzel {}--help'", command));
+    }
+}
+
+}  // namespace quarzel::tool

@@ -1,0 +1,13 @@
+// SPDX-License-Identifier: MIT
+#pragma once
+
+#include <ostream>
+
+namespace quarzel::tool {
+
+/// Do what the command line asks for.
+/// @param results  receives what the user asked for, help included, and nothing else
+/// @throws ToolError when the command line is wrong or its command fails
+void runCommandLine(int argc, const char* const* argv, std::ostream& results);
+
+}  // namespace quarzel::tool

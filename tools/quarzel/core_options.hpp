@@ -1,0 +1,19 @@
+// SPDX-License-Identifier: MIT
+#pragma once
+
+#include <CLI/CLI.hpp>
+
+namespace quarzel::tool {
+
+/// What the user of a core chooses.
+struct CoreOptions {
+    int units = 2;
+    int algorithm = 1;
+    int iterations = 6;
+};
+
+/// Add --units, --algorithm and --iterations to a command.
+/// @param options  holds the defaults and receives the choice; must outlive the parse
+void addCoreOptions(CLI::App& command, CoreOptions& options);
+
+}  // namespace quarzel::tool

@@ -1,0 +1,32 @@
+// SPDX-License-Identifier: MIT
+#include "tool_error.hpp"
+
+#include <fmt/format.h>
+
+#include <algorithm>
+
+namespace quarzel::tool {
+
+const char* const exitCodesHelp = R"(Exit codes:
+  0  done
+  1  decoding failed
+  2  the command line is wrong
+  3  a file cannot be read, understood or written)";
+
+ToolError::ToolError(ExitCode code, std::string_view subject, std::string_view problem,
+                     std::string_view remedy)
+    : std::runtime_error(fmt::format("{}{}{}; {}", subject, subject.empty() ? "" : ": ", problem, remedy)),
+      itsCode(code) {}
+
+ToolError fileError(std::string_view file, std::string_view problem, std::string_view remedy) {
+    return {ExitCode::file, file, problem, remedy};
+}
+
+std::string errorLine(std::string_view message) {
+    std::string line = fmt::format("quarzel: error: {}", message);
+    const auto isControl = [](char c) { return static_cast<unsigned char>(c) < ' ' || c == '\x7f'; };
+    std::replace_if(line.begin(), line.end(), isControl, '?');
+    return line + '\n';
+}
+
+}  // namespace quarzel::tool

@@ -1,0 +1,18 @@
+// SPDX-License-Identifier: MIT
+#pragma once
+
+#include <CLI/CLI.hpp>
+#include <cstdint>
+#include <functional>
+#include <string>
+
+namespace quarzel::tool {
+
+/// A check that the text of an option is a whole number in decimal and one of those wanted, for an option's
+/// transform(). CLI11 by itself reads a leading 0 as octal and lets a negative number wrap.
+///
+/// @param isWanted  which numbers are
+/// @param wanted    the same for the error message: "'3' is not {wanted}"
+CLI::Validator wholeNumber(std::function<bool(std::uint64_t)> isWanted, std::string wanted);
+
+}  // namespace quarzel::tool
