@@ -29,6 +29,8 @@ struct LaneLayout {
         std::vector<lanes::OctetSource> octets;
     };
 
+    static constexpr std::uint32_t octetLanes = lanes::octetLanes;
+
     std::uint32_t K;
     std::uint32_t segments;  ///< thread segments of a block
     std::uint32_t steps;     ///< trellis steps of a segment
@@ -36,17 +38,13 @@ struct LaneLayout {
     Sources natural;
     Sources interleaved;
 
-    std::uint32_t octets() const { return segments >= lanes::octetLanes ? segments / lanes::octetLanes : 1; }
-    std::uint32_t blocksPerBundle() const {
-        return segments >= lanes::octetLanes ? 1 : lanes::octetLanes / segments;
-    }
+    std::uint32_t octets() const { return segments >= octetLanes ? segments / octetLanes : 1; }
+    std::uint32_t blocksPerBundle() const { return segments >= octetLanes ? 1 : octetLanes / segments; }
     /// The segment in a lane of an octet, and the block of the bundle that it belongs to.
     std::uint32_t segmentOf(std::uint32_t octet, std::uint32_t lane) const {
-        return segments >= lanes::octetLanes ? lane * octets() + octet : lane % segments;
+        return segments >= octetLanes ? lane * octets() + octet : lane % segments;
     }
-    std::uint32_t blockOf(std::uint32_t lane) const {
-        return segments >= lanes::octetLanes ? 0 : lane / segments;
-    }
+    std::uint32_t blockOf(std::uint32_t lane) const { return segments >= octetLanes ? 0 : lane / segments; }
 };
 
 /// Lay out a block size.
