@@ -1,0 +1,44 @@
+// SPDX-License-Identifier: MIT
+#include <gtest/gtest.h>
+
+#include <cstdlib>
+
+#include "lanes/lane_setup.hpp"
+
+namespace quarzel::test {
+namespace {
+
+TEST(LaneCandidates, TheBestIsTheFirstThatTheMachineSupports) {
+    const auto supported = supportedCandidates();
+    ASSERT_FALSE(supported.empty());
+    EXPECT_STREQ(lanes::bestCandidate().name, supported.front().get().name);
+    // Runs on a machine whose best is known, an emulated one, say so.
+    if (const char* expected = std::getenv("QUARZEL_TEST_BEST_CANDIDATE")) {
+        EXPECT_STREQ(lanes::bestCandidate().name, expected);
+    }
+}
+
+TEST(LaneCandidates, TheLastRunsEverywhere) {
+    const lanes::Candidate& last = lanes::candidates().end()[-1];
+    EXPECT_STREQ(last.name, "baseline");
+    EXPECT_TRUE(last.supported());
+}
+
+TEST(LaneCandidates, KernelsComeByAscendingWidthFromEightLanesUp) {
+    for (const lanes::Candidate& candidate : lanes::candidates()) {
+        ASSERT_GE(candidate.kernelCount, 1U) << candidate.name;
+        for (std::size_t i = 0; i < candidate.kernelCount; ++i) {
+            EXPECT_EQ(candidate.kernels[i].width, std::size_t{8} << i) << candidate.name;
+        }
+    }
+}
+
+TEST(LaneCandidates, AModelStartsOutWithLanes) {
+    const State state = makeState();
+    EXPECT_TRUE(state->decoder->takesLanes(40));
+    state->decoder->disableLanes();
+    EXPECT_FALSE(state->decoder->takesLanes(40));
+}
+
+}  // namespace
+}  // namespace quarzel::test

@@ -1,0 +1,111 @@
+// SPDX-License-Identifier: MIT
+#pragma once
+
+#include <algorithm>
+#include <cstdlib>
+#include <functional>
+#include <iostream>
+#include <random>
+#include <string>
+#include <vector>
+
+#include "decoder/decoder_3gpu.hpp"
+#include "engine/lanes/lanes.hpp"
+#include "interface/state.hpp"
+#include "support/model.hpp"
+
+namespace quarzel::test {
+
+/// Whether the long run was asked for: environment variable QUARZEL_TEST_EXHAUSTIVE.
+inline bool exhaustive() {
+    return std::getenv("QUARZEL_TEST_EXHAUSTIVE") != nullptr;
+}
+
+/// The candidates that this machine can run, best first. Prints which these are and which are not.
+inline std::vector<std::reference_wrapper<const lanes::Candidate>> supportedCandidates() {
+    std::vector<std::reference_wrapper<const lanes::Candidate>> supported;
+    for (const lanes::Candidate& candidate : lanes::candidates()) {
+        const bool runs = candidate.supported();
+        std::cout << (runs ? "candidate run: " : "candidate SKIPPED, not supported here: ") << candidate.name
+                  << '\n';
+        if (runs) {
+            supported.emplace_back(candidate);
+        }
+    }
+    return supported;
+}
+
+inline TDecoder3GPU& decoderOf(const State& state) {
+    return dynamic_cast<TDecoder3GPU&>(*state->decoder);
+}
+
+/// A model that takes the lane road by an instruction set of the test's choice.
+inline State makeLaneState(int units, int tagWidth, int algorithm, const lanes::Candidate& candidate) {
+    State state = makeState(genericsOf(units, tagWidth, algorithm));
+    decoderOf(state).enableLanes(candidate);
+    return state;
+}
+
+/// A model that decodes everything literally.
+inline State makeLiteralState(int units, int tagWidth, int algorithm) {
+    State state = makeState(genericsOf(units, tagWidth, algorithm));
+    state->decoder->disableLanes();
+    return state;
+}
+
+/// A random number from `least` to `most`.
+inline int randomFrom(std::mt19937& random, int least, int most) {
+    return std::uniform_int_distribution<int>(least, most)(random);
+}
+
+/// Kinds of input, from likely to adverse.
+enum class Input {
+    noisy,      ///< an all-zero code word with noise
+    uniform,    ///< any 8-bit value
+    fullScale,  ///< +127 or -128
+    runs,       ///< +127 or -128 in runs of random length
+    plusMinusOne,
+    allEqual,
+};
+inline constexpr int inputKinds = 6;
+
+inline void fillStream(std::mt19937& random, Input kind, std::vector<int>& stream) {
+    std::normal_distribution<float> noise(-8.0F, 12.0F);
+    const auto sign = [&random] { return random() % 2 == 0; };
+    const auto end = [](bool positive) { return positive ? 127 : -128; };
+    const int same = randomFrom(random, -128, 127);
+    bool positive = sign();
+    for (int& value : stream) {
+        switch (kind) {
+            case Input::noisy:
+                value = std::clamp(static_cast<int>(noise(random)), -128, 127);
+                break;
+            case Input::uniform:
+                value = randomFrom(random, -128, 127);
+                break;
+            case Input::fullScale:
+                value = end(sign());
+                break;
+            case Input::runs:
+                positive = random() % 16 == 0 ? !positive : positive;
+                value = end(positive);
+                break;
+            case Input::plusMinusOne:
+                value = sign() ? 1 : -1;
+                break;
+            case Input::allEqual:
+                value = same;
+                break;
+        }
+    }
+}
+
+inline Block randomBlock(std::mt19937& random, Input kind, std::size_t K) {
+    Block block(K + 4);
+    for (std::vector<int>* stream : {&block.systematic, &block.parity1, &block.parity2}) {
+        fillStream(random, kind, *stream);
+    }
+    return block;
+}
+
+}  // namespace quarzel::test
