@@ -22,43 +22,68 @@ struct Batch {
     int* statuses;
 };
 
-/// Whether a buffer for decisions shares bytes with anything else of the batch. Then the order of the writes
-/// shows, and the blocks have to be decoded one after the other.
-bool outputsOverlap(const Batch& batch, int count) {
-    struct Range {
-        std::uintptr_t first;
-        std::uintptr_t end;
-        bool written;
-        bool operator<(const Range& other) const { return first < other.first; }
-    };
-    std::vector<Range> ranges;
-    ranges.reserve(4 * static_cast<std::size_t>(count));
-    const auto add = [&ranges](const void* first, std::size_t bytes, bool written) {
-        const auto start = reinterpret_cast<std::uintptr_t>(first);
-        ranges.push_back({start, start + bytes, written});
-    };
+/// Bytes of the caller's, by their addresses.
+struct Range {
+    std::uintptr_t first = 0;
+    std::uintptr_t end = 0;
+    bool written = false;
+
+    Range(const void* start, std::size_t bytes, bool isWritten)
+        : first(reinterpret_cast<std::uintptr_t>(start)), end(first + bytes), written(isWritten) {}
+
+    bool empty() const { return first == 0 || first == end; }
+};
+
+/// Call `visit` for the arrays of every block.
+template <class Visit>
+void forEachRange(const Batch& batch, int count, Visit visit) {
     for (int i = 0; i < count; ++i) {
         const auto& in = batch.inputs[i];
         const auto size = static_cast<std::size_t>(std::max(in.din_size, 0));
-        add(batch.outputs[i].dout, size, true);
-        add(in.rsc1_sys, size * sizeof(int), false);
-        add(in.rsc1_par, size * sizeof(int), false);
-        add(in.rsc2_par, size * sizeof(int), false);
+        for (const int* stream : {in.rsc1_sys, in.rsc1_par, in.rsc2_par}) {
+            visit(Range(stream, size * sizeof(int), false));
+        }
+        // A block has 4 decisions fewer than soft values.
+        visit(Range(batch.outputs[i].dout, size > 4 ? size - 4 : 0, true));
     }
-    std::sort(ranges.begin(), ranges.end());
+}
+
+/// Whether a buffer for decisions shares bytes with anything else of the batch. Then the order of the writes
+/// shows, and the blocks have to be decoded one after the other.
+bool outputsOverlap(const Batch& batch, int count) {
+    // Most callers keep decisions and soft values apart, and the buffers in their order.
+    std::uintptr_t readFirst = UINTPTR_MAX;
     std::uintptr_t readEnd = 0;
+    std::uintptr_t writtenFirst = UINTPTR_MAX;
     std::uintptr_t writtenEnd = 0;
-    for (const Range& range : ranges) {
-        if (range.first == 0 || range.first == range.end) {
-            continue;
+    bool ascending = true;
+    forEachRange(batch, count, [&](const Range& range) {
+        if (range.empty()) {
+            return;
         }
-        if (range.first < writtenEnd || (range.written && range.first < readEnd)) {
-            return true;
+        ascending = ascending && (!range.written || range.first >= writtenEnd);
+        std::uintptr_t& first = range.written ? writtenFirst : readFirst;
+        std::uintptr_t& end = range.written ? writtenEnd : readEnd;
+        first = std::min(first, range.first);
+        end = std::max(end, range.end);
+    });
+    if (ascending && (readEnd <= writtenFirst || writtenEnd <= readFirst)) {
+        return false;
+    }
+    std::vector<Range> ranges;
+    forEachRange(batch, count, [&](const Range& range) {
+        if (!range.empty()) {
+            ranges.push_back(range);
         }
+    });
+    std::sort(ranges.begin(), ranges.end(), [](const Range& x, const Range& y) { return x.first < y.first; });
+    readEnd = writtenEnd = 0;
+    return std::any_of(ranges.begin(), ranges.end(), [&](const Range& range) {
+        const bool overlaps = range.first < writtenEnd || (range.written && range.first < readEnd);
         std::uintptr_t& end = range.written ? writtenEnd : readEnd;
         end = std::max(end, range.end);
-    }
-    return false;
+        return overlaps;
+    });
 }
 
 /// Blocks that wait for others of their size, to be decoded together.
