@@ -6,7 +6,7 @@
 
 #include "decoder/segments.hpp"
 #include "decoder/tail_metrics.hpp"
-#include "interface/soft_input.hpp"
+#include "fixed/soft_value.hpp"
 #include "interleaver/interleaver.hpp"
 
 namespace quarzel {
