@@ -4,6 +4,8 @@
 // How a group is decoded: the one text of all instruction sets and widths. A file of an instruction set
 // includes it and names the widths.
 
+#include <cassert>
+#include <type_traits>
 #include <utility>
 
 #include "engine/lanes/lane_rules.hpp"
@@ -13,10 +15,6 @@
 namespace quarzel::lanes {
 namespace {
 
-/// Soft values as channel and extrinsic halves are bounded by the branch format, left-aligned in the state's.
-constexpr std::int16_t lowest = -2048;
-constexpr std::int16_t highest = 2032;
-
 /// Boundary metrics and the steps of the normalisation are multiples of 128, so that neither disturbs the
 /// other.
 constexpr std::int16_t boundaryGrain = -128;
@@ -25,12 +23,31 @@ constexpr std::int16_t boundaryGrain = -128;
 constexpr std::size_t normalisedRows = 8;
 constexpr std::size_t unboundedRows = 3;
 
+/// Bounds that docs/lanes.md derives: of the spread of the metrics once that many rows have passed, and of
+/// the largest metric where ratios use it.
+constexpr std::int16_t mostSpread = 12288;
+constexpr std::int16_t mostLargest = 127 + 7 * 2048;
+
 template <std::size_t W>
 using Metrics = StateWords<Lanes<W>>;
 
 template <std::size_t W>
 inline Lanes<W> largest(const Metrics<W>& m) {
     return max(max(max(m[0], m[1]), max(m[2], m[3])), max(max(m[4], m[5]), max(m[6], m[7])));
+}
+
+/// Whether the plain maximum may compare paths over these metrics.
+template <std::size_t W>
+inline bool withinBounds(const Metrics<W>& m) {
+    const Lanes<W> top = largest<W>(m);
+    Lanes<W> bottom = m[0];
+    unrolled<8>([&](auto state) { bottom = min(bottom, m[state]); });
+    for (std::size_t lane = 0; lane < W; ++lane) {
+        if (top.v[lane] < 0 || top.v[lane] > mostLargest || top.v[lane] - bottom.v[lane] > mostSpread) {
+            return false;
+        }
+    }
+    return true;
 }
 
 template <std::size_t W>
@@ -61,6 +78,9 @@ class GroupDecoder {
     using State = StateMetrics<Recursion>;
     static constexpr std::size_t slots = W / octetLanes;
     static constexpr std::size_t states = trellis::states;
+
+    template <class Rule>
+    static constexpr bool plainMaximum = std::is_same_v<std::decay_t<Rule>, PlainMaxLog<Word>>;
 
   public:
     explicit GroupDecoder(const LaneGroup& group)
@@ -158,6 +178,10 @@ class GroupDecoder {
         const Recursion rule = Rules::recursion();
         State state = load(loadMetrics<W>(start, itsRow));
         const auto step = [&](std::size_t t, const auto& llrRule) {
+            if constexpr (plainMaximum<decltype(llrRule)>) {
+                assert(withinBounds<W>(words(state)));
+                assert(withinBounds<W>(loadMetrics<W>(itsGroup.alphaRows + t * states * W, W)));
+            }
             const std::size_t row = window.bottom + t;
             const Word channel = Word::load(itsGroup.channelRows + t * W);
             const std::int16_t* alphaRow = itsGroup.alphaRows + t * states * W;
@@ -197,11 +221,11 @@ class GroupDecoder {
     void output(std::size_t row, std::size_t column, Word llr, Word channel, bool lastPass) const {
         const std::size_t at = row * itsRow + column * W;
         if constexpr (Code == 1) {
-            halfExtrinsic(llr, channel).store(itsGroup.extrinsic + at);
+            halfExtrinsic<Rules>(llr, channel).store(itsGroup.extrinsic + at);
         } else if (lastPass) {
             llr.store(itsGroup.channel + at);
         } else {
-            add(Word::load(itsGroup.systematic + at), halfExtrinsic(llr, channel))
+            add(Word::load(itsGroup.systematic + at), halfExtrinsic<Rules>(llr, channel))
                 .store(itsGroup.channel + at);
         }
     }
@@ -249,15 +273,6 @@ class GroupDecoder {
         const Word same = clamp(add(channel, parity));
         const Word opposite = clamp(sub(channel, parity));
         return {same, opposite, opposite, same};
-    }
-
-    /// Half the extrinsic value, kept to the state format's precision: the LLR less four times the intrinsic
-    /// value, scaled, clamped and halved. Every value is a multiple of 16, so that the truncating divisions
-    /// of the definition are exact and their order does not matter.
-    static Word halfExtrinsic(Word llr, Word channel) {
-        const Word half = sub(llr >> 1, channel);
-        const Word scaled = Rules::scaled ? sub(half, half >> 2) : half;
-        return max(min(scaled & Word::of(-16), Word::of((highest / 2) & -16)), Word::of(lowest / 2));
     }
 
     static void normalise(State& state) {

@@ -7,6 +7,10 @@
 namespace quarzel::lanes {
 namespace {
 
+/// Soft values as channel and extrinsic halves are bounded by the branch format, left-aligned in the state's.
+constexpr std::int16_t lowest = -2048;
+constexpr std::int16_t highest = 2032;
+
 /// Max-log with the plain maximum, for metrics that are kept from wrapping.
 template <class WordType>
 struct PlainMaxLog : MaxLog<WordType> {
@@ -79,6 +83,19 @@ struct LaneRules<W, 2> {
     static Recursion llr() { return Recursion({}); }
     static Recursion llrNearStart() { return Recursion({}); }
 };
+
+/// Half the extrinsic value, kept to the state format's precision: the LLR less four times the intrinsic
+/// value, scaled, clamped and halved. Every value is a multiple of 16, so that the truncating divisions of
+/// the definition are exact and their order does not matter.
+///
+/// @param channel  twice the intrinsic value
+template <class Rules>
+inline typename Rules::Word halfExtrinsic(typename Rules::Word llr, typename Rules::Word channel) {
+    using Word = typename Rules::Word;
+    const Word half = sub(llr >> 1, channel);
+    const Word scaled = Rules::scaled ? sub(half, half >> 2) : half;
+    return max(min(scaled & Word::of(-16), Word::of((highest / 2) & -16)), Word::of(lowest / 2));
+}
 
 }  // namespace
 }  // namespace quarzel::lanes
