@@ -1,0 +1,146 @@
+// SPDX-License-Identifier: MIT
+// The arithmetic of lanes on whole domains, against the literal road's definitions.
+#include <gtest/gtest.h>
+
+#include <algorithm>
+#include <string>
+#include <vector>
+
+#include "engine/engine_mod_base.hpp"
+#include "fixed/wrap16.hpp"
+#include "interface/soft_input.hpp"
+#include "lanes/lane_probe.hpp"
+#include "lanes/lane_setup.hpp"
+
+namespace quarzel::test {
+
+extern const LaneProbe baselineProbe;
+#if defined(__x86_64__)
+extern const LaneProbe sse41Probe;
+extern const LaneProbe avx2Probe;
+extern const LaneProbe avx512bwProbe;
+#endif
+
+namespace {
+
+using Words = std::vector<std::int16_t>;
+
+/// Calls `check` with the operations of every candidate that the machine supports.
+template <class Check>
+void forEachProbe(Check check) {
+    const struct {
+        const char* name;
+        const LaneProbe& probe;
+    } probes[] = {
+#if defined(__x86_64__)
+        {"avx512bw", avx512bwProbe},
+        {"avx2", avx2Probe},
+        {"sse4.1", sse41Probe},
+#endif
+        {"baseline", baselineProbe},
+    };
+    for (const lanes::Candidate& candidate : supportedCandidates()) {
+        const auto* found = std::find_if(std::begin(probes), std::end(probes), [&](const auto& known) {
+            return candidate.name == std::string(known.name);
+        });
+        ASSERT_NE(found, std::end(probes)) << candidate.name << " has no probe";
+        SCOPED_TRACE(candidate.name);
+        check(found->probe);
+    }
+}
+
+Words everyWord() {
+    Words words(65536);
+    for (int i = 0; i < 65536; ++i) {
+        words[static_cast<std::size_t>(i)] = wrap16(i);
+    }
+    return words;
+}
+
+TEST(LaneArithmetic, TheStaircaseIsTheCorrectionTableForEveryDifference) {
+    const TNumberFormat state(12, 3);
+    const std::vector<unsigned char> table = TCalculationEngineModBase::createLUT(16, &state);
+    ASSERT_EQ(table.size(), 65536U);
+    const Words differences = everyWord();
+    forEachProbe([&](const LaneProbe& probe) {
+        Words corrections(differences.size());
+        probe.staircase(differences.data(), corrections.data(), differences.size());
+        for (std::size_t i = 0; i < differences.size(); ++i) {
+            ASSERT_EQ(corrections[i], table[static_cast<std::size_t>(differences[i] + 32768)])
+                << differences[i];
+        }
+    });
+}
+
+/// The literal road: the extrinsic value of a pass, then what the next one makes of it.
+std::int16_t literalHalf(int llr, int channel, bool scaled) {
+    const int intrinsic = channel / 2;
+    const int extrinsic = llr - 4 * intrinsic;
+    const int value = std::clamp(scaled ? 3 * extrinsic / 4 : extrinsic, -2048, 2032) & (scaled ? -16 : -1);
+    return static_cast<std::int16_t>((value / 2) & -16);
+}
+
+TEST(LaneArithmetic, HalfTheExtrinsicValueIsTheDefinitionsForEveryRatioAndChannelValue) {
+    forEachProbe([&](const LaneProbe& probe) {
+        // A channel value is a soft value and half an extrinsic one.
+        for (int channel = -2048 - 1024; channel <= 2032 + 1008; channel += 16) {
+            Words llrs;
+            for (int llr = -32768; llr < 32768; llr += 16) {
+                llrs.push_back(static_cast<std::int16_t>(llr));
+            }
+            const Words channels(llrs.size(), static_cast<std::int16_t>(channel));
+            Words halves(llrs.size());
+            for (const bool scaled : {false, true}) {
+                probe.halfExtrinsic[scaled](llrs.data(), channels.data(), halves.data(), llrs.size());
+                for (std::size_t i = 0; i < llrs.size(); ++i) {
+                    ASSERT_EQ(halves[i], literalHalf(llrs[i], channel, scaled))
+                        << "LLR " << llrs[i] << ", channel value " << channel << ", scaled " << scaled;
+                }
+            }
+        }
+    });
+}
+
+// All pairs and all integers in the long run. Else every 251st x with every y, and every 61st value of an
+// integer's high half with every value of its low one.
+TEST(LaneArithmetic, TheModuloMaximumIsTheScalarOneForEveryPair) {
+    const Words y = everyWord();
+    forEachProbe([&](const LaneProbe& probe) {
+        Words larger(y.size());
+        for (int first = -32768; first < 32768; first += exhaustive() ? 1 : 251) {
+            const auto x = static_cast<std::int16_t>(first);
+            const Words same(y.size(), x);
+            probe.moduloMax(same.data(), y.data(), larger.data(), y.size());
+            for (std::size_t i = 0; i < y.size(); ++i) {
+                if (larger[i] != moduloMax(x, y[i])) {
+                    FAIL() << x << ' ' << y[i];
+                }
+            }
+        }
+    });
+}
+
+TEST(LaneArithmetic, SoftInputsAreConvertedAsInTheLiteralRoadForEveryInteger) {
+    const TNumberFormat input(8, 3);
+    const TNumberFormat state(12, 3);
+    constexpr std::uint64_t chunk = 65536;
+    forEachProbe([&](const LaneProbe& probe) {
+        std::vector<int> values(chunk);
+        Words converted(chunk);
+        for (std::uint64_t high = 0; high < 65536; high += exhaustive() ? 1 : 61) {
+            for (std::uint64_t low = 0; low < chunk; ++low) {
+                values[low] = static_cast<int>(static_cast<std::uint32_t>(high * chunk + low));
+            }
+            probe.toWords(values.data(), converted.data(), chunk);
+            for (std::uint64_t low = 0; low < chunk; ++low) {
+                int saturated = 0;
+                if (converted[low] != toSoftValue(values[low], input, state, saturated)) {
+                    FAIL() << values[low];
+                }
+            }
+        }
+    });
+}
+
+}  // namespace
+}  // namespace quarzel::test
