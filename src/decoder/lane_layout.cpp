@@ -28,15 +28,18 @@ bool findSources(const LaneLayout& layout, const std::vector<std::uint32_t>& per
     const std::uint32_t octets = layout.octets();
     sources.row.reserve(layout.steps);
     sources.octets.reserve(std::size_t{layout.steps} * octets);
+    // The position that a lane of row t reads.
+    const auto positionOf = [&](std::uint32_t octet, std::uint32_t lane, std::uint32_t t) {
+        return permutation[std::size_t{layout.segmentOf(octet, lane)} * layout.steps + t];
+    };
     for (std::uint32_t t = 0; t < layout.steps; ++t) {
         const std::uint32_t row = permutation[t] % layout.steps;
         sources.row.push_back(static_cast<std::uint16_t>(row));
         for (std::uint32_t octet = 0; octet < octets; ++octet) {
-            const std::uint32_t sourceOctet =
-                permutation[layout.segmentOf(octet, 0) * layout.steps + t] / layout.steps % octets;
+            const std::uint32_t sourceOctet = positionOf(octet, 0, t) / layout.steps % octets;
             lanes::Shuffle shuffle{};
             for (std::uint32_t lane = 0; lane < octetLanes; ++lane) {
-                const std::uint32_t position = permutation[layout.segmentOf(octet, lane) * layout.steps + t];
+                const std::uint32_t position = positionOf(octet, lane, t);
                 const std::uint32_t segment = position / layout.steps;
                 if (position % layout.steps != row || segment % octets != sourceOctet) {
                     return false;
@@ -44,8 +47,9 @@ bool findSources(const LaneLayout& layout, const std::vector<std::uint32_t>& per
                 const std::uint32_t source = layout.segments >= octetLanes
                                                  ? segment / octets
                                                  : layout.blockOf(lane) * layout.segments + segment;
-                shuffle.bytes[2 * lane] = static_cast<std::uint8_t>(2 * source);
-                shuffle.bytes[2 * lane + 1] = static_cast<std::uint8_t>(2 * source + 1);
+                const std::size_t byte = std::size_t{2} * lane;
+                shuffle.bytes[byte] = static_cast<std::uint8_t>(2 * source);
+                shuffle.bytes[byte + 1] = static_cast<std::uint8_t>(2 * source + 1);
             }
             sources.octets.push_back({static_cast<std::uint16_t>(sourceOctet), shuffles.indexOf(shuffle)});
         }
