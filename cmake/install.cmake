@@ -9,6 +9,9 @@ foreach(folder fixed interleaver engine decoder)
   install(DIRECTORY ${PROJECT_SOURCE_DIR}/src/${folder} DESTINATION ${CMAKE_INSTALL_INCLUDEDIR}/quarzel
           FILES_MATCHING PATTERN "*.hpp")
 endforeach()
+# What a state is made of, for programs that put a component of their own into one.
+install(FILES ${PROJECT_SOURCE_DIR}/src/interface/state.hpp
+        DESTINATION ${CMAKE_INSTALL_INCLUDEDIR}/quarzel/interface)
 install(EXPORT vardel_ip_quarzel NAMESPACE vardel_ip_quarzel:: DESTINATION ${package_dir}
         FILE vardel_ip_quarzel-targets.cmake)
 

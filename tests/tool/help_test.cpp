@@ -42,6 +42,9 @@ TEST(Help, TeachesDecode) {
 TEST(Help, TeachesInfo) {
     expectHelp({"info", "--help"}, "info_help.txt");
 }
+TEST(Help, TeachesTraceDiff) {
+    expectHelp({"trace-diff", "--help"}, "trace_diff_help.txt");
+}
 
 TEST(Help, HasAShortOption) {
     EXPECT_EQ(runTool({"decode", "-h"}).out, runTool({"decode", "--help"}).out);

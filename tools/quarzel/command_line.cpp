@@ -11,6 +11,7 @@
 #include "decode_command.hpp"
 #include "info_command.hpp"
 #include "tool_error.hpp"
+#include "trace_diff_command.hpp"
 
 namespace quarzel::tool {
 
@@ -25,6 +26,8 @@ error.
 Examples:
   quarzel info 6144
   quarzel decode capture.npy --units 8 --reference sent.npy
+  quarzel decode capture.npy --trace 12 --trace-file model.txt
+  quarzel trace-diff model.txt simulation.txt --ignore-termination
 )";
 
 class HelpFormatter : public CLI::Formatter {
@@ -38,6 +41,11 @@ class HelpFormatter : public CLI::Formatter {
 
     std::string make_usage(const CLI::App* app, std::string name) const override {
         return '\n' + Formatter::make_usage(app, name);
+    }
+
+    std::string make_option_opts(const CLI::Option* option) const override {
+        const std::string type = option->get_type_name();
+        return type.empty() ? "" : ' ' + type;
     }
 };
 
@@ -59,7 +67,7 @@ std::string problemWith(const CLI::App& app, const CLI::ParseError& error) {
 
 }  // namespace
 
-void runCommandLine(int argc, const char* const* argv, std::ostream& results) {
+ExitCode runCommandLine(int argc, const char* const* argv, std::ostream& results) {
     CLI::App app(description, "quarzel");
     app.formatter(std::make_shared<HelpFormatter>());
     app.set_help_flag("-h,--help", "Print help");
@@ -68,6 +76,8 @@ void runCommandLine(int argc, const char* const* argv, std::ostream& results) {
     app.require_subcommand(1);
     addDecodeCommand(app, results);
     addInfoCommand(app, results);
+    ExitCode exitCode = ExitCode::done;
+    addTraceDiffCommand(app, results, exitCode);
     try {
         app.parse(argc, argv);
     } catch (const CLI::CallForHelp&) {
@@ -80,6 +90,7 @@ void runCommandLine(int argc, const char* const* argv, std::ostream& results) {
         throw ToolError(ExitCode::usage, "", problemWith(app, error),
                         fmt::format("see 'quarzel {}--help'", command));
     }
+    return exitCode;
 }
 
 }  // namespace quarzel::tool

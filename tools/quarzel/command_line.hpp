@@ -3,11 +3,14 @@
 
 #include <ostream>
 
+#include "tool_error.hpp"
+
 namespace quarzel::tool {
 
 /// Do what the command line asks for.
 /// @param results  receives what the user asked for, help included, and nothing else
+/// @return        how the tool is to end
 /// @throws ToolError when the command line is wrong or its command fails
-void runCommandLine(int argc, const char* const* argv, std::ostream& results);
+ExitCode runCommandLine(int argc, const char* const* argv, std::ostream& results);
 
 }  // namespace quarzel::tool

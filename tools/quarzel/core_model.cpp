@@ -2,10 +2,11 @@
 #include "core_model.hpp"
 
 #include "tool_error.hpp"
+#include "trace_decoder.hpp"
 
 namespace quarzel::tool {
 
-CoreModel::CoreModel(int units, int algorithm) {
+CoreModel::CoreModel(int units, int algorithm, TraceWriter* trace) {
     vardel_ip_quarzel_generics generics;
     vardel_ip_quarzel_get_default_generics(&generics);
     generics.C_NUM_PU = units;
@@ -14,6 +15,9 @@ CoreModel::CoreModel(int units, int algorithm) {
     if (itsState == nullptr) {
         throw ToolError(ExitCode::decodingFailed, "", "no model of the core could be made",
                         "the line above says why");
+    }
+    if (trace != nullptr) {
+        traceTo(*trace, *itsState);
     }
 }
 

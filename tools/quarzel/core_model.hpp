@@ -9,13 +9,20 @@
 
 namespace quarzel::tool {
 
+class TraceWriter;
+
 /// One configured core, behind the C interface.
 class CoreModel {
   public:
     /// @param units      processing units: 2, 4 or 8
     /// @param algorithm  0 max-log, 1 max-log with scaling, 2 max-star
+    /// @param trace      receives the traces; not owned, must outlive the model. Null when there are to be
+    /// none
     /// @throws ToolError when the library makes no model; it has said why
-    CoreModel(int units, int algorithm);
+    CoreModel(int units, int algorithm, TraceWriter* trace = nullptr);
+
+    /// Trace the next `passes` passes.
+    void trace(unsigned passes) { vardel_ip_quarzel_bitacc_dump_config(itsState.get(), passes); }
 
     /// Decode a block.
     /// @param bits  its K entries receive the decisions, 0 or 1

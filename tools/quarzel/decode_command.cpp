@@ -5,7 +5,6 @@
 #include <unistd.h>
 
 #include <chrono>
-#include <filesystem>
 #include <iostream>
 #include <memory>
 #include <optional>
@@ -19,6 +18,8 @@
 #include "output_file.hpp"
 #include "progress.hpp"
 #include "tool_error.hpp"
+#include "trace_file.hpp"
+#include "trace_options.hpp"
 
 namespace quarzel::tool {
 
@@ -29,6 +30,7 @@ struct DecodeOptions {
     std::optional<std::string> reference;
     std::optional<std::string> output;
     CoreOptions core;
+    TraceOptions trace;
     bool json = false;
 };
 
@@ -51,61 +53,108 @@ Files:
   BITS     npy of uint8, shape (blocks, K/8): 8 bits to a byte, the first bit
            highest, as numpy.packbits(bits, axis=1) makes them.
   OUT      the same. It is written whole or not at all.
+  FILE     every value of every trellis step of the passes traced, as text for
+           'quarzel trace-diff' or as rows of block, pass, step, signal, state,
+           raw and real value. It is written whole or not at all, too.
 
-Example:
+Examples:
   quarzel decode capture.npy --units 8 --reference sent.npy -o decided.npy
+  quarzel decode capture.npy --units 8 --trace 12 --trace-block 5
 
-  decodes capture.npy as a core with 8 processing units does, compares the
-  decisions with the bits that were sent and keeps them in decided.npy. Bit
-  errors are a result, not a failure: the exit code is 0.
+  The first decodes capture.npy as a core with 8 processing units does, compares
+  the decisions with the bits that were sent and keeps them in decided.npy. Bit
+  errors are a result, not a failure: the exit code is 0. The second prints the
+  trace of 12 passes, which are 6 iterations, of the fifth block.
 )";
 
-/// Throw when writing `output` would replace a file that is read.
-void refuseToOverwrite(const std::string& output, const std::string& input) {
-    std::error_code ignored;
-    if (std::filesystem::equivalent(output, input, ignored)) {
-        throw ToolError(ExitCode::usage, "-o", fmt::format("{} is also read", output), "give another name");
+/// Throw when the file could not be written, or writing it would replace a file that is read.
+/// @param option  the option that names the file
+void checkOutput(const char* option, const std::string& file, const DecodeOptions& options) {
+    if (file.empty()) {
+        throw ToolError(ExitCode::usage, option, "the name of the file is empty", "give one");
+    }
+    if (isSameFile(file, options.capture) || (options.reference && isSameFile(file, *options.reference))) {
+        throw ToolError(ExitCode::usage, option, fmt::format("{} is also read", file), "give another name");
+    }
+    probeOutput(file);
+}
+
+void checkOutputs(const DecodeOptions& options) {
+    if (options.output) {
+        checkOutput("-o", *options.output, options);
+    }
+    const TraceOptions& trace = options.trace;
+    if (!trace.passes) {
+        return;
+    }
+    if (trace.isToStandardOutput()) {
+        if (options.json) {
+            throw ToolError(ExitCode::usage, "--json", "the trace goes to standard output",
+                            "name a file for it with --trace-file");
+        }
+        return;
+    }
+    checkOutput("--trace-file", trace.file, options);
+    if (options.output && isSameFile(*options.output, trace.file)) {
+        throw ToolError(ExitCode::usage, "--trace-file",
+                        fmt::format("{} is also the output of -o", trace.file), "give another name");
     }
 }
 
-PackedBits decodeBlocks(const Capture& capture, const DecodeOptions& options) {
-    CoreModel core(options.core.units, options.core.algorithm);
+/// The trace that the user wants, or null.
+std::unique_ptr<TraceFile> openTrace(const Capture& capture, const DecodeOptions& options,
+                                     std::ostream& results) {
+    const TraceOptions& trace = options.trace;
+    if (!trace.passes) {
+        return nullptr;
+    }
+    if (trace.block > capture.blocks.size()) {
+        throw ToolError(ExitCode::usage, "--trace-block",
+                        fmt::format("{} has no block {}", options.capture, trace.block),
+                        fmt::format("give a number from 1 to {}", capture.blocks.size()));
+    }
+    return std::make_unique<TraceFile>(trace, results);
+}
+
+PackedBits decodeBlocks(const Capture& capture, const DecodeOptions& options, TraceFile* trace) {
+    CoreModel core(options.core.units, options.core.algorithm, trace ? &trace->writer() : nullptr);
     PackedBits decisions{capture.blockSize / 8, {}};
     std::vector<unsigned char> bits(capture.blockSize);
     const std::size_t total = capture.blocks.size();
     Progress progress(std::cerr, ::isatty(STDERR_FILENO) != 0, total);
     for (std::size_t block = 0; block < total; ++block) {
+        if (trace != nullptr && block + 1 == options.trace.block) {
+            core.trace(*options.trace.passes);
+        }
         if (const int status = core.decode(capture.blocks[block], options.core.iterations, bits)) {
             throw ToolError(
                 ExitCode::decodingFailed, options.capture,
                 fmt::format("block {} of {} could not be decoded (status {})", block + 1, total, status),
                 "the line above says why");
         }
+        if (trace != nullptr) {
+            trace->check();
+        }
         decisions.append(bits);
         progress.update(block + 1);
+    }
+    if (trace != nullptr) {
+        trace->finish();
     }
     return decisions;
 }
 
 void decode(const DecodeOptions& options, std::ostream& results) {
-    if (options.output) {
-        if (options.output->empty()) {
-            throw ToolError(ExitCode::usage, "-o", "the name of the file is empty", "give one");
-        }
-        refuseToOverwrite(*options.output, options.capture);
-        if (options.reference) {
-            refuseToOverwrite(*options.output, *options.reference);
-        }
-        probeOutput(*options.output);
-    }
+    checkOutputs(options);
     const Capture capture = readCapture(options.capture);
     std::optional<PackedBits> reference;
     if (options.reference) {
         reference = readBits(*options.reference, capture.blocks.size(), capture.blockSize / 8);
     }
+    const std::unique_ptr<TraceFile> trace = openTrace(capture, options, results);
 
     const auto start = std::chrono::steady_clock::now();
-    const PackedBits decisions = decodeBlocks(capture, options);
+    const PackedBits decisions = decodeBlocks(capture, options, trace.get());
     const std::chrono::duration<double> duration = std::chrono::steady_clock::now() - start;
 
     if (options.output) {
@@ -116,7 +165,9 @@ void decode(const DecodeOptions& options, std::ostream& results) {
     if (reference) {
         report.errors = countErrors(decisions, *reference);
     }
-    (options.json ? printJson : printText)(results, report);
+    // Standard output that holds a trace holds nothing else.
+    const bool isTraceInResults = trace != nullptr && options.trace.isToStandardOutput();
+    (options.json ? printJson : printText)(isTraceInResults ? std::cerr : results, report);
 }
 
 }  // namespace
@@ -131,6 +182,7 @@ void addDecodeCommand(CLI::App& app, std::ostream& results) {
         ->type_name("BITS");
     command->add_option("-o,--output", options->output, "Write the decided bits to this file")
         ->type_name("OUT");
+    addTraceOptions(*command, options->trace);
     command->add_flag("--json", options->json, "Print one JSON object instead of text");
     command->callback([options, &results] { decode(*options, results); });
 }

@@ -24,8 +24,9 @@ int main(int argc, char** argv) {
     std::ostream results(std::cout.rdbuf(std::cerr.rdbuf()));
     // A write beyond the limit of file sizes then fails with an error that the user is told.
     std::signal(SIGXFSZ, SIG_IGN);
+    ExitCode exitCode = ExitCode::done;
     try {
-        quarzel::tool::runCommandLine(argc, argv, results);
+        exitCode = quarzel::tool::runCommandLine(argc, argv, results);
     } catch (const ToolError& error) {
         return fail(error.code(), error.what());
     } catch (const std::bad_alloc&) {
@@ -36,5 +37,5 @@ int main(int argc, char** argv) {
         return fail(ExitCode::file,
                     "standard output: cannot be written; free some space or send it elsewhere");
     }
-    return static_cast<int>(ExitCode::done);
+    return static_cast<int>(exitCode);
 }

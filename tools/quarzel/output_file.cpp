@@ -91,40 +91,6 @@ class OpenFile {
     std::string itsShown;
 };
 
-/// A file beside a target that vanishes unless it takes the target's place.
-class TemporaryFile {
-  public:
-    TemporaryFile(fs::path target, const std::string& shown)
-        : itsTarget(std::move(target)),
-          itsName(itsTarget.parent_path() / fmt::format(".quarzel-{}.tmp", ::getpid())),
-          itsShown(shown),
-          itsFile(itsName.string(), O_CREAT | O_EXCL, shown) {}
-    TemporaryFile(const TemporaryFile&) = delete;
-    TemporaryFile& operator=(const TemporaryFile&) = delete;
-    ~TemporaryFile() {
-        if (!itsName.empty()) {
-            ::unlink(itsName.c_str());
-        }
-    }
-
-    void write(std::string_view bytes) { itsFile.write(bytes); }
-
-    void takePlace() {
-        itsFile.sync();
-        itsFile.close();
-        if (::rename(itsName.c_str(), itsTarget.c_str()) != 0) {
-            throw writeError(itsShown);
-        }
-        itsName.clear();
-    }
-
-  private:
-    fs::path itsTarget;
-    fs::path itsName;
-    std::string itsShown;
-    OpenFile itsFile;
-};
-
 /// The file that a name stands for: links are followed, so that they stay links.
 fs::path targetOf(const std::string& file) {
     std::error_code error;
@@ -139,6 +105,64 @@ bool isWrittenDirectly(const fs::path& target) {
 
 }  // namespace
 
+/// The open file: the output itself, or one beside it that vanishes unless it takes the output's place.
+class OutputFile::Target {
+  public:
+    explicit Target(const std::string& shown)
+        : itsTarget(targetOf(shown)),
+          itsTemporaryName(isWrittenDirectly(itsTarget)
+                               ? fs::path()
+                               : itsTarget.parent_path() / fmt::format(".quarzel-{}.tmp", ::getpid())),
+          itsShown(shown),
+          itsFile(itsTemporaryName.empty() ? OpenFile(itsTarget.string(), 0, shown)
+                                           : OpenFile(itsTemporaryName.string(), O_CREAT | O_EXCL, shown)) {}
+    Target(const Target&) = delete;
+    Target& operator=(const Target&) = delete;
+    ~Target() {
+        if (!itsTemporaryName.empty()) {
+            ::unlink(itsTemporaryName.c_str());
+        }
+    }
+
+    void write(std::string_view bytes) { itsFile.write(bytes); }
+
+    void finish() {
+        if (itsTemporaryName.empty()) {
+            itsFile.close();
+            return;
+        }
+        itsFile.sync();
+        itsFile.close();
+        if (::rename(itsTemporaryName.c_str(), itsTarget.c_str()) != 0) {
+            throw writeError(itsShown);
+        }
+        itsTemporaryName.clear();
+    }
+
+  private:
+    fs::path itsTarget;
+    fs::path itsTemporaryName;  ///< empty: none
+    std::string itsShown;
+    OpenFile itsFile;
+};
+
+OutputFile::OutputFile(const std::string& file) : itsTarget(std::make_unique<Target>(file)) {}
+OutputFile::~OutputFile() = default;
+
+void OutputFile::write(std::string_view bytes) {
+    itsTarget->write(bytes);
+}
+
+void OutputFile::finish() {
+    itsTarget->finish();
+}
+
+bool isSameFile(const std::string& a, const std::string& b) {
+    std::error_code ignored;
+    const fs::path first = fs::weakly_canonical(a, ignored);
+    return fs::equivalent(a, b, ignored) || (!first.empty() && first == fs::weakly_canonical(b, ignored));
+}
+
 void probeOutput(const std::string& file) {
     const fs::path target = targetOf(file);
     std::error_code ignored;
@@ -149,21 +173,14 @@ void probeOutput(const std::string& file) {
         throw writeError(file);
     }
     if (!isWrittenDirectly(target)) {
-        const TemporaryFile probe(target, file);
+        const OutputFile probe(file);
     }
 }
 
 void writeOutput(const std::string& file, std::string_view bytes) {
-    const fs::path target = targetOf(file);
-    if (isWrittenDirectly(target)) {
-        OpenFile output(target.string(), 0, file);
-        output.write(bytes);
-        output.close();
-    } else {
-        TemporaryFile output(target, file);
-        output.write(bytes);
-        output.takePlace();
-    }
+    OutputFile output(file);
+    output.write(bytes);
+    output.finish();
 }
 
 }  // namespace quarzel::tool

@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: MIT
 #pragma once
 
+#include <memory>
 #include <string>
 #include <string_view>
 
@@ -12,6 +13,28 @@ namespace quarzel::tool {
 /// Find out before long work whether an output could be written; nothing is left behind.
 /// @throws ToolError when not
 void probeOutput(const std::string& file);
+
+/// Whether two names stand for one file, be it there yet or not.
+bool isSameFile(const std::string& a, const std::string& b);
+
+/// An output that is written piece by piece. Without `finish` it is not there.
+class OutputFile {
+  public:
+    /// @throws ToolError when it cannot be written
+    explicit OutputFile(const std::string& file);
+    ~OutputFile();
+
+    /// @throws ToolError when that fails
+    void write(std::string_view bytes);
+
+    /// Put what was written in its place, at the end.
+    /// @throws ToolError when that fails
+    void finish();
+
+  private:
+    class Target;
+    std::unique_ptr<Target> itsTarget;
+};
 
 /// Write an output.
 /// @throws ToolError when that fails

@@ -1,0 +1,530 @@
+// SPDX-License-Identifier: MIT
+#include <gtest/gtest.h>
+
+#include <nlohmann/json.hpp>
+#include <regex>
+
+#include "npy_data.hpp"
+#include "run_tool.hpp"
+#include "trace_cases.hpp"
+
+namespace quarzel::test {
+
+namespace {
+
+// Lines of the small trace, from 0: inputs at 1 to 6, the rows of pass 0 from 10, those of pass 1 from 56;
+// block 2 has its inputs at 100 to 105 and the rows of its pass 0 from 109. A pass has the steps 0 to 42.
+constexpr std::size_t firstPass = 10;
+constexpr std::size_t secondPass = 56;
+constexpr std::size_t secondBlock = 99;
+constexpr std::size_t lastPass = 109;
+
+/// The small trace, to be compared with itself after some changes.
+class TraceDiff : public testing::Test {
+  protected:
+    /// Compare it with a text.
+    ToolRun compareWith(const std::string& other, std::vector<std::string> options = {}) const {
+        itsDirectory.write("b.txt", other);
+        options.insert(options.begin(), {"trace-diff", a, b});
+        return runTool(options);
+    }
+
+    /// The same with the lines that a test may have changed.
+    ToolRun compare(const std::vector<std::string>& options = {}) const {
+        return compareWith(textOf(lines), options);
+    }
+
+    /// Put another number in the place of one in a line.
+    /// @param word  its number in the line, from 0
+    void change(std::size_t line, std::size_t word, const std::string& number) {
+        std::vector<std::string> words = wordsOf(lines.at(line));
+        words.at(word) = number;
+        lines[line].clear();
+        for (const std::string& each : words) {
+            lines[line] += each + "  ";
+        }
+    }
+
+    /// What a report begins with.
+    std::string head(const std::string& result) const {
+        return "A             " + a + "\nB             " + b + "\nresult        " + result + '\n';
+    }
+
+    const TemporaryDirectory itsDirectory;
+    const std::string text = smallTraceCase().text;
+    std::vector<std::string> lines = linesOf(text);
+    const std::string a = itsDirectory.write("a.txt", text);
+    const std::string b = itsDirectory.path("b.txt");
+    const std::string equal = head("the traces are equal") + "compared      2 blocks, 3 passes\n";
+};
+
+std::string expectedError(const std::string& file, const std::string& problem) {
+    return "quarzel: error: " + file + ": " + problem + '\n';
+}
+
+}  // namespace
+
+TEST_F(TraceDiff, FindsATraceEqualToItself) {
+    const ToolRun run = compare();
+    EXPECT_EQ(run.out, equal);
+    EXPECT_EQ(run.err, "");
+    EXPECT_EQ(run.exitCode, 0);
+    EXPECT_EQ(compare({"--json"}).out,
+              "{\"a\":\"" + a + "\",\"b\":\"" + b +
+                  "\",\"equal\":true,\"blocks\":2,\"passes\":3,\"termination_values\":0,"
+                  "\"termination_only\":false}\n");
+}
+
+TEST_F(TraceDiff, FindsEveryStoredTraceEqualToItself) {
+    for (const TraceCase& trace : traceCases()) {
+        const std::string file = itsDirectory.write(trace.name, trace.text);
+        EXPECT_EQ(runTool({"trace-diff", file, file}).exitCode, 0) << trace.name;
+    }
+}
+
+TEST_F(TraceDiff, ReadsEitherTraceFromStandardInput) {
+    compare();
+    for (const std::string& files : {"- " + b, a + " -"}) {
+        const ToolRun run = runTool({"-c", "cat " + a + " | " + QUARZEL_TOOL + " trace-diff " + files},
+                                    {.program = "/bin/sh"});
+        EXPECT_NE(run.out.find("             standard input\n"), std::string::npos) << run.out;
+        EXPECT_NE(run.out.find("the traces are equal\n"), std::string::npos) << run.out;
+        EXPECT_EQ(run.exitCode, 0) << run.err;
+    }
+}
+
+TEST_F(TraceDiff, RefusesToReadBothTracesFromStandardInput) {
+    const ToolRun run = runTool({"trace-diff", "-", "-"});
+    EXPECT_EQ(run.err, expectedError("B", "standard input is already read as A; name a file"));
+    EXPECT_EQ(run.exitCode, 2);
+}
+
+TEST_F(TraceDiff, OverlooksCarriageReturnsAndBlanksAtTheEndsOfLines) {
+    for (const char* end : {"\r\n", "   \n", " \t\r\n"}) {
+        std::string other;
+        for (const std::string& line : lines) {
+            other += line + end;
+        }
+        EXPECT_EQ(compareWith(other).out, equal);
+    }
+}
+
+TEST_F(TraceDiff, OverlooksHowANumberIsWritten) {
+    EXPECT_EQ(compareWith(std::regex_replace(text, std::regex("(\\.[0-9]*[1-9])0+"), "$1")).out, equal);
+    EXPECT_EQ(compareWith(std::regex_replace(text, std::regex("\\.000000"), "")).out, equal);
+    EXPECT_EQ(compareWith(std::regex_replace(text, std::regex("\\+0\\.000000"), "-0.0")).out, equal);
+    EXPECT_EQ(compareWith(std::regex_replace(text, std::regex("\\+"), "")).out, equal);
+    EXPECT_EQ(compareWith(std::regex_replace(text, std::regex("  +"), " ")).out, equal);
+}
+
+TEST_F(TraceDiff, OverlooksRulersWarningsAndEmptyLinesBetweenTables) {
+    lines[0] = "---";
+    lines.insert(lines.begin() + secondBlock,
+                 {"", "WARNING:decoder:Input block tag has been truncated", "  "});
+    lines.push_back("");
+    EXPECT_EQ(compare().out, equal);
+}
+
+TEST_F(TraceDiff, NamesEverySignalAndState) {
+    const std::vector<std::pair<std::string, int>> columns = {
+        {"int", -1}, {"a", 0}, {"a", 1}, {"a", 2}, {"a", 3}, {"a", 4},    {"a", 5},   {"a", 6},
+        {"a", 7},    {"b", 0}, {"b", 1}, {"b", 2}, {"b", 3}, {"b", 4},    {"b", 5},   {"b", 6},
+        {"b", 7},    {"g", 4}, {"g", 5}, {"g", 6}, {"g", 7}, {"llr", -1}, {"ext", -1}};
+    const std::vector<std::string> original = lines;
+    for (std::size_t column = 0; column < columns.size(); ++column) {
+        const std::size_t step = 3 + column;
+        const double value = std::stod(wordsOf(original[secondPass + step]).at(1 + column));
+        lines = original;
+        change(secondPass + step, 1 + column, std::to_string(value + 0.125));
+        const ToolRun run = compare({"--json"});
+        ASSERT_EQ(run.exitCode, 1) << run.err;
+        const auto report = nlohmann::json::parse(run.out);
+        const auto& [signal, state] = columns[column];
+        EXPECT_EQ(report["equal"], false);
+        EXPECT_EQ(report["block"], 1);
+        EXPECT_EQ(report["pass"], 1);
+        EXPECT_EQ(report["code"], 1);
+        EXPECT_EQ(report["step"], step);
+        EXPECT_EQ(report["signal"], signal);
+        EXPECT_EQ(report["state"], state < 0 ? nlohmann::json() : nlohmann::json(state));
+        EXPECT_EQ(report["value_a"]["real"], value);
+        EXPECT_EQ(report["value_b"]["real"], value + 0.125);
+        EXPECT_EQ(report["value_a"]["raw"], static_cast<int>(8 * value));
+        EXPECT_EQ(report["value_b"]["raw"], static_cast<int>(8 * value) + 1);
+        EXPECT_EQ(report["value_a"]["line"], secondPass + step + 1);
+        EXPECT_EQ(report["value_b"]["line"], secondPass + step + 1);
+        EXPECT_EQ(report["further"], 0);
+        EXPECT_EQ(report["termination_only"], false);
+    }
+}
+
+TEST_F(TraceDiff, NamesEveryStreamOfSoftInputs) {
+    const std::vector<std::string> streams = {"code1_sys", "code1_par0", "code1_par1",
+                                              "code2_sys", "code2_par0", "code2_par1"};
+    const std::vector<std::string> original = lines;
+    for (std::size_t stream = 0; stream < streams.size(); ++stream) {
+        lines = original;
+        std::string& line = lines.at(secondBlock + 1 + stream);
+        const std::size_t last = line.rfind(' ') + 1;
+        const int word = std::stoi(line.substr(last));
+        line = line.substr(0, last) + std::to_string(word + 16) + ']';
+        const ToolRun run = compare({"--json"});
+        ASSERT_EQ(run.exitCode, 1) << run.err;
+        const auto report = nlohmann::json::parse(run.out);
+        EXPECT_EQ(report["block"], 2);
+        EXPECT_EQ(report["pass"], nlohmann::json());
+        EXPECT_EQ(report["code"], nlohmann::json());
+        EXPECT_EQ(report["step"], 42);
+        EXPECT_EQ(report["signal"], streams[stream]);
+        EXPECT_EQ(report["state"], nlohmann::json());
+        EXPECT_EQ(report["value_a"]["raw"], word / 16);
+        EXPECT_EQ(report["value_b"]["raw"], word / 16 + 1);
+        EXPECT_EQ(report["value_b"]["real"], (word / 16 + 1) / 8.0);
+        EXPECT_EQ(report["value_b"]["line"], secondBlock + 2 + stream);
+        EXPECT_EQ(report["further"], 0);
+    }
+}
+
+TEST_F(TraceDiff, ReportsTheFirstValueThatDiffersWithTheStepsAroundIt) {
+    change(secondPass + 17, 19, "-9.25");
+    change(secondPass + 18, 18, "+0.125000");
+    change(secondPass + 30, 22, "0");
+    const ToolRun run = compare();
+    EXPECT_EQ(run.out, head("the traces differ") +
+                           "block         1 (decode=0)\n"
+                           "pass          1: constituent code 1 in natural order\n"
+                           "step          17 of 0 to 42\n"
+                           "signal        g5: branch metric, element 1\n"
+                           "value in A    +0.125000, raw 1, line 74\n"
+                           "value in B    -9.250000, raw -74, line 74\n"
+                           "further       2 values of this pass differ\n"
+                           "\n"
+                           "step     g4           g5           g6           g7\n"
+                           "  14  A  -0.875000    -0.875000    -0.375000    -0.375000\n"
+                           "  14  B  -0.875000    -0.875000    -0.375000    -0.375000\n"
+                           "  15  A  -0.500000    -0.500000    -0.750000    -0.750000\n"
+                           "  15  B  -0.500000    -0.500000    -0.750000    -0.750000\n"
+                           "  16  A  -2.125000    -2.125000    +2.125000    +2.125000\n"
+                           "  16  B  -2.125000    -2.125000    +2.125000    +2.125000\n"
+                           "  17  A  +0.125000    +0.125000    -1.125000    -1.125000\n"
+                           "  17  B  +0.125000   *-9.250000    -1.125000    -1.125000\n"
+                           "  18  A  -0.250000    -0.250000    +0.750000    +0.750000\n"
+                           "  18  B *+0.125000    -0.250000    +0.750000    +0.750000\n"
+                           "  19  A  +0.375000    +0.375000    -7.125000    -7.125000\n"
+                           "  19  B  +0.375000    +0.375000    -7.125000    -7.125000\n"
+                           "  20  A  -1.000000    -1.000000    -2.000000    -2.000000\n"
+                           "  20  B  -1.000000    -1.000000    -2.000000    -2.000000\n");
+    EXPECT_EQ(run.err, "");
+    EXPECT_EQ(run.exitCode, 1);
+}
+
+TEST_F(TraceDiff, ReportsASoftInputThatDiffers) {
+    lines[secondBlock + 2].replace(0, 27, "itsPar0[0]=[272 -16 32 256 ");
+    const ToolRun run = compare();
+    EXPECT_EQ(run.out, head("the traces differ") +
+                           "block         2 (decode=1)\n"
+                           "pass          none: soft inputs of the block\n"
+                           "step          1 of 0 to 42\n"
+                           "signal        code1_par0: first parity of constituent code 1\n"
+                           "value in A    +0.875000, raw 7, line 102\n"
+                           "value in B    -0.125000, raw -1, line 102\n"
+                           "further       1 value of these soft inputs differs\n"
+                           "\n"
+                           "step     code1_par0\n"
+                           "   0  A  +2.125000\n"
+                           "   0  B  +2.125000\n"
+                           "   1  A  +0.875000\n"
+                           "   1  B *-0.125000\n"
+                           "   2  A  +0.125000\n"
+                           "   2  B *+0.250000\n"
+                           "   3  A  +2.000000\n"
+                           "   3  B  +2.000000\n"
+                           "   4  A  -1.375000\n"
+                           "   4  B  -1.375000\n");
+    EXPECT_EQ(run.exitCode, 1);
+}
+
+TEST_F(TraceDiff, ReportsADifferenceInTheFirstStep) {
+    change(firstPass, 22, "0.25");
+    EXPECT_EQ(compare().out, head("the traces differ") +
+                                 "block         1 (decode=0)\n"
+                                 "pass          0: constituent code 2 in interleaved order\n"
+                                 "step          0 of 0 to 42\n"
+                                 "signal        llr: log-likelihood ratio\n"
+                                 "value in A    +5.500000, raw 44, line 11\n"
+                                 "value in B    +0.250000, raw 2, line 11\n"
+                                 "further       0 values of this pass differ\n"
+                                 "\n"
+                                 "step     llr\n"
+                                 "   0  A  +5.500000\n"
+                                 "   0  B *+0.250000\n"
+                                 "   1  A  +0.250000\n"
+                                 "   1  B  +0.250000\n"
+                                 "   2  A  +0.250000\n"
+                                 "   2  B  +0.250000\n"
+                                 "   3  A  -6.750000\n"
+                                 "   3  B  -6.750000\n");
+}
+
+TEST_F(TraceDiff, TellsWhenOnlyTerminationStepsDiffer) {
+    change(secondPass + 42, 23, "0.25");
+    change(lastPass + 41, 23, "0.25");
+    const ToolRun run = compare();
+    EXPECT_EQ(run.out, head("the traces differ in termination steps alone") +
+                           "block         1 (decode=0)\n"
+                           "pass          1: constituent code 1 in natural order\n"
+                           "step          42 of 0 to 42\n"
+                           "signal        ext: extrinsic value\n"
+                           "value in A    -0.750000, raw -6, line 99\n"
+                           "value in B    +0.250000, raw 2, line 99\n"
+                           "further       0 values of this pass differ\n"
+                           "note          termination steps, which hardware does not compute, hold every\n"
+                           "              difference of these traces; see --ignore-termination\n"
+                           "\n"
+                           "step     ext\n"
+                           "  39  A  +3.500000\n"
+                           "  39  B  +3.500000\n"
+                           "  40  A  +1.625000\n"
+                           "  40  B  +1.625000\n"
+                           "  41  A  +0.750000\n"
+                           "  41  B  +0.750000\n"
+                           "  42  A  -0.750000\n"
+                           "  42  B *+0.250000\n");
+    EXPECT_EQ(run.exitCode, 1);
+    const auto report = nlohmann::json::parse(compare({"--json"}).out);
+    EXPECT_EQ(report["termination_only"], true);
+    EXPECT_EQ(report["termination_values"], 2);
+}
+
+TEST_F(TraceDiff, TellsThatNotOnlyTerminationStepsDiffer) {
+    change(secondPass + 42, 23, "0.25");
+    change(lastPass + 39, 23, "0.25");
+    const ToolRun run = compare();
+    EXPECT_NE(run.out.find("\nresult        the traces differ\n"), std::string::npos);
+    EXPECT_NE(run.out.find("\nstep          42 of 0 to 42\n"), std::string::npos);
+    EXPECT_NE(run.out.find("\nnote          a termination step, which hardware does not compute; the traces\n"
+                           "              differ elsewhere too, --ignore-termination tells where\n"),
+              std::string::npos)
+        << run.out;
+    EXPECT_EQ(run.exitCode, 1);
+}
+
+TEST_F(TraceDiff, IgnoresTerminationStepsOnDemand) {
+    for (const std::size_t step : {40U, 41U, 42U}) {
+        change(firstPass + step, 1 + step % 3, "-99");
+        change(lastPass + step, 20, "-99");
+    }
+    const ToolRun run = compare({"--ignore-termination"});
+    EXPECT_EQ(run.out, head("the traces are equal but for termination steps") +
+                           "compared      2 blocks, 3 passes\n"
+                           "ignored       6 values of termination steps differ\n");
+    EXPECT_EQ(run.exitCode, 0);
+    const auto report = nlohmann::json::parse(compare({"--ignore-termination", "--json"}).out);
+    EXPECT_EQ(report["equal"], true);
+    EXPECT_EQ(report["termination_values"], 6);
+    EXPECT_EQ(report["termination_only"], true);
+}
+
+TEST_F(TraceDiff, FindsADifferenceBehindIgnoredTerminationSteps) {
+    change(firstPass + 40, 1, "-99");
+    change(secondPass + 39, 23, "-99");
+    change(secondPass + 42, 23, "-99");
+    const auto report = nlohmann::json::parse(compare({"--ignore-termination", "--json"}).out);
+    EXPECT_EQ(report["pass"], 1);
+    EXPECT_EQ(report["step"], 39);
+    EXPECT_EQ(report["signal"], "ext");
+    EXPECT_EQ(report["further"], 0) << "what is ignored does not count";
+    EXPECT_EQ(report["termination_only"], false);
+}
+
+TEST_F(TraceDiff, DoesNotMissTerminationStepsThatAreIgnored) {
+    for (const std::size_t pass : {lastPass, secondPass, firstPass}) {
+        lines.erase(lines.begin() + static_cast<std::ptrdiff_t>(pass) + 40,
+                    lines.begin() + static_cast<std::ptrdiff_t>(pass) + 43);
+    }
+    const ToolRun run = compare({"--ignore-termination"});
+    EXPECT_EQ(run.out, equal);
+    EXPECT_EQ(run.exitCode, 0);
+    const ToolRun strict = compare();
+    EXPECT_EQ(strict.err,
+              expectedError(b, "line 51 is '" + std::string(40, '-') + "...'; expected step 40 of 0 to 42"));
+    EXPECT_EQ(strict.exitCode, 3);
+}
+
+TEST_F(TraceDiff, ReportsAValueNextToMissingTerminationSteps) {
+    lines.resize(lastPass + 40);
+    change(lastPass + 38, 22, "0");
+    const ToolRun run = compare({"--ignore-termination"});
+    EXPECT_NE(run.out.find("\n  39  B"), std::string::npos) << run.out;
+    EXPECT_EQ(run.out.find("\n  40  A"), std::string::npos) << run.out;
+    EXPECT_EQ(run.exitCode, 1);
+}
+
+TEST_F(TraceDiff, TellsWhichTraceEndsFirstAndWhere) {
+    lines.resize(secondBlock);
+    const ToolRun shorter = compare();
+    EXPECT_EQ(shorter.out, head("the traces differ: B ends first") +
+                               "next in A     soft inputs of block 2 (decode=1, 43 steps), from line 101\n"
+                               "next in B     nothing, it ends after line 99\n");
+    EXPECT_EQ(shorter.exitCode, 1);
+
+    const ToolRun longer = runTool({"trace-diff", b, a, "--json"});
+    EXPECT_EQ(longer.out,
+              "{\"a\":\"" + b + "\",\"b\":\"" + a +
+                  "\",\"equal\":false,\"blocks\":1,\"passes\":2,\"termination_values\":0,"
+                  "\"termination_only\":false,\"next_a\":null,\"next_b\":{\"block\":2,\"pass\":null,"
+                  "\"steps\":43,\"line\":101}}\n");
+    EXPECT_EQ(longer.exitCode, 1);
+}
+
+TEST_F(TraceDiff, TellsThatAPassIsMissing) {
+    lines.resize(secondPass - 3);
+    const ToolRun run = compare();
+    EXPECT_EQ(run.out, head("the traces differ: B ends first") +
+                           "next in A     pass 1 of block 1 (decode=0, 43 steps), from line 57\n"
+                           "next in B     nothing, it ends after line 53\n");
+    EXPECT_EQ(run.exitCode, 1);
+}
+
+TEST_F(TraceDiff, TellsOfAnotherPassBlockOrSize) {
+    const auto expectNext = [this](const std::string& nextInA, const std::string& nextInB) {
+        const ToolRun run = compare();
+        EXPECT_EQ(run.out, head("the traces differ: they go on with different tables") + "next in A     " +
+                               nextInA + "\nnext in B     " + nextInB + '\n');
+        EXPECT_EQ(run.exitCode, 1);
+    };
+    lines[secondPass - 2] = "decode=0 siso=3";
+    expectNext("pass 1 of block 1 (decode=0, 43 steps), from line 57",
+               "pass 3 of block 1 (decode=0, 43 steps), from line 57");
+    lines = linesOf(text);
+    lines[secondPass - 2] = "decode=1 siso=1";
+    expectNext("pass 1 of block 1 (decode=0, 43 steps), from line 57",
+               "pass 1 of block 2 (decode=1, 43 steps), from line 57");
+    lines = linesOf(traceCases().back().text);
+    expectNext("soft inputs of block 1 (decode=0, 43 steps), from line 2",
+               "soft inputs of block 1 (decode=0, 515 steps), from line 2");
+}
+
+TEST_F(TraceDiff, HoldsNoTraceInMemory) {
+    const std::string large = itsDirectory.path("large.txt");
+    const ToolRun made =
+        runTool({"decode", shipped("k6144.soft.npy"), "--trace", "36", "--trace-file", large});
+    ASSERT_EQ(made.exitCode, 0) << made.err;
+    constexpr unsigned long memoryLimit = 48UL << 20;
+    ASSERT_GT(readFile(large).size(), memoryLimit);
+    const ToolRun run = runTool({"trace-diff", large, large}, {.memoryLimit = memoryLimit});
+    EXPECT_EQ(run.out, "A             " + large + "\nB             " + large +
+                           "\nresult        the traces are equal\ncompared      3 blocks, 36 passes\n");
+    EXPECT_EQ(run.exitCode, 0) << run.err;
+}
+
+TEST_F(TraceDiff, TellsWhichLineItCouldNotRead) {
+    const std::string png = "\x89PNG\r\n\x1a\n\0\0\0\rIHDR";
+    const std::vector<std::pair<std::string, std::string>> foreign = {
+        {"", "is empty; expected a line of dashes"},
+        {"\n \n", "ends before line 3; expected a line of dashes"},
+        {png, "line 1 is '?PNG'; expected a line of dashes"},
+        {std::string("\x7f"
+                     "ELF\0",
+                     5),
+         "line 1 is cut short after '?ELF?'; expected a line of dashes"},
+        {"systematic,parity1,parity2\n1,2,3\n",
+         "line 1 is 'systematic,parity1,parity2'; expected a line of dashes"},
+        {"block,pass,step,signal,state,raw,real\n1,,0,code1_sys,,9,1.125000\n",
+         "line 1 is 'block,pass,step,signal,state,raw,real'; expected a line of dashes"},
+        {"[\n{\"block\":1}\n]\n", "line 1 is '['; expected a line of dashes"},
+        {std::string(1 << 20, '-'), "line 1 is longer than 65535 characters; expected a line of dashes"},
+        {std::string(1 << 20, '\0') + '\n',
+         "line 1 is longer than 65535 characters; expected a line of dashes"},
+        {"----\ndecode=0 siso=0\n", "line 2 is 'decode=0 siso=0'; expected itsSys [0]=[...]"},
+    };
+    for (const auto& [content, problem] : foreign) {
+        const ToolRun run = compareWith(content);
+        EXPECT_EQ(run.err, expectedError(b, problem));
+        EXPECT_EQ(run.out, "");
+        EXPECT_EQ(run.exitCode, 3);
+    }
+}
+
+TEST_F(TraceDiff, TellsWhatIsWrongWithALine) {
+    const std::string row = lines[firstPass + 5];
+    const std::vector<std::tuple<std::size_t, std::string, std::string>> faults = {
+        {2, "itsPar0[1]=[0 16]", "is 'itsPar0[1]=[0 16]'; expected itsPar0[0]=[...]"},
+        {1, "itsSys [0]=[0 16 32 48", "is 'itsSys [0]=[0 16 32 48'; expected itsSys [0]=[...]"},
+        {1, "itsSys [0]=[]", "is a stream of 0 values; expected 3 values or more"},
+        {2, "itsPar0[0]=[0 16]", "is a stream of 2 values; expected 43, as many as in line 2"},
+        {1, "itsSys [0]=[0 8 16]", ", position 1 is '8'; expected a multiple of 16 from -32768 to 32752"},
+        {1, "itsSys [0]=[0 1.5 16]", ", position 1 is '1.5'; expected a multiple of 16 from -32768 to 32752"},
+        {1, "itsSys [0]=[0 32768]",
+         ", position 1 is '32768'; expected a multiple of 16 from -32768 to 32752"},
+        {7, "itsSys [0]=[0 16 32]", "is 'itsSys [0]=[0 16 32]'; expected a line of dashes"},
+        {8, "decode=x siso=0", "is 'decode=x siso=0'; expected decode=N siso=N"},
+        {8, "decode=0 siso=-1", "is 'decode=0 siso=-1'; expected decode=N siso=N"},
+        {8, "decode=0 siso=0 x", "is 'decode=0 siso=0 x'; expected decode=N siso=N"},
+        {9, "n int a0", "is 'n int a0'; expected the heading of the columns, 'n int a0 ... ext'"},
+        {9, lines[9] + " x",
+         "is 'n    int           a0          a1       ...'; expected the heading of the columns, 'n int a0 "
+         "... ext'"},
+        {15, "6" + row.substr(1),
+         "is '6    -0.250000     +9.625000   +6.875000...'; expected step 5 of 0 to 42"},
+        {15, "", "is ''; expected step 5 of 0 to 42"},
+        {15, "x", "is 'x'; expected step 5 of 0 to 42"},
+        {15, "5 +0.5 -1", "is a row that ends before column a1; expected a step and 23 values"},
+        {15, row + " 0", "is a row with more columns than ext; expected a step and 23 values"},
+        {15, "5 +0.5 0.1", ", column a0 is '0.1'; expected a multiple of 0.125 from -256 to 255.875"},
+        {15, "5 +0.5 256", ", column a0 is '256'; expected a multiple of 0.125 from -256 to 255.875"},
+        {15, "5 -256.125", ", column int is '-256.125'; expected a multiple of 0.125 from -256 to 255.875"},
+        {15, "5 +-1", ", column int is '+-1'; expected a multiple of 0.125 from -256 to 255.875"},
+        {15, "5 nan", ", column int is 'nan'; expected a multiple of 0.125 from -256 to 255.875"},
+        {15, "5 inf", ", column int is 'inf'; expected a multiple of 0.125 from -256 to 255.875"},
+        {15, "5 1,5", ", column int is '1,5'; expected a multiple of 0.125 from -256 to 255.875"},
+        {53, "decode=0 siso=1", "is 'decode=0 siso=1'; expected a line of dashes"},
+        {54, "siso=1", "is 'siso=1'; expected decode=N siso=N or itsSys [0]=[...]"},
+    };
+    for (const auto& [line, content, problem] : faults) {
+        lines = linesOf(text);
+        lines.at(line) = content;
+        const ToolRun run = compare();
+        EXPECT_EQ(run.err, expectedError(b, "line " + std::to_string(line + 1) +
+                                                (problem[0] == ',' ? "" : " ") + problem));
+        EXPECT_EQ(run.out, "");
+        EXPECT_EQ(run.exitCode, 3);
+    }
+}
+
+TEST_F(TraceDiff, TellsWhereATraceIsCutShort) {
+    const std::size_t row = text.find("\n42 ") + 1;
+    const std::size_t second = text.find("\nitsPar0[0]=[") + 1;
+    const std::vector<std::pair<std::size_t, std::string>> cuts = {
+        {60, "line 1 is cut short after '" + std::string(40, '-') + "...'; expected a line of dashes"},
+        {120, "line 1 is cut short after '" + std::string(40, '-') + "...'; expected a line of dashes"},
+        {121, "ends before line 2; expected itsSys [0]=[...]"},
+        {second, "ends before line 3; expected itsPar0[0]=[...]"},
+        {second + 16, "line 3 is cut short after 'itsPar0[0]=[224'; expected itsPar0[0]=[...]"},
+        {row, "ends before line 53; expected step 42 of 0 to 42"},
+        {row + 8, "line 53 is cut short after '42   -0.'; expected step 42 of 0 to 42"},
+    };
+    for (const auto& [size, problem] : cuts) {
+        const ToolRun run = compareWith(text.substr(0, size));
+        EXPECT_EQ(run.err, expectedError(b, problem));
+        EXPECT_EQ(run.out, "");
+        EXPECT_EQ(run.exitCode, 3);
+    }
+}
+
+TEST_F(TraceDiff, NeedsTwoFilesThatCanBeRead) {
+    const std::string none = itsDirectory.path("none.txt");
+    EXPECT_EQ(runTool({"trace-diff", a, none}).err,
+              expectedError(none, "cannot be opened: No such file or directory; check the name"));
+    EXPECT_EQ(runTool({"trace-diff", a, "/proc/self/mem"}).err,
+              expectedError("/proc/self/mem", "cannot be read beyond line 0; copy it again"));
+    const std::string directory = itsDirectory.path("");
+    EXPECT_EQ(runTool({"trace-diff", directory, a}).err,
+              expectedError(directory, "is a directory; give the name of a file"));
+    const ToolRun run = runTool({"trace-diff", a});
+    EXPECT_EQ(run.err, expectedError("B is required", "").substr(0, 0) +
+                           "quarzel: error: B is required; see 'quarzel trace-diff --help'\n");
+    EXPECT_EQ(run.exitCode, 2);
+}
+
+}  // namespace quarzel::test
