@@ -4,7 +4,8 @@
 function(quarzel_lane_file name)
   set(file engine/lanes/lanes_${name}.cpp)
   target_sources(quarzel_objects PRIVATE ${file})
-  set_source_files_properties(${file} PROPERTIES COMPILE_OPTIONS "-O3;${ARGN}")
+  set_source_files_properties(${file} PROPERTIES
+    COMPILE_OPTIONS "$<IF:$<BOOL:${QUARZEL_SANITIZE}>,-O1,-O3>;${ARGN}")
 endfunction()
 
 target_sources(quarzel_objects PRIVATE engine/lanes/lanes.cpp)

@@ -12,6 +12,13 @@
 #include "engine/lanes/lane_transpose.hpp"
 #include "engine/steps.hpp"
 
+// A recursion is one loop without calls. Instrumented, that would take minutes to compile.
+#if defined(__SANITIZE_ADDRESS__)
+#define QUARZEL_LANES_FLATTEN
+#else
+#define QUARZEL_LANES_FLATTEN [[gnu::flatten]]
+#endif
+
 namespace quarzel::lanes {
 namespace {
 
@@ -140,7 +147,7 @@ class GroupDecoder {
 
     /// Forward over a window: keep the metrics before each step, and the state after the last.
     template <int Code>
-    [[gnu::flatten]] void forward(const Window& window, std::size_t column, bool firstIteration) const {
+    QUARZEL_LANES_FLATTEN void forward(const Window& window, std::size_t column, bool firstIteration) const {
         const Recursion rule = Rules::recursion();
         const std::size_t at = column * W;
         State state = window.first ? load(loadMetrics<W>(itsGroup.alphaStart[Code] + at, itsRow))
@@ -173,8 +180,8 @@ class GroupDecoder {
     /// Backward over a window, with the LLR and the extrinsic value of each step.
     /// @return the state below its lowest step
     template <int Code>
-    [[gnu::flatten]] State backward(const Window& window, std::size_t column, const std::int16_t* start,
-                                    bool lastPass) const {
+    QUARZEL_LANES_FLATTEN State backward(const Window& window, std::size_t column, const std::int16_t* start,
+                                         bool lastPass) const {
         const Recursion rule = Rules::recursion();
         State state = load(loadMetrics<W>(start, itsRow));
         const auto step = [&](std::size_t t, const auto& llrRule) {
