@@ -48,7 +48,8 @@ class TDecoder3GPU : public TDecoder3G {
     void enableLanes() override;
     void disableLanes() override;
 
-    /// The same by an instruction set of the caller's choice.
+    /// The same by an instruction set of the caller's choice, one of `quarzel::lanes::candidates()`; it is
+    /// not copied.
     void enableLanes(const quarzel::lanes::Candidate& candidate);
 
     bool takesLanes(unsigned K) override;

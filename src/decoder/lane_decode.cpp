@@ -190,6 +190,8 @@ void LaneDecoder::decodeGroup(const LaneLayout& layout, const Plan& plan, unsign
         group.firstSegment[lane] = layout.segmentOf(0, lane) == 0 ? -1 : 0;
         group.lastSegment[lane] = layout.segmentOf(layout.octets() - 1, lane) + 1 == layout.segments ? -1 : 0;
     }
+    // Until this group is done the store holds no block that could be read back.
+    itsLast.K = 0;
     shareStore(layout, plan, group);
     const std::size_t row = octetLanes * group.octets * group.bundles;
     itsInputs.assign(3 * row, silence);
