@@ -9,7 +9,7 @@ namespace quarzel::tool {
 
 const char* const exitCodesHelp = R"(Exit codes:
   0  done
-  1  decoding failed; for trace-diff: the traces differ
+  1  decoding failed; for trace-diff and compare: there is a difference
   2  the command line is wrong
   3  a file cannot be read, understood or written)";
 

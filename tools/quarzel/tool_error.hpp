@@ -12,6 +12,7 @@ enum class ExitCode {
     done = 0,
     decodingFailed = 1,
     tracesDiffer = 1,
+    decisionsDiffer = 1,
     usage = 2,
     file = 3,
 };
