@@ -12,6 +12,8 @@
 #include "decode_command.hpp"
 #include "info_command.hpp"
 #include "nearest_name.hpp"
+#include "sweeps/merge_command.hpp"
+#include "sweeps/verify_result_command.hpp"
 #include "tool_error.hpp"
 #include "trace_diff_command.hpp"
 #include "vectors/compare_command.hpp"
@@ -32,6 +34,7 @@ Examples:
   quarzel decode capture.npy --trace 12 --trace-file model.txt
   quarzel trace-diff model.txt simulation.txt --ignore-termination
   quarzel compare vectors/u2_a1 simulated.hex
+  quarzel sweep --ebn0 0:0.2:1 --iterations 8 -o result.json
 )";
 
 class HelpFormatter : public CLI::Formatter {
@@ -102,7 +105,8 @@ std::string remedyFor(const CLI::App& app) {
 
 }  // namespace
 
-ExitCode runCommandLine(int argc, const char* const* argv, std::ostream& results) {
+ExitCode runCommandLine(int argc, const char* const* argv, std::ostream& results,
+                        const MakeWorkers& makeWorkers) {
     CLI::App app(description, "quarzel");
     app.formatter(std::make_shared<HelpFormatter>());
     app.set_help_flag("-h,--help", "Print help");
@@ -114,6 +118,9 @@ ExitCode runCommandLine(int argc, const char* const* argv, std::ostream& results
     ExitCode exitCode = ExitCode::done;
     addTraceDiffCommand(app, results, exitCode);
     addCompareCommand(app, results, exitCode);
+    addSweepCommand(app, results, makeWorkers);
+    addMergeCommand(app, results);
+    addVerifyResultCommand(app, results, exitCode, makeWorkers);
     try {
         app.parse(argc, argv);
     } catch (const CLI::CallForHelp&) {
