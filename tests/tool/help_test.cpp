@@ -48,6 +48,9 @@ TEST(Help, TeachesTraceDiff) {
 TEST(Help, TeachesCompare) {
     expectHelp({"compare", "--help"}, "compare_help.txt");
 }
+TEST(Help, TeachesVectors) {
+    expectHelp({"vectors", "--help"}, "vectors_help.txt");
+}
 
 TEST(Help, HasAShortOption) {
     EXPECT_EQ(runTool({"decode", "-h"}).out, runTool({"decode", "--help"}).out);

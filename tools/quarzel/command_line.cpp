@@ -15,6 +15,7 @@
 #include "tool_error.hpp"
 #include "trace_diff_command.hpp"
 #include "vectors/compare_command.hpp"
+#include "vectors/vectors_command.hpp"
 
 namespace quarzel::tool {
 
@@ -31,6 +32,7 @@ Examples:
   quarzel decode capture.npy --units 8 --reference sent.npy
   quarzel decode capture.npy --trace 12 --trace-file model.txt
   quarzel trace-diff model.txt simulation.txt --ignore-termination
+  quarzel vectors vectors --block-size 40,6144 --ebn0 0.8
   quarzel compare vectors/u2_a1 simulated.hex
 )";
 
@@ -113,6 +115,7 @@ ExitCode runCommandLine(int argc, const char* const* argv, std::ostream& results
     addInfoCommand(app, results);
     ExitCode exitCode = ExitCode::done;
     addTraceDiffCommand(app, results, exitCode);
+    addVectorsCommand(app, results);
     addCompareCommand(app, results, exitCode);
     try {
         app.parse(argc, argv);
