@@ -11,7 +11,7 @@ help:
 demo:
 	@scripts/install-packages.sh demo
 	@scripts/build.sh demo
-	@scripts/demo.sh build/demo/tools/quarzel/quarzel examples/captures
+	@scripts/demo.sh build/release/tools/quarzel/quarzel examples/captures
 
 test:
 	@scripts/install-packages.sh test
@@ -22,8 +22,8 @@ test:
 
 bench:
 	@scripts/install-packages.sh test
-	@scripts/build.sh bench
-	build/bench/bench/quarzel_bench --benchmark_out=build/bench/bench.json --benchmark_out_format=json
+	@scripts/build.sh release
+	build/release/bench/quarzel_bench --benchmark_out=build/release/bench.json --benchmark_out_format=json
 
 format:
 	@scripts/install-packages.sh test

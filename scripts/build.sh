@@ -7,7 +7,7 @@ cd "$(dirname "$0")/.."
 preset=$1
 log=build/$preset.log
 mkdir -p build
-echo "Building build/$preset (a minute or two the first time, log in $log)"
+echo "Building \"$preset\" (some minutes the first time, log in $log)"
 if ! cmake --preset "$preset" >"$log" 2>&1; then
     cat "$log" >&2
     exit 1

@@ -223,6 +223,28 @@ TEST(DecodeCommand, ConfiguresTheCoreAsItsOptionsSay) {
     EXPECT_EQ(distinct.size(), 18U) << "every choice must show in the decisions of this block";
 }
 
+TEST(DecodeCommand, GivesTheSameWhateverTheNumberOfThreads) {
+    const TemporaryDirectory directory;
+    xt::xarray<std::int16_t> soft = shippedSoft("k40.soft.npy");
+    for (std::size_t block = 100; block < 400; ++block) {
+        soft(block, block % 3, block % 44) = 300;
+    }
+    xt::dump_npy(directory.path("loud.npy"), soft);
+    std::set<std::string> outputs;
+    for (const char* threads : {"1", "2", "3", "8", "1024"}) {
+        const std::string out = directory.path("out.npy");
+        const ToolRun run = runTool({"decode", directory.path("loud.npy"), "--threads", threads, "-o", out});
+        outputs.insert(readFile(out));
+        EXPECT_EQ(
+            run.err,
+            "WARNING:decoder:RSC1 parity value in position 12 saturated positively, further saturation will "
+            "not be reported\n")
+            << threads;
+        EXPECT_EQ(run.exitCode, 0) << threads;
+    }
+    EXPECT_EQ(outputs.size(), 1U);
+}
+
 TEST(DecodeCommand, KeepsResultsCleanWhenTheLibraryWarns) {
     const TemporaryDirectory directory;
     xt::xarray<std::int16_t> soft = shippedSoft("k40.soft.npy");

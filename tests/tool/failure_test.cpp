@@ -48,6 +48,23 @@ TEST(Failure, NamesTheBlockAtWhichTheDecoderBroke) {
                   directory);
 }
 
+// The second block fails at once, while another thread is still busy with the first, which fails after it.
+TEST(Failure, NamesTheFirstBlockThatFailedWhicheverThreadWasQuicker) {
+    const TemporaryDirectory directory;
+    xt::xarray<std::int8_t> soft = xt::zeros<std::int8_t>({64, 3, 44});
+    soft(0, 0, 0) = 1;
+    soft(1, 0, 0) = 3;
+    soft(9, 0, 0) = 2;
+    xt::dump_npy(directory.path("capture.npy"), soft);
+    for (const char* threads : {"1", "2", "8"}) {
+        expectFailure(runTool({"decode", directory.path("capture.npy"), "--threads", threads},
+                              {.program = QUARZEL_TOOL_ON_STAND_IN}),
+                      directory.path("capture.npy") +
+                          ": block 2 of 64 could not be decoded (status 3); the line above says why",
+                      directory);
+    }
+}
+
 TEST(Failure, TellsWhenMemoryRunsOut) {
     const TemporaryDirectory directory;
     expectFailure(runWithSecondBlock(-1, directory),

@@ -23,7 +23,7 @@ ToolRun decodeSlowly(bool terminal) {
     const TemporaryDirectory directory;
     xt::xarray<std::int8_t> soft = xt::ones<std::int8_t>({4, 3, 44});
     xt::dump_npy(directory.path("slow.npy"), soft);
-    return runTool({"decode", directory.path("slow.npy"), "--json"},
+    return runTool({"decode", directory.path("slow.npy"), "--json", "--threads", "1"},
                    {.program = QUARZEL_TOOL_ON_STAND_IN, .terminal = terminal});
 }
 

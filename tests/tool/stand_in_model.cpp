@@ -5,10 +5,10 @@
 
 #include "vardel_ip_quarzel.h"
 
-/// In the place of the library's function: the first soft value of a block says what is to happen, so that
-/// the tool can be shown failures that no input brings about.
-int vardel_ip_quarzel_bitacc_simulate(vardel_ip_quarzel_state*, vardel_ip_quarzel_outputs*,
-                                      vardel_ip_quarzel_inputs inputs) {
+namespace {
+
+/// The first soft value of a block says what is to happen.
+int simulate(const vardel_ip_quarzel_inputs& inputs) {
     switch (inputs.rsc1_sys[0]) {
         case -1:
             throw std::bad_alloc();
@@ -18,4 +18,18 @@ int vardel_ip_quarzel_bitacc_simulate(vardel_ip_quarzel_state*, vardel_ip_quarze
         default:
             return inputs.rsc1_sys[0];
     }
+}
+
+}  // namespace
+
+/// In the place of the library's function, so that the tool can be shown failures that no input brings about.
+int vardel_ip_quarzel_bitacc_simulate_batch(vardel_ip_quarzel_state*, vardel_ip_quarzel_outputs*,
+                                            const vardel_ip_quarzel_inputs* inputs, int count,
+                                            int* statuses) {
+    int result = 0;
+    for (int i = 0; i < count; ++i) {
+        statuses[i] = simulate(inputs[i]);
+        result = result == 0 ? statuses[i] : result;
+    }
+    return result;
 }

@@ -15,13 +15,13 @@
 
 namespace quarzel::tool {
 
-void PackedBits::append(const std::vector<unsigned char>& bits) {
-    for (std::size_t first = 0; first < bits.size(); first += 8) {
+void PackedBits::set(std::size_t block, const unsigned char* bits) {
+    for (std::size_t i = 0; i < bytesPerBlock; ++i, bits += 8) {
         unsigned byte = 0;
-        for (std::size_t i = first; i < first + 8; ++i) {
-            byte = byte << 1 | bits[i];
+        for (std::size_t bit = 0; bit < 8; ++bit) {
+            byte = byte << 1 | bits[bit];
         }
-        bytes.push_back(static_cast<std::uint8_t>(byte));
+        bytes[block * bytesPerBlock + i] = static_cast<std::uint8_t>(byte);
     }
 }
 
@@ -39,7 +39,7 @@ PackedBits readBits(const std::string& file, std::size_t blocks, std::size_t byt
             file, "has shape " + shapeText(header.shape),
             fmt::format("for this capture it must be {}, that is (blocks, K/8)", shapeText(shape)));
     }
-    PackedBits bits{bytesPerBlock, std::vector<std::uint8_t>(blocks * bytesPerBlock)};
+    PackedBits bits(blocks, 8 * bytesPerBlock);
     if (!stream.read(reinterpret_cast<char*>(bits.bytes.data()),
                      static_cast<std::streamsize>(bits.bytes.size()))) {
         throw fileError(file, "ends within its array", "copy it again, it was cut short");

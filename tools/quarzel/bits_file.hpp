@@ -13,10 +13,15 @@ struct PackedBits {
     std::size_t bytesPerBlock;        ///< K / 8; every valid K is a multiple of 8
     std::vector<std::uint8_t> bytes;  ///< block after block
 
+    /// Room for blocks of K bits, all 0.
+    PackedBits(std::size_t blocks, std::size_t K) : bytesPerBlock(K / 8), bytes(blocks * bytesPerBlock) {}
+
     std::size_t blocks() const { return bytes.size() / bytesPerBlock; }
 
-    /// Append a block of 8 * bytesPerBlock bits, each a byte of 0 or 1.
-    void append(const std::vector<unsigned char>& bits);
+    /// Pack 8 bits, each a byte of 0 or 1, into a byte.
+    /// @param block  the block whose place receives them; blocks may be set from several threads
+    /// @param bits   8 * bytesPerBlock of them
+    void set(std::size_t block, const unsigned char* bits);
 };
 
 /// Read an npy file of uint8 values of shape (blocks, bytesPerBlock).

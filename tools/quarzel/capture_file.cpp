@@ -11,7 +11,9 @@ Capture readCapture(const std::string& file) {
     std::ifstream stream = openInput(file);
     const bool isNpy =
         file.ends_with(".npy") || stream.peek() == std::char_traits<char>::to_int_type(npyFirstByte);
-    return isNpy ? readNpyCapture(stream, file) : readCsvCapture(stream, file);
+    Capture capture = isNpy ? readNpyCapture(stream, file) : readCsvCapture(stream, file);
+    capture.file = file;
+    return capture;
 }
 
 }  // namespace quarzel::tool

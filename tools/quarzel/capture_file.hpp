@@ -12,6 +12,7 @@ using SoftBlock = std::vector<int>;
 
 /// Code blocks of one size, as a receiver has recorded them.
 struct Capture {
+    std::string file;             ///< where it was read
     std::uint32_t blockSize = 0;  ///< K, a valid block size
     std::vector<SoftBlock> blocks;
 };

@@ -12,6 +12,7 @@
 #include "decode_command.hpp"
 #include "info_command.hpp"
 #include "nearest_name.hpp"
+#include "shell/shell_commands.hpp"
 #include "tool_error.hpp"
 #include "trace_diff_command.hpp"
 #include "vectors/compare_command.hpp"
@@ -117,6 +118,7 @@ ExitCode runCommandLine(int argc, const char* const* argv, std::ostream& results
     addTraceDiffCommand(app, results, exitCode);
     addVectorsCommand(app, results);
     addCompareCommand(app, results, exitCode);
+    addShellCommands(app, results);
     try {
         app.parse(argc, argv);
     } catch (const CLI::CallForHelp&) {

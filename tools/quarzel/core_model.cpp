@@ -1,6 +1,8 @@
 // SPDX-License-Identifier: MIT
 #include "core_model.hpp"
 
+#include <algorithm>
+
 #include "tool_error.hpp"
 #include "trace_decoder.hpp"
 
@@ -21,18 +23,27 @@ CoreModel::CoreModel(int units, int algorithm, TraceWriter* trace) {
     }
 }
 
-int CoreModel::decode(const SoftBlock& block, int iterations, std::vector<unsigned char>& bits) {
-    const std::size_t positions = block.size() / 3;
-    vardel_ip_quarzel_inputs inputs{};
-    inputs.rsc1_sys = block.data();
-    inputs.rsc1_par = block.data() + positions;
-    inputs.rsc2_par = block.data() + 2 * positions;
-    inputs.din_size = static_cast<int>(positions);
-    inputs.iterations = iterations;
-    vardel_ip_quarzel_outputs outputs{};
-    outputs.dout = bits.data();
-    outputs.dout_alloc_size = static_cast<int>(bits.size());
-    return vardel_ip_quarzel_bitacc_simulate(itsState.get(), &outputs, inputs);
+std::optional<FailedBlock> CoreModel::decode(std::span<const SoftBlock> blocks, int iterations,
+                                             std::span<unsigned char> bits) {
+    const std::size_t bitsPerBlock = bits.size() / blocks.size();
+    itsInputs.clear();
+    itsOutputs.clear();
+    for (const SoftBlock& block : blocks) {
+        const std::size_t positions = block.size() / 3;
+        itsInputs.push_back({block.data(), block.data() + positions, block.data() + 2 * positions,
+                             static_cast<int>(positions), iterations, 0});
+        itsOutputs.push_back(
+            {bits.data() + itsOutputs.size() * bitsPerBlock, static_cast<int>(bitsPerBlock), 0, 0});
+    }
+    itsStatuses.resize(blocks.size());
+    const int status =
+        vardel_ip_quarzel_bitacc_simulate_batch(itsState.get(), itsOutputs.data(), itsInputs.data(),
+                                                static_cast<int>(blocks.size()), itsStatuses.data());
+    if (status == 0) {
+        return std::nullopt;
+    }
+    const auto failed = std::find(itsStatuses.begin(), itsStatuses.end(), status);
+    return FailedBlock{static_cast<std::size_t>(failed - itsStatuses.begin()), status};
 }
 
 }  // namespace quarzel::tool

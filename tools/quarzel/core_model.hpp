@@ -1,7 +1,10 @@
 // SPDX-License-Identifier: MIT
 #pragma once
 
+#include <cstddef>
 #include <memory>
+#include <optional>
+#include <span>
 #include <vector>
 
 #include "capture_file.hpp"
@@ -11,7 +14,15 @@ namespace quarzel::tool {
 
 class TraceWriter;
 
+/// A block that the library did not decode; it has said why.
+struct FailedBlock {
+    std::size_t index;  ///< among the blocks of the call
+    int status;
+};
+
 /// One configured core, behind the C interface.
+///
+/// Thread rule: one thread at a time.
 class CoreModel {
   public:
     /// @param units      processing units: 2, 4 or 8
@@ -24,16 +35,20 @@ class CoreModel {
     /// Trace the next `passes` passes.
     void trace(unsigned passes) { vardel_ip_quarzel_bitacc_dump_config(itsState.get(), passes); }
 
-    /// Decode a block.
-    /// @param bits  its K entries receive the decisions, 0 or 1
-    /// @return      the status of the library; when it is not 0, the library has said why
-    int decode(const SoftBlock& block, int iterations, std::vector<unsigned char>& bits);
+    /// Decode blocks of one size, together.
+    /// @param bits  receives the decisions, 0 or 1: K a block, one block after the other
+    /// @return      the first block that failed, if one did
+    std::optional<FailedBlock> decode(std::span<const SoftBlock> blocks, int iterations,
+                                      std::span<unsigned char> bits);
 
   private:
     struct Destroy {
         void operator()(vardel_ip_quarzel_state* state) const { vardel_ip_quarzel_destroy_state(state); }
     };
     std::unique_ptr<vardel_ip_quarzel_state, Destroy> itsState;
+    std::vector<vardel_ip_quarzel_inputs> itsInputs;
+    std::vector<vardel_ip_quarzel_outputs> itsOutputs;
+    std::vector<int> itsStatuses;
 };
 
 }  // namespace quarzel::tool

@@ -3,18 +3,22 @@
 
 #include <fmt/format.h>
 
+#include <algorithm>
 #include <cstdint>
+#include <thread>
 
+#include "choices.hpp"
 #include "whole_number.hpp"
 
 namespace quarzel::tool {
 
 CLI::Validator unitsCheck() {
-    return wholeNumber([](std::uint64_t n) { return n == 2 || n == 4 || n == 8; }, "2, 4 or 8");
+    return withChoices(wholeNumber([](std::uint64_t n) { return n == 2 || n == 4 || n == 8; }, "2, 4 or 8"),
+                       {"2", "4", "8"});
 }
 
 CLI::Validator algorithmCheck() {
-    return wholeNumber([](std::uint64_t n) { return n <= 2; }, "0, 1 or 2");
+    return withChoices(wholeNumber([](std::uint64_t n) { return n <= 2; }, "0, 1 or 2"), {"0", "1", "2"});
 }
 
 CLI::Validator iterationsCheck() {
@@ -31,6 +35,17 @@ void addCoreOptions(CLI::App& command, CoreOptions& options) {
     add("--algorithm", options.algorithm,
         "0 max-log, 1 max-log with extrinsic values\nscaled by 0.75, 2 max-star", algorithmCheck());
     add("--iterations", options.iterations, "Iterations, 1 to 15; every one of them runs", iterationsCheck());
+}
+
+void addThreadsOption(CLI::App& command, unsigned& threads) {
+    threads = std::max(1U, std::thread::hardware_concurrency());
+    command
+        .add_option("--threads", threads,
+                    "Threads that decode, 1 to 1024; what they give does\nnot depend on their number "
+                    "(default: all cores)")
+        ->type_name("N")
+        ->transform(
+            wholeNumber([](std::uint64_t n) { return n >= 1 && n <= 1024; }, "a number from 1 to 1024"));
 }
 
 }  // namespace quarzel::tool

@@ -15,6 +15,7 @@
 #include "core_model.hpp"
 #include "core_options.hpp"
 #include "decode_report.hpp"
+#include "decode_together.hpp"
 #include "output_file.hpp"
 #include "progress.hpp"
 #include "tool_error.hpp"
@@ -31,6 +32,7 @@ struct DecodeOptions {
     std::optional<std::string> output;
     CoreOptions core;
     TraceOptions trace;
+    unsigned threads = 1;
     bool json = false;
 };
 
@@ -116,32 +118,31 @@ std::unique_ptr<TraceFile> openTrace(const Capture& capture, const DecodeOptions
     return std::make_unique<TraceFile>(trace, results);
 }
 
-PackedBits decodeBlocks(const Capture& capture, const DecodeOptions& options, TraceFile* trace) {
-    CoreModel core(options.core.units, options.core.algorithm, trace ? &trace->writer() : nullptr);
-    PackedBits decisions{capture.blockSize / 8, {}};
+/// Decode one block after the other and trace what the user wants traced.
+PackedBits decodeTraced(const Capture& capture, const DecodeOptions& options, TraceFile& trace,
+                        Progress& progress) {
+    CoreModel core(options.core.units, options.core.algorithm, &trace.writer());
+    PackedBits decisions(capture.blocks.size(), capture.blockSize);
     std::vector<unsigned char> bits(capture.blockSize);
-    const std::size_t total = capture.blocks.size();
-    Progress progress(std::cerr, ::isatty(STDERR_FILENO) != 0, total);
-    for (std::size_t block = 0; block < total; ++block) {
-        if (trace != nullptr && block + 1 == options.trace.block) {
+    for (std::size_t block = 0; block < capture.blocks.size(); ++block) {
+        if (block + 1 == options.trace.block) {
             core.trace(*options.trace.passes);
         }
-        if (const int status = core.decode(capture.blocks[block], options.core.iterations, bits)) {
-            throw ToolError(
-                ExitCode::decodingFailed, options.capture,
-                fmt::format("block {} of {} could not be decoded (status {})", block + 1, total, status),
-                "the line above says why");
+        if (const auto failed = core.decode({&capture.blocks[block], 1}, options.core.iterations, bits)) {
+            throw decodingError(capture, block, failed->status);
         }
-        if (trace != nullptr) {
-            trace->check();
-        }
-        decisions.append(bits);
+        trace.check();
+        decisions.set(block, bits.data());
         progress.update(block + 1);
     }
-    if (trace != nullptr) {
-        trace->finish();
-    }
+    trace.finish();
     return decisions;
+}
+
+PackedBits decodeBlocks(const Capture& capture, const DecodeOptions& options, TraceFile* trace) {
+    Progress progress(std::cerr, ::isatty(STDERR_FILENO) != 0, capture.blocks.size());
+    return trace != nullptr ? decodeTraced(capture, options, *trace, progress)
+                            : decodeTogether(capture, options.core, options.threads, progress);
 }
 
 void decode(const DecodeOptions& options, std::ostream& results) {
@@ -182,6 +183,7 @@ void addDecodeCommand(CLI::App& app, std::ostream& results) {
         ->type_name("BITS");
     command->add_option("-o,--output", options->output, "Write the decided bits to this file")
         ->type_name("OUT");
+    addThreadsOption(*command, options->threads);
     addTraceOptions(*command, options->trace);
     command->add_flag("--json", options->json, "Print one JSON object instead of text");
     command->callback([options, &results] { decode(*options, results); });

@@ -102,11 +102,6 @@ class GroupDecoder {
         writeDecisions(itsGroup);
     }
 
-  private:
-    const LaneGroup& itsGroup;
-    const std::size_t itsRow;      ///< words in a row
-    const std::size_t itsColumns;  ///< vectors in a row
-
     /// The window that a recursion is at.
     struct Window {
         std::size_t bottom;
@@ -114,36 +109,6 @@ class GroupDecoder {
         bool first;
         bool last;
     };
-
-    /// One pass of a constituent code over all windows, from the lowest up.
-    template <int Code>
-    void pass(bool firstIteration, bool lastPass) {
-        const std::size_t boundaryWords = states * itsRow;
-        std::int16_t* const starts = itsGroup.betaStart[Code];
-        std::int16_t* const lastStarts = starts + (itsGroup.windows - 1) * boundaryWords;
-        // What the first windows end with starts the last ones of the segments below: in this pass when other
-        // windows run in between, else in the next one. In the first iteration no start is known.
-        const bool handDownAtOnce = itsGroup.windows >= 3 && !firstIteration;
-        std::size_t bottom = 0;
-        for (std::size_t w = 0; w < itsGroup.windows; ++w) {
-            const Window window{bottom, itsGroup.windowLength[w], w == 0, w + 1 == itsGroup.windows};
-            std::int16_t* const ends = w == 0 ? itsGroup.boundary : starts + (w - 1) * boundaryWords;
-            for (std::size_t column = 0; column < itsColumns; ++column) {
-                const std::size_t at = column * W;
-                forward<Code>(window, column, firstIteration);
-                const State end = backward<Code>(window, column, starts + w * boundaryWords + at, lastPass);
-                storeBoundary(end, ends + at);
-            }
-            if (w == 0 && handDownAtOnce) {
-                handDown(lastStarts);
-            }
-            bottom += window.length;
-        }
-        if (!handDownAtOnce) {
-            handDown(lastStarts);
-        }
-        handUp(itsGroup.alphaStart[Code]);
-    }
 
     /// Forward over a window: keep the metrics before each step, and the state after the last.
     template <int Code>
@@ -222,6 +187,41 @@ class GroupDecoder {
             step(--t, Rules::llrNearStart());
         }
         return state;
+    }
+
+  private:
+    const LaneGroup& itsGroup;
+    const std::size_t itsRow;      ///< words in a row
+    const std::size_t itsColumns;  ///< vectors in a row
+
+    /// One pass of a constituent code over all windows, from the lowest up.
+    template <int Code>
+    void pass(bool firstIteration, bool lastPass) {
+        const std::size_t boundaryWords = states * itsRow;
+        std::int16_t* const starts = itsGroup.betaStart[Code];
+        std::int16_t* const lastStarts = starts + (itsGroup.windows - 1) * boundaryWords;
+        // What the first windows end with starts the last ones of the segments below: in this pass when other
+        // windows run in between, else in the next one. In the first iteration no start is known.
+        const bool handDownAtOnce = itsGroup.windows >= 3 && !firstIteration;
+        std::size_t bottom = 0;
+        for (std::size_t w = 0; w < itsGroup.windows; ++w) {
+            const Window window{bottom, itsGroup.windowLength[w], w == 0, w + 1 == itsGroup.windows};
+            std::int16_t* const ends = w == 0 ? itsGroup.boundary : starts + (w - 1) * boundaryWords;
+            for (std::size_t column = 0; column < itsColumns; ++column) {
+                const std::size_t at = column * W;
+                forward<Code>(window, column, firstIteration);
+                const State end = backward<Code>(window, column, starts + w * boundaryWords + at, lastPass);
+                storeBoundary(end, ends + at);
+            }
+            if (w == 0 && handDownAtOnce) {
+                handDown(lastStarts);
+            }
+            bottom += window.length;
+        }
+        if (!handDownAtOnce) {
+            handDown(lastStarts);
+        }
+        handUp(itsGroup.alphaStart[Code]);
     }
 
     template <int Code>

@@ -88,8 +88,24 @@ std::string headerText(const VectorCore& core, const MemorySizes& sizes) {
 struct CaptureFiles {
     std::string name;  ///< without the ends
     std::uint32_t blockSize;
-    std::vector<std::int8_t> soft;
-    PackedBits decided;
+    std::vector<const StimulusAndResponse*> blocks;
+
+    std::string softNpy() const {
+        std::vector<std::int8_t> soft;
+        for (const StimulusAndResponse* const block : blocks) {
+            soft.insert(soft.end(), block->soft.begin(), block->soft.end());
+        }
+        const std::array<std::size_t, 3> shape = {blocks.size(), softMemories.size(), blockSize + 4};
+        return xt::dump_npy(xt::adapt(soft, shape));
+    }
+
+    std::string decidedNpy() const {
+        PackedBits decided(blocks.size(), blockSize);
+        for (std::size_t i = 0; i < blocks.size(); ++i) {
+            decided.set(i, blocks[i]->decisions.data());
+        }
+        return npyOf(decided);
+    }
 };
 
 /// Distribute the blocks over captures, and tell the blocks where they are.
@@ -102,13 +118,12 @@ std::vector<CaptureFiles> capturesOf(VectorCore& core, const std::vector<Planned
             return candidate.name == name;
         });
         if (capture == captures.end()) {
-            captures.push_back({name, plan[i].blockSize, {}, {plan[i].blockSize / 8, {}}});
+            captures.push_back({name, plan[i].blockSize, {}});
             capture = captures.end() - 1;
         }
         core.blocks.push_back({plan[i].blockSize, plan[i].iterations, nameOf(plan[i].stimulus),
-                               name + ".soft.npy", capture->decided.blocks()});
-        capture->soft.insert(capture->soft.end(), blocks[i].soft.begin(), blocks[i].soft.end());
-        capture->decided.append(blocks[i].decisions);
+                               name + ".soft.npy", capture->blocks.size()});
+        capture->blocks.push_back(&blocks[i]);
     }
     return captures;
 }
@@ -132,10 +147,8 @@ std::vector<VectorFile> writeCore(OutputDirectory& directory, VectorCore& core,
     }
     write(memoryFile(decisionMemory), decisionText(core, blocks));
     for (const CaptureFiles& capture : captures) {
-        const std::array<std::size_t, 3> shape = {capture.decided.blocks(), softMemories.size(),
-                                                  capture.blockSize + 4};
-        write(capture.name + ".soft.npy", xt::dump_npy(xt::adapt(capture.soft, shape)));
-        write(capture.name + ".decided.npy", npyOf(capture.decided));
+        write(capture.name + ".soft.npy", capture.softNpy());
+        write(capture.name + ".decided.npy", capture.decidedNpy());
     }
     return files;
 }

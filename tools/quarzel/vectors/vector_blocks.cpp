@@ -19,11 +19,11 @@ StimulusAndResponse makeBlock(const PlannedBlock& planned, const StimulusSource&
     StimulusAndResponse made{source.make(planned, static_cast<std::uint32_t>(units)),
                              std::vector<unsigned char>(planned.blockSize)};
     const SoftBlock soft(made.soft.begin(), made.soft.end());
-    if (const int status = core.decode(soft, planned.iterations, made.decisions)) {
-        throw ToolError(
-            ExitCode::decodingFailed, "",
-            fmt::format("a block of {} bits could not be decoded (status {})", planned.blockSize, status),
-            "the line above says why");
+    if (const auto failed = core.decode({&soft, 1}, planned.iterations, made.decisions)) {
+        throw ToolError(ExitCode::decodingFailed, "",
+                        fmt::format("a block of {} bits could not be decoded (status {})", planned.blockSize,
+                                    failed->status),
+                        "the line above says why");
     }
     return made;
 }

@@ -12,9 +12,9 @@
 #include <numeric>
 #include <optional>
 #include <string>
-#include <thread>
 
 #include "block_sizes.hpp"
+#include "choices.hpp"
 #include "core_options.hpp"
 #include "list_option.hpp"
 #include "progress.hpp"
@@ -35,7 +35,7 @@ struct VectorsOptions {
     double ebN0 = 1.0;
     std::optional<double> scale;
     std::optional<double> llr;
-    unsigned threads = std::max(1U, std::thread::hardware_concurrency());
+    unsigned threads = 1;
     bool replace = false;
     bool json = false;
     VectorRequest request;
@@ -56,9 +56,9 @@ constexpr const char* footer = R"(Stimuli:
 Covering sets:
   With --cover the set has, for every K, blocks of noise and one of the other
   stimuli in turn, and all stimuli at the smallest and the greatest K of each
-  number of thread segments. That reaches every K, every shape of windows, first,
-  middle and last segments, both ends of the range in each stream, and all
-  iteration counts; the manifest counts what is reached.
+  number of thread segments. That reaches every K, every shape of windows,
+  first, middle and last segments, both ends of the range in each stream, and
+  all iteration counts; the manifest counts what is reached.
 
 Directory:
   manifest.json  configuration, blocks, coverage, SHA-256 of every file
@@ -71,8 +71,9 @@ Directory:
                  soft values of all blocks, two's complement bytes
     dout.hex     the decisions expected, a bit a word
     npy/         the same blocks by K and iterations, for 'quarzel decode'
-  The .hex files are for $readmemh. The directory is written whole or not at all.
-  The same seed and options give the same bytes, whatever the number of threads.
+  The .hex files are for $readmemh. The directory is written whole or not at
+  all. The same seed and options give the same bytes, whatever the number of
+  threads.
 
 Examples:
   quarzel vectors vectors --block-size 40,6144 --units 8 --ebn0 0.8
@@ -125,7 +126,7 @@ void requireUnused(bool isGiven, const char* option) {
 }
 
 lte::Quantiser quantiserOf(const VectorsOptions& options) {
-    lte::Quantiser quantiser;
+    lte::Quantiser quantiser = options.request.quantiser;
     if (options.scale) {
         quantiser = {lte::Quantiser::Kind::amplitude, *options.scale};
     } else if (options.llr) {
@@ -211,7 +212,7 @@ CLI::Validator oneOfStimuli() {
         return isKnown ? std::string()
                        : fmt::format("'{}' is none of {}", text, fmt::join(stimulusNames, ", "));
     };
-    return {check, ""};
+    return withChoices({check, ""}, {stimulusNames.begin(), stimulusNames.end()});
 }
 
 /// A block size in decimal, or the word for all.
@@ -256,7 +257,7 @@ void addVectorsCommand(CLI::App& app, std::ostream& results) {
         command
             ->add_option("--llr", options->llr,
                          fmt::format("Soft values are log-likelihood ratios times this\n(default {})",
-                                     lte::Quantiser().scale))
+                                     request.quantiser.scale))
             ->type_name("S")
             ->transform(numberIn(0.001, 1000));
     command->add_option("--scale", options->scale, "Soft values are received amplitudes times this\ninstead")
@@ -266,10 +267,7 @@ void addVectorsCommand(CLI::App& app, std::ostream& results) {
     command->add_option("--seed", request.seed, "Seed of bits and noise (default 1)")
         ->type_name("N")
         ->transform(wholeNumber([](std::uint64_t) { return true; }, "a whole number"));
-    command->add_option("--threads", options->threads, "Threads that decode (default: one a processor)")
-        ->type_name("N")
-        ->transform(
-            wholeNumber([](std::uint64_t n) { return n >= 1 && n <= 1024; }, "a number from 1 to 1024"));
+    addThreadsOption(*command, options->threads);
     command->add_flag("--replace", options->replace, "Replace the vector set in DIRECTORY");
     command->add_flag("--json", options->json, "Print one JSON object instead of text");
     command->callback([options, &results] { makeVectors(*options, results); });

@@ -1,0 +1,19 @@
+// SPDX-License-Identifier: MIT
+#pragma once
+
+#include <CLI/CLI.hpp>
+#include <string>
+#include <vector>
+
+namespace quarzel::tool {
+
+/// A check that also tells which few values it lets pass, so that a shell can complete them.
+CLI::Validator withChoices(CLI::Validator check, const std::vector<std::string>& choices);
+
+/// The values that the checks of an option tell; empty when they tell none.
+std::vector<std::string> choicesOf(CLI::Option& option);
+
+/// Whether an option has a check of its values at all. One that names a file has none.
+bool isChecked(CLI::Option& option);
+
+}  // namespace quarzel::tool
