@@ -13,6 +13,8 @@
 #include "info_command.hpp"
 #include "nearest_name.hpp"
 #include "shell/shell_commands.hpp"
+#include "sweeps/merge_command.hpp"
+#include "sweeps/verify_result_command.hpp"
 #include "tool_error.hpp"
 #include "trace_diff_command.hpp"
 #include "vectors/compare_command.hpp"
@@ -35,6 +37,7 @@ Examples:
   quarzel trace-diff model.txt simulation.txt --ignore-termination
   quarzel vectors vectors --block-size 40,6144 --ebn0 0.8
   quarzel compare vectors/u2_a1 simulated.hex
+  quarzel sweep --ebn0 0:0.2:1 --iterations 8 -o result.json
 )";
 
 class HelpFormatter : public CLI::Formatter {
@@ -105,7 +108,8 @@ std::string remedyFor(const CLI::App& app) {
 
 }  // namespace
 
-ExitCode runCommandLine(int argc, const char* const* argv, std::ostream& results) {
+ExitCode runCommandLine(int argc, const char* const* argv, std::ostream& results,
+                        const MakeWorkers& makeWorkers) {
     CLI::App app(description, "quarzel");
     app.formatter(std::make_shared<HelpFormatter>());
     app.set_help_flag("-h,--help", "Print help");
@@ -118,6 +122,9 @@ ExitCode runCommandLine(int argc, const char* const* argv, std::ostream& results
     addTraceDiffCommand(app, results, exitCode);
     addVectorsCommand(app, results);
     addCompareCommand(app, results, exitCode);
+    addSweepCommand(app, results, makeWorkers);
+    addMergeCommand(app, results);
+    addVerifyResultCommand(app, results, exitCode, makeWorkers);
     addShellCommands(app, results);
     try {
         app.parse(argc, argv);

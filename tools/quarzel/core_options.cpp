@@ -3,9 +3,7 @@
 
 #include <fmt/format.h>
 
-#include <algorithm>
 #include <cstdint>
-#include <thread>
 
 #include "choices.hpp"
 #include "whole_number.hpp"
@@ -35,17 +33,6 @@ void addCoreOptions(CLI::App& command, CoreOptions& options) {
     add("--algorithm", options.algorithm,
         "0 max-log, 1 max-log with extrinsic values\nscaled by 0.75, 2 max-star", algorithmCheck());
     add("--iterations", options.iterations, "Iterations, 1 to 15; every one of them runs", iterationsCheck());
-}
-
-void addThreadsOption(CLI::App& command, unsigned& threads) {
-    threads = std::max(1U, std::thread::hardware_concurrency());
-    command
-        .add_option("--threads", threads,
-                    "Threads that decode, 1 to 1024; what they give does\nnot depend on their number "
-                    "(default: all cores)")
-        ->type_name("N")
-        ->transform(
-            wholeNumber([](std::uint64_t n) { return n >= 1 && n <= 1024; }, "a number from 1 to 1024"));
 }
 
 }  // namespace quarzel::tool

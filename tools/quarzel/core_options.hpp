@@ -21,8 +21,4 @@ CLI::Validator iterationsCheck();
 /// @param options  holds the defaults and receives the choice; must outlive the parse
 void addCoreOptions(CLI::App& command, CoreOptions& options);
 
-/// Add --threads to a command, with all cores of the machine as its default.
-/// @param threads  receives the choice; must outlive the parse
-void addThreadsOption(CLI::App& command, unsigned& threads);
-
 }  // namespace quarzel::tool

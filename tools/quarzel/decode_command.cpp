@@ -18,6 +18,7 @@
 #include "decode_together.hpp"
 #include "output_file.hpp"
 #include "progress.hpp"
+#include "threads_option.hpp"
 #include "tool_error.hpp"
 #include "trace_file.hpp"
 #include "trace_options.hpp"
@@ -32,7 +33,7 @@ struct DecodeOptions {
     std::optional<std::string> output;
     CoreOptions core;
     TraceOptions trace;
-    unsigned threads = 1;
+    unsigned threads = allCores();
     bool json = false;
 };
 

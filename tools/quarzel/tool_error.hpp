@@ -13,8 +13,10 @@ enum class ExitCode {
     decodingFailed = 1,
     tracesDiffer = 1,
     decisionsDiffer = 1,
+    resultsDiffer = 1,
     usage = 2,
     file = 3,
+    interrupted = 4,
 };
 
 /// The same for the user, to be shown in every help.

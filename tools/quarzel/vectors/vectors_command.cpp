@@ -19,6 +19,7 @@
 #include "list_option.hpp"
 #include "progress.hpp"
 #include "report_text.hpp"
+#include "threads_option.hpp"
 #include "tool_error.hpp"
 #include "vector_set.hpp"
 #include "whole_number.hpp"
@@ -35,7 +36,7 @@ struct VectorsOptions {
     double ebN0 = 1.0;
     std::optional<double> scale;
     std::optional<double> llr;
-    unsigned threads = 1;
+    unsigned threads = allCores();
     bool replace = false;
     bool json = false;
     VectorRequest request;
