@@ -42,6 +42,9 @@ TEST(Help, TeachesCompare) {
 TEST(Help, TeachesVectors) {
     expectHelp({"vectors", "--help"}, "vectors_help.txt");
 }
+TEST(Help, TeachesPlot) {
+    expectHelp({"plot", "--help"}, "plot_help.txt");
+}
 TEST(Help, TeachesManual) {
     expectHelp({"manual", "--help"}, "manual_help.txt");
 }

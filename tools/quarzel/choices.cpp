@@ -19,6 +19,10 @@ CLI::Validator withChoices(CLI::Validator check, const std::vector<std::string>&
     return check;
 }
 
+CLI::Validator anyText() {
+    return {[](std::string&) { return std::string(); }, ""};
+}
+
 std::vector<std::string> choicesOf(CLI::Option& option) {
     if (!isChecked(option)) {
         return {};

@@ -10,6 +10,10 @@ namespace quarzel::tool {
 /// A check that also tells which few values it lets pass, so that a shell can complete them.
 CLI::Validator withChoices(CLI::Validator check, const std::vector<std::string>& choices);
 
+/// A check that lets everything pass, for an option whose value is neither a file nor checked otherwise, so
+/// that shells offer no files.
+CLI::Validator anyText();
+
 /// The values that the checks of an option tell; empty when they tell none.
 std::vector<std::string> choicesOf(CLI::Option& option);
 

@@ -12,6 +12,7 @@
 #include "decode_command.hpp"
 #include "info_command.hpp"
 #include "nearest_name.hpp"
+#include "plot/plot_command.hpp"
 #include "shell/shell_commands.hpp"
 #include "sweeps/merge_command.hpp"
 #include "sweeps/verify_result_command.hpp"
@@ -38,6 +39,7 @@ Examples:
   quarzel vectors vectors --block-size 40,6144 --ebn0 0.8
   quarzel compare vectors/u2_a1 simulated.hex
   quarzel sweep --ebn0 0:0.2:1 --iterations 8 -o result.json
+  quarzel plot result.json -o curves.svg
 )";
 
 class HelpFormatter : public CLI::Formatter {
@@ -125,6 +127,7 @@ ExitCode runCommandLine(int argc, const char* const* argv, std::ostream& results
     addSweepCommand(app, results, makeWorkers);
     addMergeCommand(app, results);
     addVerifyResultCommand(app, results, exitCode, makeWorkers);
+    addPlotCommand(app);
     addShellCommands(app, results);
     try {
         app.parse(argc, argv);
