@@ -134,13 +134,11 @@ TEST(QuantisedChannel, GivesTheSameOutputsWithEveryInstructionSet) {
     std::vector<std::vector<int>> outputs;
     for (std::size_t i = 0; i < supportedDrawFunctions().size; ++i) {
         std::vector<int> soft(bits.size());
-        std::vector<std::uint8_t> undecidedOnes(times);
+        std::vector<std::uint8_t> isUndecided(soft.size());
         supportedDrawFunctions().first[i]->lookUp(words.data(), bits.data(), 3, cells.data(), times,
-                                                  soft.data(), undecidedOnes.data());
-        for (std::size_t time = 0; time < times; ++time) {
-            const auto first = soft.begin() + static_cast<std::ptrdiff_t>(time * valuesPerLookUp);
-            EXPECT_EQ(undecidedOnes[time] != 0,
-                      std::find(first, first + valuesPerLookUp, undecided) != first + valuesPerLookUp);
+                                                  soft.data(), isUndecided.data());
+        for (std::size_t at = 0; at < soft.size(); ++at) {
+            EXPECT_EQ(isUndecided[at], soft[at] == undecided ? 1 : 0);
         }
         outputs.push_back(std::move(soft));
     }

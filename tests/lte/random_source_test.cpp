@@ -63,18 +63,6 @@ TEST(DrawFunctions, GiveTheNumbersOfTheLibraryForEveryCounter) {
     }
 }
 
-TEST(DrawFunctions, SpreadTheSameBits) {
-    std::vector<std::uint32_t> words(wordsPerGroup);
-    RandomSource(name).words(Purpose::informationBits, 0, 1, words.data());
-    for (std::size_t i = 0; i < supportedDrawFunctions().size; ++i) {
-        std::vector<std::uint8_t> bytes(1024, 0x81);
-        supportedDrawFunctions().first[i]->spreadBits(words.data(), 5, bytes.size(), bytes.data());
-        for (std::size_t at = 0; at < bytes.size(); ++at) {
-            ASSERT_EQ(bytes[at], 0x81U | (words[at / 32] >> at % 32 & 1U) << 5);
-        }
-    }
-}
-
 TEST(RandomSource, GivesOtherNumbersForEveryPartOfTheName) {
     std::vector<BlockName> names(8, name);
     names[1].seed ^= 1;
@@ -111,6 +99,11 @@ TEST(RandomSource, DrawsTheSameInformationBitsInEveryLane) {
         block.blockSize = K;
         std::vector<std::uint8_t> bits(K);
         RandomSource(block).informationBits(0, bits.data());
+        std::vector<std::uint32_t> words(4 * wordsPerGroup);
+        RandomSource(block).words(Purpose::informationBits, 0, 4, words.data());
+        for (std::size_t i = 0; i < K; ++i) {
+            ASSERT_EQ(bits[i], words[i / 32] >> i % 32 & 1U);
+        }
         const auto ones = static_cast<double>(std::count(bits.begin(), bits.end(), 1));
         EXPECT_NEAR(ones, K / 2.0, 2.5 * std::sqrt(K));  // the numbers are always the same; five sigma
         std::vector<std::uint8_t> shifted(K, 0x41);

@@ -85,6 +85,27 @@ TEST_F(PlotCommand, DrawsTheIterationsOfOneCurve) {
     EXPECT_NE(svg.find(">after 2 iterations<"), std::string::npos);
 }
 
+TEST_F(PlotCommand, DrawsAxesWhereNoErrorWasSeen) {
+    const std::string reference = itsDirectory.write("bound.csv", "ebn0_db,ber\n1,0.2\n");
+    for (const std::vector<std::string>& options :
+         {std::vector<std::string>{"--per-iteration", "--algorithm", "0"}, {"--reference", reference}}) {
+        sweep::Result silent;
+        silent.configuration.blockSizes = {40};
+        silent.configuration.algorithms = {0};
+        silent.configuration.iterations = {2};
+        silent.configuration.ebN0 = {{500000}};
+        silent.configuration.perIteration = true;
+        silent.points.emplace_back(2);
+        silent.points.back().blocks = 100;
+        silent.points.back().stoppedBy = sweep::StopReason::blocks;
+        itsDirectory.write("result.json", sweep::resultText(silent));
+        std::vector<std::string> all = {"-o", itsSvg};
+        all.insert(all.end(), options.begin(), options.end());
+        const ToolRun run = plot(all);
+        EXPECT_EQ(run.exitCode, 0) << run.err;
+    }
+}
+
 TEST_F(PlotCommand, DoesNotMixTheIterationsOfSeveralCurves) {
     itsDirectory.write("result.json", result(true));
     expectRefused(

@@ -55,6 +55,7 @@ ChannelThresholds channelThresholds(const Quantiser& quantiser, Decibels ebN0) {
 
     ChannelThresholds thresholds{};
     Number x;
+    const Number farAway(7);
     for (std::size_t i = 0; i < thresholds.size(); ++i) {
         // P(output < v) = P(1 + sigma n < (v - 1/2) / units) = erfc((1 - (v - 1/2) / units) / (sigma
         // 2^(1/2))) / 2
@@ -62,6 +63,11 @@ ChannelThresholds channelThresholds(const Quantiser& quantiser, Decibels ebN0) {
         mpfr_div(x.get(), x.get(), units.get(), MPFR_RNDN);
         mpfr_ui_sub(x.get(), 1, x.get(), MPFR_RNDN);
         mpfr_div(x.get(), x.get(), deviationRoot2.get(), MPFR_RNDN);
+        if (mpfr_cmpabs(x.get(), farAway.get()) > 0) {
+            // What the function differs from 0 and 2 by is far below half a unit, and takes long to compute.
+            thresholds[i] = mpfr_sgn(x.get()) > 0 ? 0 : std::uint64_t{1} << channelBits;
+            continue;
+        }
         mpfr_erfc(x.get(), x.get(), MPFR_RNDN);
         mpfr_mul_2ui(x.get(), x.get(), channelBits - 1, MPFR_RNDN);
         thresholds[i] = mpfr_get_uj(x.get(), MPFR_RNDN);

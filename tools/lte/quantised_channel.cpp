@@ -2,6 +2,7 @@
 #include "quantised_channel.hpp"
 
 #include <algorithm>
+#include <cstring>
 
 namespace quarzel::lte {
 
@@ -10,7 +11,26 @@ namespace {
 constexpr unsigned refinementBits = 32;
 constexpr std::size_t groupsAtOnce = 8;
 constexpr std::size_t valuesAtOnce = groupsAtOnce * wordsPerGroup * 2;
-constexpr std::size_t lookUpsAtOnce = valuesAtOnce / valuesPerLookUp;
+
+/// The further random bits of a block, for one undecided value after the other.
+class Refinement {
+  public:
+    explicit Refinement(const RandomSource& source) : itsSource(source) {}
+
+    std::uint32_t next() {
+        const std::uint32_t place = itsUsed % wordsPerGroup;
+        if (place == 0) {
+            itsSource.words(Purpose::refinement, itsUsed / wordsPerGroup, 1, itsWords.data());
+        }
+        ++itsUsed;
+        return itsWords[place];
+    }
+
+  private:
+    const RandomSource& itsSource;
+    std::array<std::uint32_t, wordsPerGroup> itsWords;  // drawn when the first is needed
+    std::uint32_t itsUsed = 0;
+};
 
 /// The 16 random bits of a value, as the look-up takes them.
 std::uint32_t halfWordOf(const std::uint32_t* words, std::size_t value) {
@@ -65,33 +85,35 @@ void QuantisedChannel::transmit(const RandomSource& source, const std::uint8_t* 
                                 std::size_t count, int* soft) const {
     const DrawFunctions& draw = drawFunctions();
     std::array<std::uint32_t, groupsAtOnce * wordsPerGroup> words;
-    std::array<std::uint8_t, lookUpsAtOnce> undecidedOnes;
+    std::array<std::uint8_t, valuesAtOnce> isUndecided;
     std::array<std::uint8_t, valuesPerLookUp> lastBits{};
     std::array<int, valuesPerLookUp> lastSoft;
+    Refinement refinement(source);
     for (std::size_t start = 0; start < count; start += valuesAtOnce) {
         const std::size_t size = std::min(valuesAtOnce, count - start);
         source.words(Purpose::noise, static_cast<std::uint32_t>(start / (2 * wordsPerGroup)),
                      (size + 2 * wordsPerGroup - 1) / (2 * wordsPerGroup), words.data());
-        const std::size_t whole = size / valuesPerLookUp;
+        const std::size_t times = size / valuesPerLookUp;
         const std::size_t rest = size % valuesPerLookUp;
-        draw.lookUp(words.data(), codeBits + start, lane, itsCells.data(), whole, soft + start,
-                    undecidedOnes.data());
+        draw.lookUp(words.data(), codeBits + start, lane, itsCells.data(), times, soft + start,
+                    isUndecided.data());
         if (rest != 0) {
-            const std::size_t at = start + size - rest;
-            std::copy_n(codeBits + at, rest, lastBits.begin());
-            draw.lookUp(words.data() + whole * (valuesPerLookUp / 2), lastBits.data(), lane, itsCells.data(),
-                        1, lastSoft.data(), undecidedOnes.data() + whole);
-            std::copy_n(lastSoft.begin(), rest, soft + at);
+            const std::size_t at = times * valuesPerLookUp;
+            std::copy_n(codeBits + start + at, rest, lastBits.begin());
+            draw.lookUp(words.data() + times * (valuesPerLookUp / 2), lastBits.data(), lane, itsCells.data(),
+                        1, lastSoft.data(), isUndecided.data() + at);
+            std::copy_n(lastSoft.begin(), rest, soft + start + at);
         }
-        for (std::size_t i = 0; i < size; ++i) {
-            if (undecidedOnes[i / valuesPerLookUp] == 0) {
-                i += valuesPerLookUp - 1;
-            } else if (soft[start + i] == undecided) {
-                const std::uint64_t more =
-                    source.word(Purpose::refinement, static_cast<std::uint32_t>(start + i));
-                const std::uint64_t random =
-                    std::uint64_t{halfWordOf(words.data(), i)} << refinementBits | more;
-                soft[start + i] = softOf(random, (codeBits[start + i] >> lane & 1U) != 0);
+        for (std::size_t i = 0; i < size; i += 8) {
+            std::uint64_t any = 0;
+            std::memcpy(&any, isUndecided.data() + i, 8);
+            for (std::size_t j = i; any != 0 && j < std::min(i + 8, size); ++j) {
+                if (isUndecided[j] != 0) {
+                    const std::size_t at = start + j;
+                    const std::uint64_t random =
+                        std::uint64_t{halfWordOf(words.data(), j)} << refinementBits | refinement.next();
+                    soft[at] = softOf(random, (codeBits[at] >> lane & 1U) != 0);
+                }
             }
         }
     }

@@ -20,7 +20,7 @@ class QuantisedChannel {
     QuantisedChannel(const Quantiser& quantiser, Decibels ebN0);
 
     /// Send the code bits of a block.
-    /// @param source    the block's random numbers; value i depends on them and code bit i alone
+    /// @param source    the block's random numbers; they and code bit i alone decide value i
     /// @param codeBits  a byte for each code bit, which is bit `lane` of it
     /// @param count     code bits, at most 3 (6144 + 4)
     /// @param soft      receives `count` soft values, -128 to 127; positive means bit 1

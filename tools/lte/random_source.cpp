@@ -1,10 +1,9 @@
 // SPDX-License-Identifier: MIT
 #include "random_source.hpp"
 
-#include <Random123/philox.h>
-
 #include <algorithm>
 #include <array>
+#include <cstring>
 
 namespace quarzel::lte {
 
@@ -13,6 +12,34 @@ namespace {
 // The first word of the counter: index in bits 0 to 15, purpose in 16 to 18, K in 19 to 31.
 constexpr unsigned purposeShift = 16;
 constexpr unsigned blockSizeShift = 19;
+
+/// For each byte the 8 bytes that hold its bits, the lowest first.
+using SpreadTable = std::array<std::array<std::uint8_t, 8>, 256>;
+
+constexpr SpreadTable makeSpreadTable() {
+    SpreadTable table{};
+    for (unsigned byte = 0; byte < table.size(); ++byte) {
+        for (unsigned bit = 0; bit < 8; ++bit) {
+            table[byte][bit] = byte >> bit & 1U;
+        }
+    }
+    return table;
+}
+
+constexpr SpreadTable spreadTable = makeSpreadTable();
+
+/// Set bit `lane` of each of `count` bytes, a multiple of 8, that is set in the words, lowest bit first.
+void spreadBits(const std::uint32_t* words, unsigned lane, std::size_t count, std::uint8_t* bytes) {
+    for (std::size_t at = 0; at < count; at += 8) {
+        // Shifts and ors of 8 bytes together, none of which reaches into another.
+        std::uint64_t eight = 0;
+        std::uint64_t sum = 0;
+        std::memcpy(&eight, spreadTable[words[at / 32] >> at % 32 & 0xffU].data(), 8);
+        std::memcpy(&sum, bytes + at, 8);
+        sum |= eight << lane;
+        std::memcpy(bytes + at, &sum, 8);
+    }
+}
 
 }  // namespace
 
@@ -33,19 +60,13 @@ void RandomSource::words(Purpose purpose, std::uint32_t firstGroup, std::size_t 
     drawFunctions().drawWords(input(purpose, firstGroup * (wordsPerGroup / 4)), groups, words);
 }
 
-std::uint32_t RandomSource::word(Purpose purpose, std::uint32_t index) const {
-    const PhiloxInput in = input(purpose, index);
-    const philox4x32_ctr_t counter = {{in.counter[0], in.counter[1], in.counter[2], in.counter[3]}};
-    return philox4x32(counter, (philox4x32_key_t{{in.key[0], in.key[1]}})).v[0];
-}
-
 void RandomSource::informationBits(unsigned lane, std::uint8_t* bits) const {
     constexpr std::size_t bitsPerGroup = 32 * wordsPerGroup;
     std::array<std::uint32_t, wordsPerGroup> words;
     for (std::uint32_t at = 0; at < itsBlockSize; at += bitsPerGroup) {
         this->words(Purpose::informationBits, at / bitsPerGroup, 1, words.data());
         const std::size_t count = std::min<std::size_t>(bitsPerGroup, itsBlockSize - at);
-        drawFunctions().spreadBits(words.data(), lane, count, bits + at);
+        spreadBits(words.data(), lane, count, bits + at);
     }
 }
 

@@ -41,10 +41,6 @@ class RandomSource {
     /// @param words       receives groups * wordsPerGroup words
     void words(Purpose purpose, std::uint32_t firstGroup, std::size_t groups, std::uint32_t* words) const;
 
-    /// One further word for a purpose.
-    /// @param index  below 2^16; not a word that `words` gives
-    std::uint32_t word(Purpose purpose, std::uint32_t index) const;
-
     /// Draw the information bits.
     /// @param lane  which bit, 0 to 7, of the bytes they go to: the bytes can hold 8 blocks side by side
     /// @param bits  K bytes; the other bits of them are kept

@@ -35,14 +35,11 @@ struct DrawFunctions {
     /// + i of a group is word j of the output for the group's counter i.
     void (*drawWords)(const PhiloxInput& input, std::size_t groups, std::uint32_t* words);
 
-    /// Set bit `lane` of each of `count` bytes that is set in the words, lowest bit first; others are kept.
-    void (*spreadBits)(const std::uint32_t* words, unsigned lane, std::size_t count, std::uint8_t* bytes);
-
     /// Look up `times` * 32 channel outputs. Of 16 words, the low halves decide the first 16, the high halves
     /// the rest. The code bit of an output is bit `lane` of its byte.
-    /// @param undecidedOnes  receives for each 32 whether an output is `undecided`
+    /// @param isUndecided  receives for each output 1 when it is `undecided`, else 0
     void (*lookUp)(const std::uint32_t* words, const std::uint8_t* codeBits, unsigned lane,
-                   const std::int32_t* cells, std::size_t times, int* soft, std::uint8_t* undecidedOnes);
+                   const std::int32_t* cells, std::size_t times, int* soft, std::uint8_t* isUndecided);
 };
 
 /// The fastest for this processor.

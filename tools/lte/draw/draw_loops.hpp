@@ -42,16 +42,6 @@ void drawWords(const PhiloxInput& input, std::size_t groups, std::uint32_t* __re
     }
 }
 
-void spreadBits(const std::uint32_t* __restrict words, unsigned lane, std::size_t count,
-                std::uint8_t* __restrict bytes) {
-    for (std::size_t at = 0; at < count; at += 8) {
-        const std::uint32_t eight = words[at / 32] >> (at % 32);
-        for (unsigned i = 0; i < 8; ++i) {
-            bytes[at + i] = static_cast<std::uint8_t>(bytes[at + i] | ((eight >> i & 1U) << lane));
-        }
-    }
-}
-
 /// The output for one 16-bit random number and a code bit.
 inline int outputOf(std::uint32_t random, std::uint32_t codeBit, const std::int32_t* cells) {
     const std::int32_t cell = cells[random >> 4];
@@ -66,26 +56,25 @@ inline int outputOf(std::uint32_t random, std::uint32_t codeBit, const std::int3
 
 void lookUp(const std::uint32_t* __restrict words, const std::uint8_t* __restrict codeBits, unsigned lane,
             const std::int32_t* __restrict cells, std::size_t times, int* __restrict soft,
-            std::uint8_t* __restrict undecidedOnes) {
+            std::uint8_t* __restrict isUndecided) {
     constexpr std::size_t half = valuesPerLookUp / 2;
     for (std::size_t time = 0; time < times; ++time) {
-        int any = 0;
         for (std::size_t i = 0; i < half; ++i) {
             soft[i] = outputOf(words[i] & 0xffffU, codeBits[i] >> lane & 1U, cells);
-            any |= soft[i] == undecided ? 1 : 0;
+            isUndecided[i] = soft[i] == undecided ? 1 : 0;
         }
         for (std::size_t i = 0; i < half; ++i) {
             soft[half + i] = outputOf(words[i] >> 16, codeBits[half + i] >> lane & 1U, cells);
-            any |= soft[half + i] == undecided ? 1 : 0;
+            isUndecided[half + i] = soft[half + i] == undecided ? 1 : 0;
         }
-        undecidedOnes[time] = static_cast<std::uint8_t>(any);
         words += half;
         codeBits += valuesPerLookUp;
         soft += valuesPerLookUp;
+        isUndecided += valuesPerLookUp;
     }
 }
 
-constexpr DrawFunctions functions = {drawWords, spreadBits, lookUp};
+constexpr DrawFunctions functions = {drawWords, lookUp};
 
 }  // namespace
 

@@ -7,6 +7,7 @@
 #include <array>
 #include <cmath>
 #include <iterator>
+#include <limits>
 
 namespace quarzel::tool {
 
@@ -55,6 +56,19 @@ bool hasPoint(const Picture& picture, const Predicate& predicate) {
         }
     }
     return false;
+}
+
+/// The Eb/N0 that the horizontal axes show, a little more than the points need.
+std::pair<double, double> rangeOf(const Picture& picture) {
+    double first = std::numeric_limits<double>::infinity();
+    double last = -first;
+    hasPoint(picture, [&](const DrawnCurve&, const std::pair<double, MeasuredRate>& point) {
+        first = std::min(first, point.first);
+        last = std::max(last, point.first);
+        return false;
+    });
+    const double margin = first == last ? 0.5 : 0.04 * (last - first);
+    return {first - margin, last + margin};
 }
 
 /// The power of ten below every mark of a panel.
@@ -147,6 +161,7 @@ void appendLegend(std::vector<std::string>& plots, const Picture& picture) {
 }  // namespace
 
 std::string plotScript(const Picture& picture, const std::string& terminal) {
+    const std::pair<double, double> range = rangeOf(picture);
     std::string script = terminalCommand(terminal);
     fmt::format_to(std::back_inserter(script),
                    "set encoding utf8\n"
@@ -156,9 +171,9 @@ std::string plotScript(const Picture& picture, const std::string& terminal) {
                    "set format y '10^{{%T}}'\n"
                    "set grid xtics ytics linetype 1 linewidth 0.5 linecolor rgb '#d0d0d0'\n"
                    "set xlabel 'Eb/N0 in dB'\n"
-                   "set offsets graph 0.03, graph 0.03, 0, 0\n"
+                   "set xrange [{}:{}]\n"
                    "set key noenhanced at screen 0.75, 0.85 left top Left reverse samplen 2 spacing 1.2\n",
-                   picture.panels.size(), quoted(picture.title));
+                   picture.panels.size(), quoted(picture.title), range.first, range.second);
     for (std::size_t p = 0; p < picture.panels.size(); ++p) {
         const Panel& panel = picture.panels[p];
         const double floor = floorOf(panel);
@@ -167,6 +182,9 @@ std::string plotScript(const Picture& picture, const std::string& terminal) {
             const std::string name = fmt::format("{}_{}", p, i);
             script += dataOf(panel.curves[i], name, floor);
             appendPlots(plots, panel.curves[i], i, name);
+        }
+        if (plots.empty()) {
+            plots.emplace_back("NaN notitle");  // axes without a curve
         }
         if (p + 1 == picture.panels.size()) {
             appendLegend(plots, picture);
