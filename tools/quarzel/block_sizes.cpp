@@ -38,6 +38,14 @@ std::vector<std::uint32_t> nearestBlockSizes(std::uint64_t K) {
     return sizes;
 }
 
+const LteParams& blockSizeRow(std::uint64_t K, const std::string& subject) {
+    if (const LteParams* row = findBlockSize(K)) {
+        return *row;
+    }
+    throw ToolError(ExitCode::usage, subject, fmt::format("{} is no block size of LTE", K),
+                    fmt::format("the nearest: {}", fmt::join(nearestBlockSizes(K), ", ")));
+}
+
 std::uint32_t blockSizeOf(std::uint64_t positions, const std::string& where) {
     const std::uint64_t K = positions < tailPositions ? 0 : positions - tailPositions;
     if (const LteParams* row = findBlockSize(K)) {

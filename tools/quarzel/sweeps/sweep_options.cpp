@@ -7,6 +7,7 @@
 #include <vector>
 
 #include "block_sizes.hpp"
+#include "choices.hpp"
 #include "sweep/error.hpp"
 #include "tool_error.hpp"
 #include "value_lists.hpp"
@@ -65,7 +66,7 @@ lte::Quantiser quantiserOf(const SweepOptions& options) {
 void addSweepOptions(CLI::App& command, SweepOptions& options) {
     const auto add = [&command](const char* group, const char* name, auto& value, const char* type,
                                 const char* text) {
-        return command.add_option(name, value, text)->type_name(type)->group(group);
+        return command.add_option(name, value, text)->type_name(type)->group(group)->check(anyText());
     };
     add(points, "--ebn0", options.ebN0, "LIST", "Eb/N0 in dB: 0.5 or 0:0.1:1.5 or 0,1:0.5:3")->required();
     add(points, "--block-size", options.blockSizes, "LIST", "K (default 1024)");
@@ -88,7 +89,8 @@ void addSweepOptions(CLI::App& command, SweepOptions& options) {
     add(stopping, "--max-time", options.maxSeconds, "SECONDS", "Time for a point (default: no limit)")
         ->transform(atLeast(1));
     command.add_option("--shard", options.shard, "Decode part I of N only, for 'quarzel merge'")
-        ->type_name("I/N");
+        ->type_name("I/N")
+        ->check(anyText());
 }
 
 sweep::Configuration configurationOf(const SweepOptions& options) {
