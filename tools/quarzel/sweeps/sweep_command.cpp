@@ -51,8 +51,8 @@ Files:
               With --shard a part of it, for 'quarzel merge'. It is written
               whole or not at all, at the end.
   FILE        what is done so far, renewed while the sweep runs and when it is
-              interrupted (SIGINT, SIGTERM), removed at the end. --resume goes on
-              from it, or begins at the beginning when there is none.
+              interrupted (SIGINT, SIGTERM), removed at the end. --resume goes
+              on from it, or begins at the beginning when there is none.
 
 Examples:
   quarzel sweep --ebn0 0:0.2:1 --iterations 8 -o result.json
