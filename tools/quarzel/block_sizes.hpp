@@ -5,16 +5,9 @@
 #include <string>
 #include <vector>
 
-#include "interleaver/lte_params.hpp"
+#include "lte/size_table.hpp"
 
 namespace quarzel::tool {
-
-/// The row of the parameter table for a block size, or null when LTE has no such size.
-const LteParams* findBlockSize(std::uint64_t K);
-
-/// The valid block sizes next to one that is not valid, in ascending order: one on each side, or only one
-/// when K lies outside the table.
-std::vector<std::uint32_t> nearestBlockSizes(std::uint64_t K);
 
 /// The block size K whose blocks have this many positions, K + 4, in each stream.
 /// @param where  the file, and the line when it is known, for the error message

@@ -116,11 +116,11 @@ void printSizeJson(std::ostream& stream, const LteParams& row) {
 }
 
 const LteParams& rowOf(std::uint64_t K) {
-    if (const LteParams* row = findBlockSize(K)) {
+    if (const LteParams* row = lte::findBlockSize(K)) {
         return *row;
     }
     throw ToolError(ExitCode::usage, "K", fmt::format("{} is no block size of LTE", K),
-                    fmt::format("the nearest: {}", fmt::join(nearestBlockSizes(K), ", ")));
+                    "the nearest: " + lte::nearestBlockSizesText(K));
 }
 
 }  // namespace
