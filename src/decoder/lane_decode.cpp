@@ -107,8 +107,7 @@ void LaneDecoder::shareStore(const LaneLayout& layout, const Plan& plan, LaneGro
         {&group.betaStart[0], betaRows * row},
         {&group.betaStart[1], betaRows * row},
         {&group.boundary, states * row},
-        {&group.alphaRows, lanes::maxWindow * states * width},
-        {&group.channelRows, lanes::maxWindow * width},
+        {&group.stepRows, lanes::maxWindow * lanes::mostStepVectors * width},
     };
     const auto rounded = [](std::size_t words) { return (words + lineWords - 1) / lineWords * lineWords; };
     std::size_t needed = lineWords;

@@ -52,6 +52,22 @@ TEST(Encoder, AnswersAnImpulseAsTheGeneratorPolynomialsDo) {
     EXPECT_EQ(textOf(streams, 88, 10), "1111001011");
 }
 
+TEST(Encoder, EncodesEightBlocksSideBySide) {
+    std::mt19937 random = quarzel::test::seededRandom();
+    std::vector<std::uint8_t> all(1024);
+    std::generate(all.begin(), all.end(), [&] { return static_cast<std::uint8_t>(random()); });
+    const std::vector<std::uint8_t> allStreams = encode(all);
+    for (unsigned lane = 0; lane < 8; ++lane) {
+        const auto laneOf = [lane](std::vector<std::uint8_t> bytes) {
+            for (std::uint8_t& byte : bytes) {
+                byte = byte >> lane & 1U;
+            }
+            return bytes;
+        };
+        EXPECT_EQ(encode(laneOf(all)), laneOf(allStreams)) << lane;
+    }
+}
+
 TEST(Encoder, RefusesASizeThatLteDoesNotHave) {
     EXPECT_THROW(Encoder(41), std::invalid_argument);
     EXPECT_THROW(Encoder(0), std::invalid_argument);

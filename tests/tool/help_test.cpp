@@ -45,6 +45,9 @@ TEST(Help, TeachesInfo) {
 TEST(Help, TeachesTraceDiff) {
     expectHelp({"trace-diff", "--help"}, "trace_diff_help.txt");
 }
+TEST(Help, TeachesCompare) {
+    expectHelp({"compare", "--help"}, "compare_help.txt");
+}
 
 TEST(Help, HasAShortOption) {
     EXPECT_EQ(runTool({"decode", "-h"}).out, runTool({"decode", "--help"}).out);

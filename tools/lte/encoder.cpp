@@ -12,20 +12,21 @@ namespace quarzel::lte {
 namespace {
 
 /// The three delay elements of the constituent encoder, transfer function [1, (1 + D + D^3) / (1 + D^2 +
-/// D^3)].
-class ConstituentEncoder {
+/// D^3)], for both codes at once: the bits of the first are in the lower byte, those of the second in the
+/// upper.
+class ConstituentEncoders {
   public:
-    /// The parity bit of the next information bit.
-    std::uint8_t parity(std::uint8_t bit) {
-        const std::uint8_t feedback = bit ^ itsDelay2 ^ itsDelay3;
-        const std::uint8_t parityBit = feedback ^ itsDelay1 ^ itsDelay3;
+    /// The parity bits of the next information bits.
+    std::uint32_t parity(std::uint32_t bits) {
+        const std::uint32_t feedback = bits ^ itsDelay2 ^ itsDelay3;
+        const std::uint32_t parityBits = feedback ^ itsDelay1 ^ itsDelay3;
         shift(feedback);
-        return parityBit;
+        return parityBits;
     }
 
     struct TailBits {
-        std::array<std::uint8_t, 3> systematic;
-        std::array<std::uint8_t, 3> parity;
+        std::array<std::uint32_t, 3> systematic;
+        std::array<std::uint32_t, 3> parity;
     };
 
     /// The bits of the three steps that lead back to state 0: the feedback is the input.
@@ -40,15 +41,15 @@ class ConstituentEncoder {
     }
 
   private:
-    void shift(std::uint8_t bit) {
+    void shift(std::uint32_t bits) {
         itsDelay3 = itsDelay2;
         itsDelay2 = itsDelay1;
-        itsDelay1 = bit;
+        itsDelay1 = bits;
     }
 
-    std::uint8_t itsDelay1 = 0;
-    std::uint8_t itsDelay2 = 0;
-    std::uint8_t itsDelay3 = 0;
+    std::uint32_t itsDelay1 = 0;
+    std::uint32_t itsDelay2 = 0;
+    std::uint32_t itsDelay3 = 0;
 };
 
 const LteParams& paramsOf(std::uint32_t blockSize) {
@@ -74,23 +75,26 @@ void Encoder::encode(const std::uint8_t* bits, std::uint8_t* streams) const {
     std::uint8_t* const systematic = streams;
     std::uint8_t* const parity1 = streams + positions();
     std::uint8_t* const parity2 = streams + 2 * positions();
-    ConstituentEncoder first;
-    ConstituentEncoder second;
+    ConstituentEncoders encoders;
     for (std::size_t i = 0; i < K; ++i) {
         systematic[i] = bits[i];
-        parity1[i] = first.parity(bits[i]);
-        parity2[i] = second.parity(bits[itsPermutation[i]]);
+        const std::uint32_t parity = encoders.parity(bits[i] | std::uint32_t{bits[itsPermutation[i]]} << 8);
+        parity1[i] = static_cast<std::uint8_t>(parity);
+        parity2[i] = static_cast<std::uint8_t>(parity >> 8);
     }
     // The tail of the first code fills two positions of all three streams, that of the second the next two.
-    for (ConstituentEncoder* const code : {&first, &second}) {
-        const std::size_t at = code == &first ? K : K + 2;
-        const auto [x, z] = code->terminate();
-        systematic[at] = x[0];
-        parity1[at] = z[0];
-        parity2[at] = x[1];
-        systematic[at + 1] = z[1];
-        parity1[at + 1] = x[2];
-        parity2[at + 1] = z[2];
+    const auto [x, z] = encoders.terminate();
+    for (const unsigned code : {0U, 1U}) {
+        const std::size_t at = K + 2 * code;
+        const auto bitsOf = [code](std::uint32_t both) {
+            return static_cast<std::uint8_t>(both >> 8 * code);
+        };
+        systematic[at] = bitsOf(x[0]);
+        parity1[at] = bitsOf(z[0]);
+        parity2[at] = bitsOf(x[1]);
+        systematic[at + 1] = bitsOf(z[1]);
+        parity1[at + 1] = bitsOf(x[2]);
+        parity2[at + 1] = bitsOf(z[2]);
     }
 }
 

@@ -22,11 +22,11 @@ class Encoder {
     /// K + 4, the positions of each of the three streams.
     std::size_t positions() const { return blockSize() + 4; }
 
-    /// Encode a block.
-    /// @param bits     K information bits, each a byte of 0 or 1
-    /// @param streams  receives 3 (K + 4) code bits, each a byte of 0 or 1: systematic, parity of the first
-    ///                 and parity of the second constituent code. The last 4 positions of each are the tail
-    ///                 bits where the standard puts them (section 5.1.3.2.2)
+    /// Encode a block, or 8 blocks side by side: bit i of every byte belongs to block i.
+    /// @param bits     K information bits, each a byte of 0 or 1; or those of 8 blocks
+    /// @param streams  receives 3 (K + 4) code bits of the same form: systematic, parity of the first and
+    ///                 parity of the second constituent code. The last 4 positions of each are the tail bits
+    ///                 where the standard puts them (section 5.1.3.2.2)
     void encode(const std::uint8_t* bits, std::uint8_t* streams) const;
 
   private:

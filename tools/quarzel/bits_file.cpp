@@ -48,9 +48,13 @@ PackedBits readBits(const std::string& file, std::size_t blocks, std::size_t byt
     return bits;
 }
 
-void writeBits(const std::string& file, const PackedBits& bits) {
+std::string npyOf(const PackedBits& bits) {
     const std::array<std::size_t, 2> shape = {bits.blocks(), bits.bytesPerBlock};
-    writeOutput(file, xt::dump_npy(xt::adapt(bits.bytes, shape)));
+    return xt::dump_npy(xt::adapt(bits.bytes, shape));
+}
+
+void writeBits(const std::string& file, const PackedBits& bits) {
+    writeOutput(file, npyOf(bits));
 }
 
 BitErrors countErrors(const PackedBits& decided, const PackedBits& sent) {

@@ -28,6 +28,9 @@ struct PackedBits {
 /// @throws ToolError when the file cannot be read, is not well-formed or has another type or shape
 PackedBits readBits(const std::string& file, std::size_t blocks, std::size_t bytesPerBlock);
 
+/// The bytes of an npy file of uint8 values of shape (blocks, bytesPerBlock).
+std::string npyOf(const PackedBits& bits);
+
 /// Write an npy file of uint8 values of shape (blocks, bytesPerBlock), whole or not at all.
 /// @throws ToolError when that fails
 void writeBits(const std::string& file, const PackedBits& bits);

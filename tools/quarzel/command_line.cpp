@@ -5,13 +5,18 @@
 
 #include <CLI/CLI.hpp>
 #include <memory>
+#include <optional>
 #include <string>
 #include <vector>
 
 #include "decode_command.hpp"
 #include "info_command.hpp"
+#include "nearest_name.hpp"
+#include "sweeps/merge_command.hpp"
+#include "sweeps/verify_result_command.hpp"
 #include "tool_error.hpp"
 #include "trace_diff_command.hpp"
+#include "vectors/compare_command.hpp"
 
 namespace quarzel::tool {
 
@@ -28,6 +33,8 @@ Examples:
   quarzel decode capture.npy --units 8 --reference sent.npy
   quarzel decode capture.npy --trace 12 --trace-file model.txt
   quarzel trace-diff model.txt simulation.txt --ignore-termination
+  quarzel compare vectors/u2_a1 simulated.hex
+  quarzel sweep --ebn0 0:0.2:1 --iterations 8 -o result.json
 )";
 
 class HelpFormatter : public CLI::Formatter {
@@ -65,9 +72,41 @@ std::string problemWith(const CLI::App& app, const CLI::ParseError& error) {
     return text;
 }
 
+/// The words that may stand where one was not understood: options, or else commands.
+std::vector<std::string> namesLike(const std::string& word, const CLI::App& app) {
+    const std::vector<CLI::App*> chosen = app.get_subcommands();
+    std::vector<std::string> names;
+    if (word.starts_with('-')) {
+        for (const CLI::Option* option : (chosen.empty() ? &app : chosen.front())->get_options()) {
+            for (const std::string& name : option->get_lnames()) {
+                names.push_back("--" + name);
+            }
+        }
+    } else if (chosen.empty()) {
+        for (const CLI::App* command : app.get_subcommands({})) {
+            names.push_back(command->get_name());
+        }
+    }
+    return names;
+}
+
+std::string remedyFor(const CLI::App& app) {
+    const std::vector<CLI::App*> chosen = app.get_subcommands();
+    const std::string help =
+        fmt::format("see 'quarzel {}--help'", chosen.empty() ? "" : chosen.front()->get_name() + ' ');
+    const std::vector<std::string> leftOver = app.remaining(true);
+    if (leftOver.empty()) {
+        return help;
+    }
+    const std::string word = leftOver.front().substr(0, leftOver.front().find('='));
+    const std::optional<std::string> nearest = nearestName(word, namesLike(word, app));
+    return nearest ? fmt::format("did you mean '{}'? {}", *nearest, help) : help;
+}
+
 }  // namespace
 
-ExitCode runCommandLine(int argc, const char* const* argv, std::ostream& results) {
+ExitCode runCommandLine(int argc, const char* const* argv, std::ostream& results,
+                        const MakeWorkers& makeWorkers) {
     CLI::App app(description, "quarzel");
     app.formatter(std::make_shared<HelpFormatter>());
     app.set_help_flag("-h,--help", "Print help");
@@ -78,6 +117,10 @@ ExitCode runCommandLine(int argc, const char* const* argv, std::ostream& results
     addInfoCommand(app, results);
     ExitCode exitCode = ExitCode::done;
     addTraceDiffCommand(app, results, exitCode);
+    addCompareCommand(app, results, exitCode);
+    addSweepCommand(app, results, makeWorkers);
+    addMergeCommand(app, results);
+    addVerifyResultCommand(app, results, exitCode, makeWorkers);
     try {
         app.parse(argc, argv);
     } catch (const CLI::CallForHelp&) {
@@ -85,10 +128,7 @@ ExitCode runCommandLine(int argc, const char* const* argv, std::ostream& results
     } catch (const CLI::CallForVersion& version) {
         results << version.what() << '\n';
     } catch (const CLI::ParseError& error) {
-        const std::string command =
-            app.get_subcommands().empty() ? "" : app.get_subcommands()[0]->get_name() + ' ';
-        throw ToolError(ExitCode::usage, "", problemWith(app, error),
-                        fmt::format("see 'quarzel {}--help'", command));
+        throw ToolError(ExitCode::usage, "", problemWith(app, error), remedyFor(app));
     }
     return exitCode;
 }

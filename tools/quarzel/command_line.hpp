@@ -3,14 +3,17 @@
 
 #include <ostream>
 
+#include "sweeps/sweep_command.hpp"
 #include "tool_error.hpp"
 
 namespace quarzel::tool {
 
 /// Do what the command line asks for.
 /// @param results  receives what the user asked for, help included, and nothing else
+/// @param makeWorkers  who do the work of sweeps
 /// @return        how the tool is to end
 /// @throws ToolError when the command line is wrong or its command fails
-ExitCode runCommandLine(int argc, const char* const* argv, std::ostream& results);
+ExitCode runCommandLine(int argc, const char* const* argv, std::ostream& results,
+                        const MakeWorkers& makeWorkers = makeThreadWorkers);
 
 }  // namespace quarzel::tool

@@ -4,13 +4,11 @@
 #include <fmt/format.h>
 #include <unistd.h>
 
-#include <algorithm>
 #include <chrono>
 #include <iostream>
 #include <memory>
 #include <optional>
 #include <string>
-#include <thread>
 
 #include "bits_file.hpp"
 #include "capture_file.hpp"
@@ -20,10 +18,10 @@
 #include "decode_together.hpp"
 #include "output_file.hpp"
 #include "progress.hpp"
+#include "threads_option.hpp"
 #include "tool_error.hpp"
 #include "trace_file.hpp"
 #include "trace_options.hpp"
-#include "whole_number.hpp"
 
 namespace quarzel::tool {
 
@@ -35,7 +33,7 @@ struct DecodeOptions {
     std::optional<std::string> output;
     CoreOptions core;
     TraceOptions trace;
-    unsigned threads = std::max(1U, std::thread::hardware_concurrency());
+    unsigned threads = allCores();
     bool json = false;
 };
 
@@ -186,13 +184,7 @@ void addDecodeCommand(CLI::App& app, std::ostream& results) {
         ->type_name("BITS");
     command->add_option("-o,--output", options->output, "Write the decided bits to this file")
         ->type_name("OUT");
-    command
-        ->add_option("--threads", options->threads,
-                     "Threads that decode, 1 to 1024; what they give does\nnot depend on their number "
-                     "(default: all cores)")
-        ->type_name("N")
-        ->transform(
-            wholeNumber([](std::uint64_t n) { return n >= 1 && n <= 1024; }, "a number from 1 to 1024"));
+    addThreadsOption(*command, options->threads);
     addTraceOptions(*command, options->trace);
     command->add_flag("--json", options->json, "Print one JSON object instead of text");
     command->callback([options, &results] { decode(*options, results); });

@@ -11,15 +11,13 @@
 #include <vector>
 
 #include "block_sizes.hpp"
-#include "decoder/segments.hpp"
+#include "core_layout.hpp"
 #include "tool_error.hpp"
 #include "whole_number.hpp"
 
 namespace quarzel::tool {
 
 namespace {
-
-constexpr std::uint32_t threadsPerUnit = 4;
 
 constexpr const char* description = "Tell the valid block sizes, or how the core cuts one";
 
@@ -37,26 +35,8 @@ Example:
   quarzel info 6144
 )";
 
-/// How a core with some number of units cuts a block.
-struct Layout {
-    std::uint32_t units;
-    std::uint32_t threads;
-    std::uint32_t segments;
-    std::uint32_t steps;                 ///< trellis steps of each segment
-    std::vector<std::uint32_t> windows;  ///< their lengths, in the order of the segment
-};
-
-std::vector<Layout> layoutsOf(std::uint32_t K) {
-    std::vector<Layout> layouts;
-    for (const std::uint32_t units : {2U, 4U, 8U}) {
-        const std::uint32_t threads = threadsPerUnit * units;
-        const std::uint32_t segments = threadSegments(K, threads);
-        Layout& layout = layouts.emplace_back(Layout{units, threads, segments, K / segments, {}});
-        for (std::uint32_t rest = layout.steps; rest > 0; rest -= layout.windows.back()) {
-            layout.windows.push_back(windowLength(rest));
-        }
-    }
-    return layouts;
+std::vector<CoreLayout> layoutsOf(std::uint32_t K) {
+    return {coreLayout(K, 2), coreLayout(K, 4), coreLayout(K, 8)};
 }
 
 /// Lengths with equal neighbours taken together: "2 x 64 + 54 + 53".
@@ -94,7 +74,7 @@ void printSize(std::ostream& stream, const LteParams& row) {
         "\n"
         "units  threads  segments  steps per segment  windows per segment\n",
         row.K, row.f1, row.f2, row.K, row.f1, row.f2);
-    for (const Layout& layout : layoutsOf(row.K)) {
+    for (const CoreLayout& layout : layoutsOf(row.K)) {
         stream << fmt::format("{:5}  {:7}  {:8}  {:17}  {} ({})\n", layout.units, layout.threads,
                               layout.segments, layout.steps, layout.windows.size(),
                               lengthsText(layout.windows));
@@ -103,7 +83,7 @@ void printSize(std::ostream& stream, const LteParams& row) {
 
 void printSizeJson(std::ostream& stream, const LteParams& row) {
     nlohmann::ordered_json cores = nlohmann::ordered_json::array();
-    for (const Layout& layout : layoutsOf(row.K)) {
+    for (const CoreLayout& layout : layoutsOf(row.K)) {
         cores.push_back({{"units", layout.units},
                          {"threads", layout.threads},
                          {"segments", layout.segments},

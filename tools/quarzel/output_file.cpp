@@ -5,11 +5,9 @@
 #include <fmt/format.h>
 #include <unistd.h>
 
-#include <cerrno>
-#include <cstring>
 #include <filesystem>
-#include <utility>
 
+#include "open_file.hpp"
 #include "tool_error.hpp"
 
 namespace fs = std::filesystem;
@@ -17,79 +15,6 @@ namespace fs = std::filesystem;
 namespace quarzel::tool {
 
 namespace {
-
-const char* remedyFor(int cause) {
-    switch (cause) {
-        case ENOENT:
-            return "create its directory first";
-        case EACCES:
-        case EPERM:
-        case EROFS:
-            return "choose a place that you may write to";
-        case ENOSPC:
-        case EDQUOT:
-            return "free some space";
-        case EFBIG:
-            return "raise the limit (ulimit -f)";
-        default:
-            return "choose another place";
-    }
-}
-
-/// The error for the system call that has just failed.
-ToolError writeError(const std::string& file) {
-    const int cause = errno;
-    return fileError(file, fmt::format("cannot be written: {}", std::strerror(cause)), remedyFor(cause));
-}
-
-/// A file open for writing.
-class OpenFile {
-  public:
-    /// @param name   the file that is opened
-    /// @param shown  its name for error messages
-    OpenFile(const std::string& name, int flags, std::string shown)
-        : itsDescriptor(::open(name.c_str(), O_WRONLY | O_CLOEXEC | flags, 0666)),
-          itsShown(std::move(shown)) {
-        if (itsDescriptor < 0) {
-            throw writeError(itsShown);
-        }
-    }
-    OpenFile(const OpenFile&) = delete;
-    OpenFile& operator=(const OpenFile&) = delete;
-    ~OpenFile() {
-        if (itsDescriptor >= 0) {
-            ::close(itsDescriptor);
-        }
-    }
-
-    void write(std::string_view bytes) {
-        while (!bytes.empty()) {
-            const ssize_t count = ::write(itsDescriptor, bytes.data(), bytes.size());
-            if (count >= 0) {
-                bytes.remove_prefix(static_cast<std::size_t>(count));
-            } else if (errno != EINTR) {
-                throw writeError(itsShown);
-            }
-        }
-    }
-
-    void sync() {
-        if (::fsync(itsDescriptor) != 0) {
-            throw writeError(itsShown);
-        }
-    }
-
-    /// Some file systems report a full disk only here.
-    void close() {
-        if (::close(std::exchange(itsDescriptor, -1)) != 0) {
-            throw writeError(itsShown);
-        }
-    }
-
-  private:
-    int itsDescriptor;
-    std::string itsShown;
-};
 
 /// The file that a name stands for: links are followed, so that they stay links.
 fs::path targetOf(const std::string& file) {

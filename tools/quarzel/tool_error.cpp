@@ -9,9 +9,11 @@ namespace quarzel::tool {
 
 const char* const exitCodesHelp = R"(Exit codes:
   0  done
-  1  decoding failed; for trace-diff: the traces differ
+  1  decoding failed; for trace-diff, compare and verify-result: there is a
+     difference
   2  the command line is wrong
-  3  a file cannot be read, understood or written)";
+  3  a file cannot be read, understood or written
+  4  interrupted by a signal)";
 
 ToolError::ToolError(ExitCode code, std::string_view subject, std::string_view problem,
                      std::string_view remedy)

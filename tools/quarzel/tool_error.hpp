@@ -12,8 +12,11 @@ enum class ExitCode {
     done = 0,
     decodingFailed = 1,
     tracesDiffer = 1,
+    decisionsDiffer = 1,
+    resultsDiffer = 1,
     usage = 2,
     file = 3,
+    interrupted = 4,
 };
 
 /// The same for the user, to be shown in every help.

@@ -9,6 +9,7 @@
 #include <vector>
 
 #include "engine/dump_columns.hpp"
+#include "report_text.hpp"
 
 namespace quarzel::tool {
 
@@ -16,10 +17,6 @@ namespace {
 
 /// Steps shown before and after the one that differs.
 constexpr std::size_t contextSteps = 3;
-
-std::string counted(std::size_t number, const std::string& noun, const std::string& plural) {
-    return fmt::format("{} {}", number, number == 1 ? noun : plural);
-}
 
 std::string valuesThatDiffer(std::size_t number, std::string_view where) {
     return fmt::format("{} of {} {}", counted(number, "value", "values"), where,
@@ -73,10 +70,6 @@ std::string whatComes(const std::optional<TraceTable>& table, std::size_t lines)
                  : fmt::format("nothing, it ends after line {}", lines);
 }
 
-void printLine(std::string& text, std::string_view label, std::string_view content) {
-    fmt::format_to(std::back_inserter(text), "{:14}{}\n", label, content);
-}
-
 void endRow(std::string& text) {
     text.resize(text.find_last_not_of(' ') + 1);
     text += '\n';
@@ -115,21 +108,21 @@ void printFirstValue(std::string& text, const TraceDifference& first) {
     const TraceTable& b = *first.b;
     const std::size_t index = *first.index;
     const std::size_t column = a.columnOf(index);
-    printLine(text, "block", fmt::format("{} (decode={})", blockNumber(a), a.decode));
+    reportLine(text, "block", fmt::format("{} (decode={})", blockNumber(a), a.decode));
     if (a.siso) {
         const unsigned code = constituentCode(*a.siso);
-        printLine(text, "pass",
-                  fmt::format("{}: constituent code {} in {} order", *a.siso, code,
-                              code == 1 ? "natural" : "interleaved"));
+        reportLine(text, "pass",
+                   fmt::format("{}: constituent code {} in {} order", *a.siso, code,
+                               code == 1 ? "natural" : "interleaved"));
     } else {
-        printLine(text, "pass", "none: soft inputs of the block");
+        reportLine(text, "pass", "none: soft inputs of the block");
     }
-    printLine(text, "step", fmt::format("{} of 0 to {}", a.stepOf(index), a.steps - 1));
-    printLine(text, "signal", fmt::format("{}: {}", headingOf(a.column(column)), meaningOf(a, column)));
-    printLine(text, "value in A", valueText(a, index));
-    printLine(text, "value in B", valueText(b, index));
-    printLine(text, "further",
-              valuesThatDiffer(first.values - 1, a.siso ? "this pass" : "these soft inputs"));
+    reportLine(text, "step", fmt::format("{} of 0 to {}", a.stepOf(index), a.steps - 1));
+    reportLine(text, "signal", fmt::format("{}: {}", headingOf(a.column(column)), meaningOf(a, column)));
+    reportLine(text, "value in A", valueText(a, index));
+    reportLine(text, "value in B", valueText(b, index));
+    reportLine(text, "further",
+               valuesThatDiffer(first.values - 1, a.siso ? "this pass" : "these soft inputs"));
 }
 
 /// In what way the traces are equal or not.
@@ -152,28 +145,28 @@ void printText(std::ostream& stream, const TraceDiffReport& report) {
     const TraceComparison& comparison = report.comparison;
     const auto& first = comparison.first;
     std::string text;
-    printLine(text, "A", report.fileA);
-    printLine(text, "B", report.fileB);
-    printLine(text, "result", resultText(comparison));
+    reportLine(text, "A", report.fileA);
+    reportLine(text, "B", report.fileB);
+    reportLine(text, "result", resultText(comparison));
     if (!first) {
-        printLine(text, "compared",
-                  counted(comparison.blocks, "block", "blocks") + ", " +
-                      counted(comparison.passes, "pass", "passes"));
+        reportLine(text, "compared",
+                   counted(comparison.blocks, "block", "blocks") + ", " +
+                       counted(comparison.passes, "pass", "passes"));
     } else if (first->index) {
         printFirstValue(text, *first);
     } else {
-        printLine(text, "next in A", whatComes(first->a, report.linesA));
-        printLine(text, "next in B", whatComes(first->b, report.linesB));
+        reportLine(text, "next in A", whatComes(first->a, report.linesA));
+        reportLine(text, "next in B", whatComes(first->b, report.linesB));
     }
     if (!first && comparison.termination > 0) {
-        printLine(text, "ignored", valuesThatDiffer(comparison.termination, "termination steps"));
+        reportLine(text, "ignored", valuesThatDiffer(comparison.termination, "termination steps"));
     } else if (first && first->isTermination()) {
-        printLine(text, "note",
-                  comparison.elsewhere
-                      ? "a termination step, which hardware does not compute; the traces\n"
-                        "              differ elsewhere too, --ignore-termination tells where"
-                      : "termination steps, which hardware does not compute, hold every\n"
-                        "              difference of these traces; see --ignore-termination");
+        reportLine(text, "note",
+                   comparison.elsewhere
+                       ? "a termination step, which hardware does not compute; the traces\n"
+                         "              differ elsewhere too, --ignore-termination tells where"
+                       : "termination steps, which hardware does not compute, hold every\n"
+                         "              difference of these traces; see --ignore-termination");
     }
     if (first && first->index) {
         printContext(text, *first->a, *first->b, *first->index);

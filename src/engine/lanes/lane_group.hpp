@@ -23,6 +23,9 @@ inline constexpr std::size_t octetLanes = 8;
 /// Backward windows have at most this many steps.
 inline constexpr std::size_t maxWindow = 64;
 
+/// Vectors that the forward half of a window may keep for a step.
+inline constexpr std::size_t mostStepVectors = 11;
+
 /// Where a pass finds the lanes of an octet: in octet `octet` of the source row, after shuffle `shuffle`.
 struct OctetSource {
     std::uint16_t octet;
@@ -74,8 +77,8 @@ struct LaneGroup {
     std::int16_t* alphaStart[2];  ///< per code, [8] rows: starts of the next pass
     std::int16_t* betaStart[2];   ///< per code, [windows][8] rows: starts of the next pass
     std::int16_t* boundary;       ///< [8] rows: the last metrics of each segment in the direction at hand
-    std::int16_t* alphaRows;      ///< [maxWindow][8] vectors
-    std::int16_t* channelRows;    ///< [maxWindow] vectors
+    std::int16_t* stepRows;  ///< [maxWindow][up to mostStepVectors] vectors: what a window's forward half
+                             ///< leaves for its backward half
     /// @}
 };
 

@@ -86,6 +86,14 @@ class GroupDecoder {
     static constexpr std::size_t slots = W / octetLanes;
     static constexpr std::size_t states = trellis::states;
 
+    /// Whether the forward half of a window keeps the branch metrics for the backward half. At 32 lanes they
+    /// would drive the forward metrics out of the first-level cache.
+    static constexpr bool keepsBranchMetrics = W < 32;
+
+    /// Vectors that a step keeps: the forward metrics before it, twice the intrinsic value, branch metrics.
+    static constexpr std::size_t stepVectors = states + 1 + (keepsBranchMetrics ? 2 : 0);
+    static_assert(stepVectors <= mostStepVectors);
+
     template <class Rule>
     static constexpr bool plainMaximum = std::is_same_v<std::decay_t<Rule>, PlainMaxLog<Word>>;
 
@@ -102,11 +110,6 @@ class GroupDecoder {
         writeDecisions(itsGroup);
     }
 
-  private:
-    const LaneGroup& itsGroup;
-    const std::size_t itsRow;      ///< words in a row
-    const std::size_t itsColumns;  ///< vectors in a row
-
     /// The window that a recursion is at.
     struct Window {
         std::size_t bottom;
@@ -114,6 +117,105 @@ class GroupDecoder {
         bool first;
         bool last;
     };
+
+    /// Forward over a window: keep the metrics before each step, and the state after the last.
+    template <int Code>
+    QUARZEL_LANES_FLATTEN void forward(const Window& window, std::size_t column, bool firstIteration) const {
+        // A copy that no store can reach, so that its members stay in registers.
+        const GroupDecoder here(*this);
+        const Recursion rule = Rules::recursion();
+        const std::size_t at = column * W;
+        State state = window.first ? load(loadMetrics<W>(here.itsGroup.alphaStart[Code] + at, here.itsRow))
+                                   : here.loadAlphaState(here.itsGroup.alphaState + at);
+        const auto step = [&](std::size_t t) {
+            const Word channel = here.channelValue<Code>(window.bottom + t, column, firstIteration);
+            const BranchMetrics<Word> metrics =
+                branchMetrics(channel, here.parity<Code>(window.bottom + t, column));
+            std::int16_t* const stored = here.itsGroup.stepRows + t * stepVectors * W;
+            storeMetrics<W>(words(state), stored, W);
+            channel.store(stored + states * W);
+            if constexpr (keepsBranchMetrics) {
+                metrics[0].store(stored + (states + 1) * W);
+                metrics[1].store(stored + (states + 2) * W);
+            }
+            state = alphaStep<Recursion>(state, metrics, rule);
+        };
+        std::size_t t = 0;
+        while (t + normalisedRows <= window.length) {
+            for (std::size_t i = 0; i < normalisedRows; ++i) {
+                step(t++);
+            }
+            normalise(state);
+        }
+        while (t < window.length) {
+            step(t++);
+        }
+        normalise(state);
+        if (window.last) {
+            here.storeBoundary(state, here.itsGroup.alphaState + at);
+        } else {
+            here.storeAlphaState(state, here.itsGroup.alphaState + at);
+        }
+    }
+
+    /// Backward over a window, with the LLR and the extrinsic value of each step.
+    /// @return the state below its lowest step
+    template <int Code>
+    QUARZEL_LANES_FLATTEN State backward(const Window& window, std::size_t column, const std::int16_t* start,
+                                         bool lastPass) const {
+        const GroupDecoder here(*this);
+        const Recursion rule = Rules::recursion();
+        State state = load(loadMetrics<W>(start, here.itsRow));
+        const auto step = [&](std::size_t t, const auto& llrRule) {
+            const std::size_t row = window.bottom + t;
+            const std::int16_t* const stored = here.itsGroup.stepRows + t * stepVectors * W;
+            if constexpr (plainMaximum<decltype(llrRule)>) {
+                assert(withinBounds<W>(words(state)));
+                assert(withinBounds<W>(loadMetrics<W>(stored, W)));
+            }
+            const Word channel = Word::load(stored + states * W);
+            BranchMetrics<Word> metrics;
+            if constexpr (keepsBranchMetrics) {
+                metrics =
+                    symmetric(Word::load(stored + (states + 1) * W), Word::load(stored + (states + 2) * W));
+            } else {
+                metrics = branchMetrics(channel, here.parity<Code>(row, column));
+            }
+            const auto alpha = [stored](std::size_t i) { return Word::load(stored + i * W); };
+            const auto result = backwardStep(state, metrics, alpha, rule, llrRule);
+            state = result.beta;
+            here.output<Code>(row, column, result.llr, channel, lastPass);
+        };
+        const std::size_t floor = window.first ? unboundedRows : 0;
+        std::size_t t = window.length;
+        for (std::size_t i = 0; i < normalisedRows; ++i) {
+            --t;
+            if (i < unboundedRows) {
+                step(t, Rules::llrNearStart());
+            } else {
+                step(t, Rules::llr());
+            }
+        }
+        normalise(state);
+        while (t >= floor + normalisedRows) {
+            for (std::size_t i = 0; i < normalisedRows; ++i) {
+                step(--t, Rules::llr());
+            }
+            normalise(state);
+        }
+        while (t > floor) {
+            step(--t, Rules::llr());
+        }
+        while (t > 0) {
+            step(--t, Rules::llrNearStart());
+        }
+        return state;
+    }
+
+  private:
+    const LaneGroup itsGroup;
+    const std::size_t itsRow;      ///< words in a row
+    const std::size_t itsColumns;  ///< vectors in a row
 
     /// One pass of a constituent code over all windows, from the lowest up.
     template <int Code>
@@ -143,85 +245,6 @@ class GroupDecoder {
             handDown(lastStarts);
         }
         handUp(itsGroup.alphaStart[Code]);
-    }
-
-    /// Forward over a window: keep the metrics before each step, and the state after the last.
-    template <int Code>
-    QUARZEL_LANES_FLATTEN void forward(const Window& window, std::size_t column, bool firstIteration) const {
-        const Recursion rule = Rules::recursion();
-        const std::size_t at = column * W;
-        State state = window.first ? load(loadMetrics<W>(itsGroup.alphaStart[Code] + at, itsRow))
-                                   : loadAlphaState(itsGroup.alphaState + at);
-        const auto step = [&](std::size_t t) {
-            const Word channel = channelValue<Code>(window.bottom + t, column, firstIteration);
-            channel.store(itsGroup.channelRows + t * W);
-            storeMetrics<W>(words(state), itsGroup.alphaRows + t * states * W, W);
-            state = alphaStep<Recursion>(
-                state, branchMetrics(channel, parity<Code>(window.bottom + t, column)), rule);
-        };
-        std::size_t t = 0;
-        while (t + normalisedRows <= window.length) {
-            for (std::size_t i = 0; i < normalisedRows; ++i) {
-                step(t++);
-            }
-            normalise(state);
-        }
-        while (t < window.length) {
-            step(t++);
-        }
-        normalise(state);
-        if (window.last) {
-            storeBoundary(state, itsGroup.alphaState + at);
-        } else {
-            storeAlphaState(state, itsGroup.alphaState + at);
-        }
-    }
-
-    /// Backward over a window, with the LLR and the extrinsic value of each step.
-    /// @return the state below its lowest step
-    template <int Code>
-    QUARZEL_LANES_FLATTEN State backward(const Window& window, std::size_t column, const std::int16_t* start,
-                                         bool lastPass) const {
-        const Recursion rule = Rules::recursion();
-        State state = load(loadMetrics<W>(start, itsRow));
-        const auto step = [&](std::size_t t, const auto& llrRule) {
-            if constexpr (plainMaximum<decltype(llrRule)>) {
-                assert(withinBounds<W>(words(state)));
-                assert(withinBounds<W>(loadMetrics<W>(itsGroup.alphaRows + t * states * W, W)));
-            }
-            const std::size_t row = window.bottom + t;
-            const Word channel = Word::load(itsGroup.channelRows + t * W);
-            const std::int16_t* alphaRow = itsGroup.alphaRows + t * states * W;
-            const auto alpha = [alphaRow](std::size_t i) { return Word::load(alphaRow + i * W); };
-            const auto result =
-                backwardStep(state, branchMetrics(channel, parity<Code>(row, column)), alpha, rule, llrRule);
-            state = result.beta;
-            output<Code>(row, column, result.llr, channel, lastPass);
-        };
-        const std::size_t floor = window.first ? unboundedRows : 0;
-        std::size_t t = window.length;
-        for (std::size_t i = 0; i < normalisedRows; ++i) {
-            --t;
-            if (i < unboundedRows) {
-                step(t, Rules::llrNearStart());
-            } else {
-                step(t, Rules::llr());
-            }
-        }
-        normalise(state);
-        while (t >= floor + normalisedRows) {
-            for (std::size_t i = 0; i < normalisedRows; ++i) {
-                step(--t, Rules::llr());
-            }
-            normalise(state);
-        }
-        while (t > floor) {
-            step(--t, Rules::llr());
-        }
-        while (t > 0) {
-            step(--t, Rules::llrNearStart());
-        }
-        return state;
     }
 
     template <int Code>
@@ -274,12 +297,14 @@ class GroupDecoder {
         }
     }
 
-    /// Branch metrics. Without a second parity only two are distinct.
+    /// The four branch metrics. Without a second parity only two are distinct.
+    static BranchMetrics<Word> symmetric(Word same, Word opposite) {
+        return {same, opposite, opposite, same};
+    }
+
     static BranchMetrics<Word> branchMetrics(Word channel, Word parity) {
         const auto clamp = [](Word sum) { return max(min(sum, Word::of(highest)), Word::of(lowest)); };
-        const Word same = clamp(add(channel, parity));
-        const Word opposite = clamp(sub(channel, parity));
-        return {same, opposite, opposite, same};
+        return symmetric(clamp(add(channel, parity)), clamp(sub(channel, parity)));
     }
 
     static void normalise(State& state) {

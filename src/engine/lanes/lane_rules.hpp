@@ -31,9 +31,7 @@ struct Staircase<Lanes<W>> {
 #if defined(QUARZEL_LANES_SHUFFLE)
         // Counted downward from the first step without a correction, so that the high byte of a word, which
         // is 0, looks up a 0 too.
-        const Lanes<W> limit = Lanes<W>::of(6 * 64 + 63);
-        const Lanes<W> step = sub(limit, min(magnitude, limit)) >> 6;
-        return shuffleOctets(table(), step);
+        return shuffleOctets(table(), lack(Lanes<W>::of(6 * 64 + 63), magnitude) >> 6);
     }
 
   private:

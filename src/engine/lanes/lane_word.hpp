@@ -77,6 +77,16 @@ inline Lanes<W> min(Lanes<W> x, Lanes<W> y) {
     return {x.v < y.v ? x.v : y.v};
 }
 
+/// What x lacks of a limit, 0 where it lacks nothing; neither is negative.
+template <std::size_t W>
+inline Lanes<W> lack(Lanes<W> limit, Lanes<W> x) {
+    using U = typename Lanes<W>::Unsigned;
+    // Unsigned, for there machines have it as one operation.
+    const auto l = (U)limit.v;
+    const auto u = (U)x.v;
+    return {(typename Lanes<W>::Signed)(l > u ? l - u : U{})};
+}
+
 template <std::size_t W>
 inline Lanes<W> operator&(Lanes<W> x, Lanes<W> y) {
     return {x.v & y.v};

@@ -1,0 +1,13 @@
+// SPDX-License-Identifier: MIT
+#pragma once
+
+#include <CLI/CLI.hpp>
+#include <ostream>
+
+namespace quarzel::tool {
+
+/// Add `quarzel merge`, which joins the parts of a sweep.
+/// @param results  where it writes what it tells; must outlive the parse
+void addMergeCommand(CLI::App& app, std::ostream& results);
+
+}  // namespace quarzel::tool

@@ -1,0 +1,38 @@
+// SPDX-License-Identifier: MIT
+#pragma once
+
+#include <CLI/CLI.hpp>
+#include <cstdint>
+#include <optional>
+#include <string>
+
+#include "sweep/configuration.hpp"
+
+namespace quarzel::tool {
+
+/// What the user of a sweep chooses, as text where it is a list.
+struct SweepOptions {
+    std::string blockSizes = "1024";
+    std::string units = "2";
+    std::string algorithms = "1";
+    std::string iterations = "6";
+    std::string ebN0;
+    std::optional<double> scale;
+    std::optional<double> llr;
+    std::uint64_t maxBlocks = 10000;
+    std::uint64_t maxBlockErrors = 100;
+    std::uint64_t maxSeconds = 0;
+    std::uint64_t seed = 1;
+    bool perIteration = false;
+    std::string shard = "1/1";
+};
+
+/// Add the options that decide a sweep's result, and --shard.
+/// @param options  holds the defaults and receives the choice; must outlive the parse
+void addSweepOptions(CLI::App& command, SweepOptions& options);
+
+/// @throws ToolError when what the user chose is not possible
+sweep::Configuration configurationOf(const SweepOptions& options);
+sweep::Shard shardOf(const SweepOptions& options);
+
+}  // namespace quarzel::tool

@@ -1,0 +1,19 @@
+// SPDX-License-Identifier: MIT
+#pragma once
+
+#include <CLI/CLI.hpp>
+#include <ostream>
+
+#include "sweep_command.hpp"
+#include "tool_error.hpp"
+
+namespace quarzel::tool {
+
+/// Add `quarzel verify-result`, which runs the sweep of a result file again.
+/// @param results   where it writes what it tells; must outlive the parse
+/// @param exitCode  receives ExitCode::resultsDiffer when the result comes out otherwise; must outlive the
+/// parse
+void addVerifyResultCommand(CLI::App& app, std::ostream& results, ExitCode& exitCode,
+                            MakeWorkers makeWorkers);
+
+}  // namespace quarzel::tool

@@ -1,0 +1,15 @@
+// SPDX-License-Identifier: MIT
+#pragma once
+
+#include <CLI/CLI.hpp>
+
+namespace quarzel::tool {
+
+/// As many threads as this machine runs at once.
+unsigned allCores();
+
+/// Add --threads to a command.
+/// @param threads  holds the default, allCores(), and receives the choice; must outlive the parse
+void addThreadsOption(CLI::App& command, unsigned& threads);
+
+}  // namespace quarzel::tool

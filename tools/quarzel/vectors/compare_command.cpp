@@ -1,0 +1,76 @@
+// SPDX-License-Identifier: MIT
+#include "compare_command.hpp"
+
+#include <memory>
+#include <string>
+
+#include "compare_report.hpp"
+#include "input_file.hpp"
+#include "npy_header.hpp"
+
+namespace quarzel::tool {
+
+namespace {
+
+struct CompareOptions {
+    std::string expected;
+    std::string actual;
+    bool json = false;
+};
+
+constexpr const char* description = "Check the decisions of a simulation";
+
+constexpr const char* footer = R"(EXPECTED is one of
+  the directory of a core in a set that 'quarzel vectors' made, or its dout.hex;
+  the directory of the set, where it has only one core; what the manifest says
+  of these files is checked
+  npy of uint8, shape (blocks, K/8): bits as 'quarzel decode -o' writes them
+
+ACTUAL is what the simulation gave for the same blocks in the same order:
+  text as $writememh makes it, a decision a word: hexadecimal words, x and z
+  digits, comments, addresses (@hex); a later word at an address counts
+  npy of truth values or integers, a decision an element, whatever its shape; or
+  of uint8, shape (blocks, K/8), 8 bits to a byte, the first bit highest
+
+Told are the first block and bit that differ (blocks count from 1, bits and
+addresses from 0), what is there instead, and how many blocks and bits differ:
+wrong, undefined (x), undriven (z) or missing. For a block of a vector set
+follows the command that prints the model's trace of it.
+
+Example:
+  quarzel compare vectors/u2_a1 simulated.hex
+)";
+
+MemoryImage readActual(const std::string& file, const ExpectedDecisions& expected) {
+    std::ifstream stream = openInput(file);
+    const bool isNpy =
+        file.ends_with(".npy") || stream.peek() == std::char_traits<char>::to_int_type(npyFirstByte);
+    return isNpy ? readMemoryNpy(stream, expected.bits.size(), expected.packedSize(), file)
+                 : readMemoryText(stream, expected.bits.size(), file);
+}
+
+ExitCode compare(const CompareOptions& options, std::ostream& results) {
+    const ExpectedDecisions expected = readExpected(options.expected);
+    const MemoryImage actual = readActual(options.actual, expected);
+    const CompareReport report{expected, options.actual, actual, compareDecisions(expected, actual)};
+    (options.json ? printJson : printText)(results, report);
+    return report.comparison.isEqual() ? ExitCode::done : ExitCode::decisionsDiffer;
+}
+
+}  // namespace
+
+void addCompareCommand(CLI::App& app, std::ostream& results, ExitCode& exitCode) {
+    auto options = std::make_shared<CompareOptions>();
+    CLI::App* command = app.add_subcommand("compare", description)->group("Commands");
+    command->footer(std::string(footer) + '\n' + exitCodesHelp);
+    command->add_option("EXPECTED", options->expected, "The decisions that are right")
+        ->required()
+        ->type_name("");
+    command->add_option("ACTUAL", options->actual, "The decisions of the simulation")
+        ->required()
+        ->type_name("");
+    command->add_flag("--json", options->json, "Print one JSON object instead of text");
+    command->callback([options, &results, &exitCode] { exitCode = compare(*options, results); });
+}
+
+}  // namespace quarzel::tool

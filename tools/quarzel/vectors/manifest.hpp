@@ -1,0 +1,56 @@
+// SPDX-License-Identifier: MIT
+#pragma once
+
+#include <cstddef>
+#include <cstdint>
+#include <nlohmann/json_fwd.hpp>
+#include <string>
+#include <vector>
+
+namespace quarzel::tool {
+
+/// The name of the manifest in the directory of a vector set.
+constexpr const char* manifestName = "manifest.json";
+
+/// A code block of a vector set.
+struct VectorBlock {
+    std::uint32_t blockSize;  ///< K
+    int iterations;
+    std::string stimulus;  ///< what its soft values are
+    std::string capture;   ///< the npy file, in the directory of the core, that holds them too
+    std::size_t row;       ///< and where in it, from 0
+};
+
+/// The blocks for one core, which lie in a directory of their own.
+struct VectorCore {
+    std::string directory;
+    int units;
+    int algorithm;
+    std::vector<VectorBlock> blocks;
+};
+
+/// A file of a vector set.
+struct VectorFile {
+    std::string name;  ///< from the directory of the set on
+    std::size_t bytes;
+    std::string sha256;
+};
+
+/// What there is in a vector set.
+struct VectorContent {
+    std::vector<VectorCore> cores;
+    std::vector<VectorFile> files;
+};
+
+/// The text of a manifest: JSON with a line for each core, block and file.
+/// @param configuration  what the set was made from
+/// @param coverage       what its blocks reach
+std::string manifestText(const nlohmann::ordered_json& configuration, const nlohmann::ordered_json& coverage,
+                         const VectorContent& content);
+
+/// Read the content that the manifest of a set tells.
+/// @param directory  of the set
+/// @throws ToolError when there is none, or it is of another version or not well-formed
+VectorContent readManifest(const std::string& directory);
+
+}  // namespace quarzel::tool

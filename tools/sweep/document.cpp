@@ -1,0 +1,107 @@
+// SPDX-License-Identifier: MIT
+#include "document.hpp"
+
+#include <cmath>
+
+#include "error.hpp"
+#include "quarzel/sha256.hpp"
+
+namespace quarzel::sweep {
+
+namespace {
+
+constexpr int version = 1;
+constexpr int checksumIndent = -1;
+
+Json ebN0Json(const std::vector<lte::Decibels>& list) {
+    Json json = Json::array();
+    for (const lte::Decibels& ebN0 : list) {
+        json.push_back(ebN0.value());
+    }
+    return json;
+}
+
+std::vector<lte::Decibels> ebN0From(const Json& json) {
+    std::vector<lte::Decibels> list;
+    for (const double value : json.get<std::vector<double>>()) {
+        list.push_back({static_cast<std::int32_t>(std::lround(value * 1e6))});
+    }
+    return list;
+}
+
+}  // namespace
+
+Json newDocument(std::string_view format) {
+    return {{"format", format}, {"version", version}, {"quarzel", QUARZEL_VERSION}};
+}
+
+std::string textOf(Json document, int indent) {
+    document["checksum"] = tool::sha256(document.dump(checksumIndent));
+    return document.dump(indent) + '\n';
+}
+
+Json readDocument(std::string_view text, std::string_view format) {
+    Json document = Json::parse(text, nullptr, false);
+    if (!document.is_object() || document.value("format", Json()) != format) {
+        const bool isTruncated = document.is_discarded() && text.find(format) != std::string_view::npos;
+        throw isTruncated
+            ? Error("is truncated or altered: it is no whole JSON object", "use another copy of it")
+            : Error("is no " + std::string(format), "give the name of one");
+    }
+    if (document.value("version", Json()) != version) {
+        throw Error("has version " + document.value("version", Json()).dump() + " of its format, not " +
+                        std::to_string(version),
+                    "use the quarzel that wrote it");
+    }
+    if (document.value("quarzel", Json()) != QUARZEL_VERSION) {
+        throw Error("was written by quarzel " + document.value("quarzel", Json()).dump() + ", and this is " +
+                        QUARZEL_VERSION,
+                    "use the quarzel that wrote it");
+    }
+    const Json checksum = document.value("checksum", Json());
+    document.erase("checksum");
+    if (checksum != tool::sha256(document.dump(checksumIndent))) {
+        throw Error("has been altered: its checksum does not fit", "use another copy of it");
+    }
+    return document;
+}
+
+Json toJson(const Configuration& configuration) {
+    return {
+        {"seed", configuration.seed},
+        {"max_blocks", configuration.maxBlocks},
+        {"max_block_errors", configuration.maxBlockErrors},
+        {"max_seconds", configuration.maxSeconds},
+        {"per_iteration", configuration.perIteration},
+        {"quantiser",
+         {{"kind", configuration.quantiser.kind == lte::Quantiser::Kind::llr ? "llr" : "scale"},
+          {"scale", configuration.quantiser.scale}}},
+        {"block_size", configuration.blockSizes},
+        {"units", configuration.units},
+        {"algorithm", configuration.algorithms},
+        {"iterations", configuration.iterations},
+        {"ebn0_db", ebN0Json(configuration.ebN0)},
+    };
+}
+
+Configuration configurationFrom(const Json& json) {
+    Configuration configuration;
+    json.at("seed").get_to(configuration.seed);
+    json.at("max_blocks").get_to(configuration.maxBlocks);
+    json.at("max_block_errors").get_to(configuration.maxBlockErrors);
+    json.at("max_seconds").get_to(configuration.maxSeconds);
+    json.at("per_iteration").get_to(configuration.perIteration);
+    const Json& quantiser = json.at("quantiser");
+    configuration.quantiser = {
+        quantiser.at("kind") == "llr" ? lte::Quantiser::Kind::llr : lte::Quantiser::Kind::amplitude,
+        quantiser.at("scale").get<double>()};
+    json.at("block_size").get_to(configuration.blockSizes);
+    json.at("units").get_to(configuration.units);
+    json.at("algorithm").get_to(configuration.algorithms);
+    json.at("iterations").get_to(configuration.iterations);
+    configuration.ebN0 = ebN0From(json.at("ebn0_db"));
+    configuration.check();
+    return configuration;
+}
+
+}  // namespace quarzel::sweep

@@ -1,0 +1,28 @@
+// SPDX-License-Identifier: MIT
+#pragma once
+
+#include <string>
+#include <string_view>
+#include <vector>
+
+#include "configuration.hpp"
+#include "point_state.hpp"
+
+namespace quarzel::sweep {
+
+/// What comes of a sweep. It depends on the configuration alone: not on threads, shards or interruptions.
+/// (With a time limit the clock decides how many blocks a point has.)
+struct Result {
+    Configuration configuration;
+    std::vector<PointState> points;  ///< every one has ended
+};
+
+/// The result file.
+std::string resultText(const Result& result);
+
+/// Read a result file.
+/// @return what the file tells; the squares of bit errors, which it does not, are 0
+/// @throws Error when it is not a whole, unaltered result of this version
+Result readResult(std::string_view text);
+
+}  // namespace quarzel::sweep
