@@ -34,9 +34,9 @@ std::vector<T> readList(const std::string& option, const std::string& text,
 std::vector<std::uint32_t> readBlockSizes(const std::string& text) {
     std::vector<std::uint32_t> sizes;
     for (const std::uint64_t K : readNumberList("--block-size", text)) {
-        if (findBlockSize(K) == nullptr) {
+        if (lte::findBlockSize(K) == nullptr) {
             throw ToolError(ExitCode::usage, "--block-size", fmt::format("{} is no block size of LTE", K),
-                            fmt::format("the nearest: {}", fmt::join(nearestBlockSizes(K), ", ")));
+                            "the nearest: " + lte::nearestBlockSizesText(K));
         }
         sizes.push_back(static_cast<std::uint32_t>(K));
     }
