@@ -1,12 +1,11 @@
 // SPDX-License-Identifier: MIT
 #include "encoder.hpp"
 
-#include <algorithm>
 #include <array>
 #include <stdexcept>
 #include <string>
 
-#include "interleaver/lte_params.hpp"
+#include "size_table.hpp"
 
 namespace quarzel::lte {
 
@@ -54,12 +53,11 @@ class ConstituentEncoders {
 };
 
 const LteParams& paramsOf(std::uint32_t blockSize) {
-    const auto found = std::find_if(lteParams.begin(), lteParams.end(),
-                                    [blockSize](const LteParams& row) { return row.K == blockSize; });
-    if (found == lteParams.end()) {
-        throw std::invalid_argument("LTE has no code block of " + std::to_string(blockSize) + " bits");
+    if (const LteParams* const row = findBlockSize(blockSize)) {
+        return *row;
     }
-    return *found;
+    throw std::invalid_argument("LTE has no code block of " + std::to_string(blockSize) +
+                                " bits; the nearest sizes: " + nearestBlockSizesText(blockSize));
 }
 
 }  // namespace

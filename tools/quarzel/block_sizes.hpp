@@ -5,16 +5,9 @@
 #include <string>
 #include <vector>
 
-#include "interleaver/lte_params.hpp"
+#include "lte/size_table.hpp"
 
 namespace quarzel::tool {
-
-/// The row of the parameter table for a block size, or null when LTE has no such size.
-const LteParams* findBlockSize(std::uint64_t K);
-
-/// The valid block sizes next to one that is not valid, in ascending order: one on each side, or only one
-/// when K lies outside the table.
-std::vector<std::uint32_t> nearestBlockSizes(std::uint64_t K);
 
 /// The row of a block size that the user gave.
 /// @param subject  the argument or option that he gave it with

@@ -1,0 +1,215 @@
+% SPDX-License-Identifier: MIT
+
+function [bits, details] = quarzel_decode (sys, par1, par2, iterations, options)
+  %QUARZEL_DECODE  Decode LTE code blocks as a hardware turbo decoder core does, to the bit.
+  %
+  %   bits = quarzel_decode (sys, par1, par2)
+  %   bits = quarzel_decode (sys, par1, par2, iterations)
+  %   bits = quarzel_decode (sys, par1, par2, iterations, options)
+  %   [bits, details] = quarzel_decode (...)
+  %
+  %   sys, par1 and par2 are the systematic values and the parities of the two constituent codes, in units of 1/8;
+  %   POSITIVE MEANS BIT 1. Each is
+  %
+  %     a vector of K + 4 values   one block; bits is a vector of K, lying as sys does
+  %     a matrix                   a block in each column; bits has K rows
+  %     a cell array of vectors    blocks of any sizes; bits is a cell array of the same size
+  %
+  %   of class int8, int16 or int32, or double when the values are whole. The last 4 positions hold the tail. K is
+  %   one of the 188 block sizes of LTE, 40 to 6144. What lies outside -128 to 127 is saturated, with a warning.
+  %   bits is uint8, of 0 and 1. Many blocks in one call are several times as fast as a call for each.
+  %
+  %   iterations, 1 to 15, are 6 when they are not given; every one of them runs.
+  %
+  %   options is a struct with any of these fields:
+  %
+  %     units       processing units of the core: 2 (default), 4 or 8
+  %     algorithm   'max-log', 'scaled-max-log' (default) or 'max-star', or their numbers 0, 1 and 2
+  %     tag_width   width of the block tag in bits, 0 to 32 (default 8)
+  %     tags        one tag a block
+  %     trace       passes to trace, two an iteration; for one block
+  %     trace_file  a file for the trace
+  %
+  %   details is a struct: tags, as they come back masked to tag_width, and trace, a text.
+  %
+  %   Errors have the identifiers quarzel:type, quarzel:value, quarzel:memory and quarzel:model; warnings of the
+  %   model have quarzel:warning.
+  %
+  %   Example
+  %
+  %     bits = rand (1024, 1) > 0.5;
+  %     [sys, par1, par2] = quarzel_encode (bits);
+  %     isequal (quarzel_decode (16 * sys - 8, 16 * par1 - 8, 16 * par2 - 8), bits)
+  %
+  %   See also quarzel_encode.
+
+  if (nargin < 3)
+    error ('quarzel:value', ['quarzel_decode: three streams are needed; ', ...
+           'call quarzel_decode (sys, par1, par2, iterations, options)']);
+  end
+  if (nargin < 4 || isempty (iterations))
+    iterations = 6;
+  end
+  if (nargin < 5)
+    options = struct ();
+  end
+  options = complete (options);
+  if (isempty (options.trace) && ~isempty (options.trace_file))
+    options.trace = 30;
+  end
+  answer = quarzel_mex ('decode', sys, par1, par2, whole (iterations, 'iterations'), ...
+                        whole (options.units, 'units'), algorithm (options.algorithm), ...
+                        whole (options.tag_width, 'tag_width'), tags (options.tags), passes (options.trace));
+  for i = 1:numel (answer.warnings)
+    warning ('quarzel:warning', '%s', answer.warnings{i});
+  end
+  if (~isempty (answer.fault))
+    error (['quarzel:', answer.fault], 'quarzel_decode: %s', answer.text);
+  end
+  if (~isempty (options.trace_file))
+    write_file (options.trace_file, answer.trace);
+  end
+  bits = answer.bits;
+  details = struct ('tags', answer.tags, 'trace', answer.trace);
+end
+
+% The options with defaults where they say nothing.
+function options = complete (given)
+  options = struct ('units', 2, 'algorithm', 'scaled-max-log', 'tag_width', 8, 'tags', [], ...
+                    'trace', [], 'trace_file', '');
+  names = fieldnames (options);
+  if (~isstruct (given) || numel (given) ~= 1)
+    error ('quarzel:type', 'quarzel_decode: options must be a struct; its fields may be %s', ...
+           strjoin (names', ', '));
+  end
+  fields = fieldnames (given);
+  for i = 1:numel (fields)
+    if (~any (strcmp (fields{i}, names)))
+      error ('quarzel:value', 'quarzel_decode: there is no option ''%s''; choose from %s', fields{i}, ...
+             strjoin (names', ', '));
+    end
+    options.(fields{i}) = given.(fields{i});
+  end
+end
+
+% A whole number that an int holds, as double.
+function value = whole (value, name)
+  if (~isnumeric (value) || ~isscalar (value) || ~isreal (value) || value ~= fix (value) ...
+      || abs (double (value)) > 2147483647)
+    error ('quarzel:value', 'quarzel_decode: %s must be a whole number', name);
+  end
+  value = double (value);
+end
+
+function value = algorithm (value)
+  if (~ischar (value))
+    value = whole (value, 'algorithm');
+  end
+end
+
+function value = tags (value)
+  if (~isnumeric (value) || any (value(:) < 0 | value(:) > 4294967295 | value(:) ~= fix (value(:))))
+    error ('quarzel:value', 'quarzel_decode: tags must be whole numbers from 0 to 4294967295');
+  end
+  value = uint32 (value);
+end
+
+function value = passes (value)
+  if (isempty (value))
+    value = 0;
+    return
+  end
+  value = whole (value, 'trace');
+  if (value < 1)
+    error ('quarzel:value', 'quarzel_decode: trace must be 1 pass or more; there are two an iteration');
+  end
+end
+
+function write_file (name, text)
+  [file, message] = fopen (name, 'w');
+  if (file < 0)
+    error ('quarzel:value', 'quarzel_decode: %s cannot be written: %s; choose another trace_file', name, message);
+  end
+  count = fwrite (file, text);
+  if (fclose (file) ~= 0 || count ~= numel (text))
+    error ('quarzel:value', 'quarzel_decode: %s cannot be written whole; free some space', name);
+  end
+end
+
+%!shared soft, code, bits
+%! bits = uint8 (rand (40, 7) > 0.5);
+%! [s, p, q] = quarzel_encode (bits);
+%! code = {s, p, q};
+%! soft = cellfun (@(x) 16 * x - 8, code, 'UniformOutput', false);
+
+%!test  % a batch in columns
+%! decoded = quarzel_decode (soft{:});
+%! assert (class (decoded), 'uint8');
+%! assert (decoded, bits);
+
+%!test  % one block, as a column and as a row
+%! assert (quarzel_decode (soft{1}(:,3), soft{2}(:,3), soft{3}(:,3)), bits(:,3));
+%! assert (quarzel_decode (soft{1}(:,3)', soft{2}(:,3)', soft{3}(:,3)'), bits(:,3)');
+
+%!test  % every class means the same, at full scale too
+%! noisy = cellfun (@(x) int8 (double (x) + 20 * randn (size (x))), soft, 'UniformOutput', false);
+%! expected = quarzel_decode (noisy{:}, 4);
+%! for convert = {@int16, @int32, @double}
+%!   other = cellfun (convert{1}, noisy, 'UniformOutput', false);
+%!   assert (quarzel_decode (other{:}, 4), expected);
+%! end
+
+%!test  % cells of several sizes
+%! long = uint8 (rand (1, 512) > 0.5);
+%! [s, p, q] = quarzel_encode ({bits(:,1), long});
+%! scale = @(cells) cellfun (@(x) 16 * x - 8, cells, 'UniformOutput', false);
+%! decoded = quarzel_decode (scale (s), scale (p), scale (q), 3, struct ('units', 8, 'algorithm', 'max-star'));
+%! assert (decoded, {bits(:,1), long});
+
+%!test  % tags come back masked
+%! warning ('off', 'quarzel:warning', 'local');
+%! [~, details] = quarzel_decode (soft{:}, 6, struct ('tag_width', 4, 'tags', 12:18));
+%! assert (details.tags, uint32 ([12 13 14 15 0 1 2]));
+
+%!warning <truncated to 4 bits> quarzel_decode (soft{:}, 6, struct ('tag_width', 4, 'tags', 12:18));
+%!warning id=quarzel:warning quarzel_decode (500 * ones (44, 1), zeros (44, 1), zeros (44, 1));
+%!warning <position 3 saturated negatively> quarzel_decode (int16 ([0 0 0 -200 zeros(1, 40)]), ...
+%!        zeros (1, 44, 'int16'), zeros (1, 44, 'int16'));
+
+%!test  % traces
+%! file = tempname ();
+%! [decoded, details] = quarzel_decode (soft{1}(:,1), soft{2}(:,1), soft{3}(:,1), 2, ...
+%!                                      struct ('trace', 3, 'trace_file', file));
+%! assert (decoded, bits(:,1));
+%! assert (numel (strfind (details.trace, 'siso=')), 3);
+%! assert (fileread (file), details.trace);
+%! delete (file);
+
+%!error <three streams are needed> quarzel_decode (1)
+%!error <streams of 45 soft values fit no block size; the nearest that do: 44 \(K = 40\), 52 \(K = 48\)> ...
+%! quarzel_decode (zeros (45, 1), zeros (45, 1), zeros (45, 1))
+%!error <nearest that do: 44> quarzel_decode ([], [], [])
+%!error id=quarzel:type quarzel_decode (single (soft{1}), soft{2}, soft{3})
+%!error <not single; for instance int8\(round\(8 \* llr\)\)> quarzel_decode (single (1), 1, 1)
+%!error <real and full> quarzel_decode (sparse (zeros (44, 1)), zeros (44, 1), zeros (44, 1))
+%!error <real and full> quarzel_decode (1i * ones (44, 1), zeros (44, 1), zeros (44, 1))
+%!error <no whole number> quarzel_decode (0.5 * ones (44, 1), zeros (44, 1), zeros (44, 1))
+%!error <no whole number> quarzel_decode (NaN (44, 1), zeros (44, 1), zeros (44, 1))
+%!error <one class and size> quarzel_decode (zeros (44, 1), zeros (1, 44), zeros (44, 1))
+%!error <one class and size> quarzel_decode (soft{1}, double (soft{2}), soft{3})
+%!error <one class and size> quarzel_decode (zeros (44, 2, 2), zeros (44, 2, 2), zeros (44, 2, 2))
+%!error <cell arrays of one size> quarzel_decode ({1}, 1, {1})
+%!error <cell 1 must hold one block> quarzel_decode ({soft{1}}, {soft{2}}, {soft{3}})
+%!error <cell 1 must hold one block> quarzel_decode (cell (1, 2), cell (1, 2), {1, 2})
+%!error <iterations must be a number from 1 to 15, not 16> quarzel_decode (soft{:}, 16)
+%!error <iterations must be a whole number> quarzel_decode (soft{:}, 1.5)
+%!error <iterations must be a whole number> quarzel_decode (soft{:}, 1e10)
+%!error <units must be 2, 4 or 8, not 3> quarzel_decode (soft{:}, 6, struct ('units', 3))
+%!error <no algorithm 'log-map'; choose max-log> quarzel_decode (soft{:}, 6, struct ('algorithm', 'log-map'))
+%!error <no option 'unit'; choose from units, algorithm> quarzel_decode (soft{:}, 6, struct ('unit', 2))
+%!error <options must be a struct> quarzel_decode (soft{:}, 6, 8)
+%!error <6 tags for 7 blocks|one tag a block> quarzel_decode (soft{:}, 6, struct ('tags', 1:6))
+%!error <tags must be whole numbers> quarzel_decode (soft{:}, 6, struct ('tags', -1))
+%!error <a trace shows one block> quarzel_decode (soft{:}, 6, struct ('trace', 1))
+%!error <1 pass or more> quarzel_decode (soft{:}, 6, struct ('trace', 0))
+%!error <not to be called directly> answer = quarzel_mex ('x'); error (answer.text);

@@ -1,0 +1,63 @@
+# SPDX-License-Identifier: MIT
+"""Soft values on their way to the extension: checked, never changed."""
+
+from __future__ import annotations
+
+import math
+from typing import Any, NamedTuple, Optional
+
+import numpy as np
+from numpy.typing import ArrayLike, NDArray
+
+
+class SoftBlocks(NamedTuple):
+    """Three streams of one type, and how the blocks lay before they became rows."""
+
+    streams: tuple[NDArray[Any], NDArray[Any], NDArray[Any]]
+    """each (blocks, K + 4)"""
+    shape: tuple[int, ...]
+    """of the blocks; () for a single one"""
+
+
+def soft_blocks(systematic: ArrayLike, parity1: Optional[ArrayLike], parity2: Optional[ArrayLike]) -> SoftBlocks:
+    """The blocks of three arrays (..., K + 4), or of one array (..., 3, K + 4)."""
+    first = _soft_array(systematic, "systematic")
+    if parity1 is None and parity2 is None:
+        if first.ndim < 2 or first.shape[-2] != 3:
+            raise ValueError(
+                f"one array of shape {first.shape} does not hold three streams; give systematic, parity1 and "
+                "parity2, or one array of shape (..., 3, K + 4)"
+            )
+        streams = (first[..., 0, :], first[..., 1, :], first[..., 2, :])
+    elif parity1 is None or parity2 is None:
+        raise ValueError("one parity is missing; give systematic, parity1 and parity2")
+    else:
+        streams = (first, _soft_array(parity1, "parity1"), _soft_array(parity2, "parity2"))
+    if not streams[0].shape == streams[1].shape == streams[2].shape:
+        shapes = ", ".join(str(stream.shape) for stream in streams)
+        raise ValueError(f"the three streams have the shapes {shapes}; they must have the same one")
+    if streams[0].ndim == 0:
+        raise ValueError("a stream must be an array of K + 4 soft values, or of blocks of them")
+    dtype = np.result_type(*streams)
+    rows = tuple(_rows(stream, dtype) for stream in streams)
+    return SoftBlocks(rows, streams[0].shape[:-1])
+
+
+def _soft_array(values: ArrayLike, name: str) -> NDArray[Any]:
+    array = np.asarray(values)
+    if array.dtype.kind != "i" or array.dtype.itemsize > 4:
+        remedy = (
+            "quantise first, for instance numpy.clip(numpy.rint(8 * llr), -128, 127).astype(numpy.int8)"
+            if array.dtype.kind == "f"
+            else f"use {name}.astype(numpy.int8), or int16 or int32 where the values need it"
+        )
+        raise TypeError(f"{name} must be int8, int16 or int32, not {array.dtype}; {remedy}")
+    return array
+
+
+def _rows(stream: NDArray[Any], dtype: np.dtype[Any]) -> NDArray[Any]:
+    """A stream as (blocks, K + 4), the values of a block after one another, copied only when they are not."""
+    rows = stream.reshape(math.prod(stream.shape[:-1]), stream.shape[-1])
+    rows = rows.astype(dtype.newbyteorder("="), copy=False)
+    contiguous = rows.strides[1] == rows.itemsize and rows.flags.aligned
+    return rows if contiguous else np.ascontiguousarray(rows)

@@ -1,0 +1,177 @@
+# SPDX-License-Identifier: MIT
+"""The decoder core."""
+
+from __future__ import annotations
+
+import operator
+from types import TracebackType
+from typing import Any, Literal, Optional, Union, overload
+
+import numpy as np
+from numpy.typing import ArrayLike, NDArray
+
+from . import _core
+from ._soft import soft_blocks
+from .trace import BlockTrace, parse_trace
+
+algorithms: tuple[str, ...] = _core.algorithms
+"""The arithmetics of the core, in the order of their numbers 0, 1 and 2."""
+
+
+class Decoder:
+    """A model of one configured core.
+
+    :param units: processing units: 2, 4 or 8
+    :param algorithm: ``"max-log"``, ``"scaled-max-log"`` (extrinsic values scaled by 0.75) or ``"max-star"``;
+        their numbers 0, 1 and 2 are good, too
+    :param tag_width: width of the block tag in bits, 0 to 32; at 0 and at 32 every tag comes back as 0, as it
+        does from the core
+
+    Use it in a ``with`` statement, or call :meth:`close`; or leave it to the garbage collector. One thread at
+    a time may use a decoder, a second one gets a RuntimeError; threads with a decoder each run side by side,
+    since the GIL is released while blocks are decoded. The model warns of the first soft value that it
+    saturates and of the first tag that it truncates: see :class:`ModelWarning`.
+    """
+
+    def __init__(
+        self, units: int = 2, algorithm: Union[str, int] = "scaled-max-log", tag_width: int = 8
+    ) -> None:
+        self._units = operator.index(units)
+        self._algorithm = _algorithm_number(algorithm)
+        self._tag_width = operator.index(tag_width)
+        self._core = _core.Core(self._units, self._algorithm, self._tag_width)
+
+    @property
+    def units(self) -> int:
+        """Processing units."""
+        return self._units
+
+    @property
+    def algorithm(self) -> str:
+        """The name of the arithmetic."""
+        return algorithms[self._algorithm]
+
+    @property
+    def tag_width(self) -> int:
+        """Width of the block tag in bits."""
+        return self._tag_width
+
+    @overload
+    def decode(
+        self,
+        systematic: ArrayLike,
+        parity1: Optional[ArrayLike] = None,
+        parity2: Optional[ArrayLike] = None,
+        iterations: int = 6,
+        *,
+        tags: None = None,
+        packed: bool = False,
+    ) -> NDArray[np.uint8]: ...
+
+    @overload
+    def decode(
+        self,
+        systematic: ArrayLike,
+        parity1: Optional[ArrayLike] = None,
+        parity2: Optional[ArrayLike] = None,
+        iterations: int = 6,
+        *,
+        tags: ArrayLike,
+        packed: bool = False,
+    ) -> tuple[NDArray[np.uint8], NDArray[np.uint32]]: ...
+
+    def decode(
+        self,
+        systematic: ArrayLike,
+        parity1: Optional[ArrayLike] = None,
+        parity2: Optional[ArrayLike] = None,
+        iterations: int = 6,
+        *,
+        tags: Optional[ArrayLike] = None,
+        packed: bool = False,
+    ) -> Any:
+        """Decode one block, or many of one size, which is faster than a call for each.
+
+        :param systematic: (..., K + 4) soft values of int8, int16 or int32 in units of 1/8, positive for bit
+            1; or all three streams in one array (..., 3, K + 4), without parities
+        :param parity1: (..., K + 4), parity of the first constituent code
+        :param parity2: (..., K + 4), parity of the second constituent code
+        :param iterations: 1 to 15; every one of them runs
+        :param tags: one tag a block, in the shape of the blocks
+        :param packed: pack 8 bits to a byte, first bit highest, as numpy.packbits does
+        :returns: (..., K) uint8 of 0 and 1, or (..., K / 8) when packed; with tags a tuple of them and the
+            tags that come back, masked to the tag width
+        :raises TypeError: a stream is not int8, int16 or int32
+        :raises ValueError: shapes differ, K + 4 fits no block size, or the decoder is closed
+        :raises RuntimeError: another thread is using the decoder
+        """
+        blocks = soft_blocks(systematic, parity1, parity2)
+        tag_array = None if tags is None else _tag_array(tags, blocks.shape)
+        bits, tags_back = self._core.decode(*blocks.streams, operator.index(iterations), tag_array)
+        if packed:
+            bits = np.packbits(bits, axis=-1)
+        bits = bits.reshape(*blocks.shape, bits.shape[-1])
+        return bits if tags is None else (bits, tags_back.reshape(blocks.shape))
+
+    def trace(
+        self,
+        systematic: ArrayLike,
+        parity1: Optional[ArrayLike] = None,
+        parity2: Optional[ArrayLike] = None,
+        iterations: int = 6,
+        *,
+        passes: Optional[int] = None,
+    ) -> BlockTrace:
+        """Decode one block and keep every value of its first passes. Much slower than :meth:`decode`.
+
+        :param passes: how many, two an iteration; all of them when it is not given
+        :returns: the trace, with the bits
+        """
+        blocks = soft_blocks(systematic, parity1, parity2)
+        if blocks.shape != ():
+            raise ValueError(f"a trace shows one block, not blocks of shape {blocks.shape}; pick one of them")
+        count = 2 * operator.index(iterations) if passes is None else operator.index(passes)
+        if count < 1 and passes is not None:
+            raise ValueError(f"passes must be 1 or more, not {count}; there are two an iteration")
+        bits, text = self._core.trace(*blocks.streams, operator.index(iterations), max(count, 0))
+        trace = parse_trace(text)[0]
+        trace.bits = bits[0]
+        return trace
+
+    def close(self) -> None:
+        """Free the model. Good to call again."""
+        self._core.close()
+
+    def __enter__(self) -> Decoder:
+        return self
+
+    def __exit__(
+        self,
+        kind: Optional[type[BaseException]],
+        error: Optional[BaseException],
+        traceback: Optional[TracebackType],
+    ) -> Literal[False]:
+        self.close()
+        return False
+
+    def __repr__(self) -> str:
+        return f"Decoder(units={self.units}, algorithm={self.algorithm!r}, tag_width={self.tag_width})"
+
+
+def _algorithm_number(algorithm: Union[str, int]) -> int:
+    if not isinstance(algorithm, str):
+        return operator.index(algorithm)
+    if algorithm not in algorithms:
+        raise ValueError(f"there is no algorithm {algorithm!r}; choose {', '.join(algorithms)}")
+    return algorithms.index(algorithm)
+
+
+def _tag_array(tags: ArrayLike, shape: tuple[int, ...]) -> NDArray[np.uint32]:
+    array = np.asarray(tags)
+    if array.dtype.kind not in "iu":
+        raise TypeError(f"tags must be whole numbers, not {array.dtype}")
+    if array.shape != shape:
+        raise ValueError(f"tags have the shape {array.shape}, the blocks {shape}; give one tag a block")
+    if array.size and (array.min() < 0 or array.max() > 0xFFFFFFFF):
+        raise ValueError("tags must be from 0 to 4294967295")
+    return np.ascontiguousarray(array.reshape(-1), dtype=np.uint32)

@@ -1,0 +1,44 @@
+// SPDX-License-Identifier: MIT
+#pragma once
+
+#include <cstdint>
+#include <deque>
+#include <memory>
+#include <string>
+#include <vector>
+
+#include "common/core.hpp"
+
+namespace quarzel::dpi {
+
+/// A model as a simulation uses it, with what the simulation pushes into it and has not popped yet.
+struct DpiCore {
+    bindings::Core core;
+    std::vector<std::int32_t> soft[3];      ///< pushed values of the next block
+    std::vector<std::uint8_t> bits;         ///< decisions of the last block
+    std::size_t popped = 0;                 ///< how many of them have been popped
+    std::vector<std::uint8_t> information;  ///< pushed bits of the next block to encode
+    std::vector<std::uint8_t> code;         ///< code bits of the last encoded block, stream by stream
+    std::uint32_t tag = 0;                  ///< of the last decoded block
+    std::uint32_t tracePasses = 0;          ///< to trace of the next block
+    std::string traceFile;
+    std::deque<std::string> warnings;  ///< not handed over yet
+    std::string warning;               ///< handed over last
+    std::string error;                 ///< of the last call; empty when it was good
+
+    /// Keep what a call says.
+    /// @return whether it was good
+    bool take(bindings::Outcome&& outcome);
+};
+
+/// The handle of a new core; never null. Handles are numbers that are used once, so that one that was closed
+/// is known as such for ever.
+void* addCore();
+
+/// The core of a handle, or null when there is none.
+std::shared_ptr<DpiCore> findCore(void* handle);
+
+/// Forget a handle.
+void removeCore(void* handle);
+
+}  // namespace quarzel::dpi

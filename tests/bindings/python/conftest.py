@@ -1,0 +1,31 @@
+# SPDX-License-Identifier: MIT
+"""What the tests of the Python package share."""
+
+import os
+import random
+from pathlib import Path
+
+import hypothesis
+import numpy as np
+import pytest
+
+hypothesis.settings.register_profile("quick", max_examples=40, deadline=None, database=None, print_blob=True)
+hypothesis.settings.load_profile("quick")
+
+
+@pytest.fixture
+def rng():
+    """A random source; its seed is shown when a test fails, and QUARZEL_TEST_SEED sets it."""
+    seed = int(os.environ.get("QUARZEL_TEST_SEED", random.randrange(2**32)))
+    print(f"QUARZEL_TEST_SEED={seed}")
+    return np.random.default_rng(seed)
+
+
+@pytest.fixture
+def captures():
+    return Path(os.environ["QUARZEL_CAPTURES"])
+
+
+def soft_of(code, amplitude=8):
+    """Noiseless soft values of code bits."""
+    return np.where(code, amplitude, -amplitude).astype(np.int8)

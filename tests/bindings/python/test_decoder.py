@@ -1,0 +1,195 @@
+# SPDX-License-Identifier: MIT
+"""Decoding: bits, shapes, types, and what is refused."""
+
+import gc
+import threading
+import warnings
+
+import numpy as np
+import pytest
+from conftest import soft_of
+from hypothesis import given
+from hypothesis import strategies as st
+
+import quarzel
+
+
+def noisy(rng, blocks, K):
+    return rng.integers(-40, 41, (*blocks, 3, K + 4), dtype=np.int8)
+
+
+@pytest.mark.parametrize("name", ["k40", "k6144"])
+def test_decides_as_the_core_did(captures, name):
+    soft = np.load(captures / f"{name}.soft.npy")
+    decided = np.load(captures / f"{name}.decided.npy")
+    with quarzel.Decoder(units=8) as decoder:
+        assert np.array_equal(decoder.decode(soft, packed=True), decided)
+        assert np.array_equal(decoder.decode(soft[0]), np.unpackbits(decided[0]))
+
+
+@given(
+    K=st.sampled_from(quarzel.block_sizes[:60]),
+    units=st.sampled_from([2, 4, 8]),
+    algorithm=st.sampled_from(quarzel.algorithms),
+    seed=st.integers(0, 2**32 - 1),
+)
+def test_a_round_trip_gives_the_bits_back(K, units, algorithm, seed):
+    bits = np.random.default_rng(seed).integers(0, 2, (2, K), dtype=np.uint8)
+    decoded = quarzel.Decoder(units, algorithm).decode(soft_of(quarzel.encode(bits)), iterations=2)
+    assert decoded.dtype == np.uint8
+    assert np.array_equal(decoded, bits)
+
+
+@pytest.mark.parametrize("dtype", [np.int8, np.int16, np.int32, ">i2"])
+@pytest.mark.parametrize("shape", [(), (5,), (2, 3), (0,)])
+def test_every_type_and_layout_means_the_same(rng, dtype, shape):
+    K = 64
+    soft = noisy(rng, shape, K)
+    decoder = quarzel.Decoder()
+    expected = decoder.decode(soft)
+    assert expected.shape == (*shape, K)
+    typed = soft.astype(dtype)
+    streams = [typed[..., stream, :] for stream in range(3)]
+    assert np.array_equal(decoder.decode(typed), expected)
+    assert np.array_equal(decoder.decode(*streams), expected)
+    assert np.array_equal(decoder.decode(np.asfortranarray(typed)), expected)
+    backwards = [stream[..., ::-1].copy()[..., ::-1] for stream in streams]
+    assert np.array_equal(decoder.decode(*backwards), expected)
+
+
+def test_streams_of_several_types_are_taken_as_they_are(rng):
+    soft = noisy(rng, (3,), 40)
+    streams = soft[:, 0], soft[:, 1].astype(np.int32), soft[:, 2].astype(np.int16)
+    assert np.array_equal(quarzel.Decoder().decode(*streams), quarzel.Decoder().decode(soft))
+
+
+def test_a_batch_is_its_blocks(rng):
+    soft = noisy(rng, (70,), 512)
+    batch = quarzel.Decoder(8, "max-star").decode(soft, iterations=3)
+    single = [quarzel.Decoder(8, 2).decode(block, iterations=3) for block in soft]
+    assert np.array_equal(batch, single)
+
+
+def test_packed_bits_are_those_of_packbits(rng):
+    soft = noisy(rng, (4,), 48)
+    decoder = quarzel.Decoder()
+    assert np.array_equal(decoder.decode(soft, packed=True), np.packbits(decoder.decode(soft), axis=-1))
+
+
+def test_tags_come_back_masked(rng):
+    decoder = quarzel.Decoder(tag_width=4)
+    soft = noisy(rng, (2, 2), 40)
+    with pytest.warns(quarzel.ModelWarning, match="tag has been truncated to 4 bits"):
+        bits, tags = decoder.decode(soft, tags=[[1, 15], [16, 18]])
+    assert bits.shape == (2, 2, 40)
+    assert np.array_equal(tags, [[1, 15], [0, 2]])
+
+
+def test_the_first_saturation_is_a_warning_that_names_the_line_of_the_user(capfd):
+    soft = np.full((3, 44), 200, dtype=np.int16)
+    decoder = quarzel.Decoder()
+    with pytest.warns(quarzel.ModelWarning, match="position 0 saturated positively") as caught:
+        decoder.decode(soft)
+    assert caught[0].filename == __file__
+    with warnings.catch_warnings():
+        warnings.simplefilter("error")
+        decoder.decode(soft)
+        with pytest.raises(quarzel.ModelWarning):
+            quarzel.Decoder().decode(soft)
+    assert capfd.readouterr() == ("", "")
+
+
+@pytest.mark.parametrize(
+    "soft, error, text",
+    [
+        (np.zeros((3, 44)), TypeError, r"must be int8, int16 or int32, not float64; .*numpy\.rint\(8 \* llr\)"),
+        (np.zeros((3, 44), np.int64), TypeError, r"not int64; use systematic\.astype\(numpy\.int8\)"),
+        (np.zeros((3, 44), np.uint8), TypeError, "not uint8"),
+        (np.zeros((3, 45), np.int8), ValueError, r"45 soft values .* 44 \(K = 40\), 52 \(K = 48\)"),
+        (np.zeros((3, 7000), np.int8), ValueError, r"nearest that do: 6148 \(K = 6144\)"),
+        (np.zeros((3, 0), np.int8), ValueError, r"nearest that do: 44 \(K = 40\)"),
+        (np.zeros((2, 44), np.int8), ValueError, r"shape \(2, 44\) does not hold three streams"),
+        (np.int8(1), ValueError, "does not hold three streams"),
+    ],
+)
+def test_refuses_soft_values_with_a_remedy(soft, error, text):
+    with pytest.raises(error, match=text):
+        quarzel.Decoder().decode(soft)
+
+
+def test_refuses_streams_that_do_not_fit_together():
+    stream = np.zeros(44, np.int8)
+    with pytest.raises(ValueError, match=r"shapes \(44,\), \(44,\), \(52,\)"):
+        quarzel.Decoder().decode(stream, stream, np.zeros(52, np.int8))
+    with pytest.raises(ValueError, match="one parity is missing"):
+        quarzel.Decoder().decode(stream, stream)
+    with pytest.raises(ValueError, match="tags have the shape"):
+        quarzel.Decoder().decode(stream, stream, stream, tags=[1])
+
+
+@pytest.mark.parametrize(
+    "arguments, error, text",
+    [
+        ({"units": 3}, ValueError, "units must be 2, 4 or 8, not 3"),
+        ({"units": 2.0}, TypeError, "float"),
+        ({"algorithm": "log-map"}, ValueError, "choose max-log, scaled-max-log, max-star"),
+        ({"algorithm": 3}, ValueError, "algorithm must be 0, 1 or 2"),
+        ({"tag_width": 33}, ValueError, "tag width must be a number from 0 to 32"),
+    ],
+)
+def test_refuses_cores_that_there_are_not(arguments, error, text):
+    with pytest.raises(error, match=text):
+        quarzel.Decoder(**arguments)
+
+
+@pytest.mark.parametrize("iterations, error", [(0, ValueError), (16, ValueError), (6.0, TypeError)])
+def test_refuses_iterations_that_the_core_does_not_have(iterations, error):
+    stream = np.zeros(44, np.int8)
+    with pytest.raises(error):
+        quarzel.Decoder().decode(stream, stream, stream, iterations)
+
+
+def test_a_closed_decoder_says_so():
+    with quarzel.Decoder() as decoder:
+        pass
+    decoder.close()
+    with pytest.raises(ValueError, match="closed; make a new one"):
+        decoder.decode(np.zeros((3, 44), np.int8))
+    with pytest.raises(ValueError, match="closed"):
+        decoder.trace(np.zeros((3, 44), np.int8))
+
+
+def test_threads_with_a_decoder_each_run_side_by_side_and_one_decoder_takes_one_thread(rng):
+    soft = noisy(rng, (400,), 1024)
+    decoder = quarzel.Decoder()
+    started = threading.Event()
+    refused = []
+
+    def disturb():
+        started.wait()
+        while thread.is_alive():
+            try:
+                decoder.decode(soft[0])
+            except RuntimeError as error:
+                refused.append(str(error))
+                return
+
+    def decode():
+        started.set()
+        for _ in range(50):
+            try:
+                decoder.decode(soft)
+            except RuntimeError:
+                continue
+            if refused:
+                return
+
+    thread = threading.Thread(target=decode)
+    disturber = threading.Thread(target=disturb)
+    thread.start()
+    disturber.start()
+    # This thread gets on meanwhile: the GIL is free.
+    while thread.is_alive():
+        gc.collect(0)
+    disturber.join()
+    assert refused == ["the decoder is in use by another thread; give each thread a decoder of its own"]
