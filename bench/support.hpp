@@ -1,6 +1,8 @@
 // SPDX-License-Identifier: MIT
 #pragma once
 
+#include <malloc.h>
+
 #include <cstddef>
 #include <memory>
 #include <random>
@@ -11,6 +13,12 @@
 namespace quarzel::bench {
 
 constexpr int iterations = 6;
+
+/// Bytes that the program holds on the heap.
+inline std::size_t heapBytes() {
+    const struct mallinfo2 info = mallinfo2();
+    return info.uordblks + info.hblkhd;
+}
 
 struct DestroyState {
     void operator()(vardel_ip_quarzel_state* state) const { vardel_ip_quarzel_destroy_state(state); }

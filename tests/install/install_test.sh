@@ -29,6 +29,13 @@ diff <(awk '/^```c$/ { code = 1; next } /^```$/ { code = 0 } code' "$source/READ
     "$source/examples/decode_block.c"
 echo "ok: the README shows the example"
 
+# The tool is there with its manual page and its completion scripts, which it has written itself.
+"$prefix/bin/quarzel" manual | cmp - "$prefix/share/man/man1/quarzel.1"
+"$prefix/bin/quarzel" completion bash | cmp - "$prefix/share/bash-completion/completions/quarzel"
+"$prefix/bin/quarzel" completion zsh | cmp - "$prefix/share/zsh/site-functions/_quarzel"
+"$prefix/bin/quarzel" completion fish | cmp - "$prefix/share/fish/vendor_completions.d/quarzel.fish"
+echo "ok: manual page and completion"
+
 cmake -S "$source/tests/install/consumer" -B "$work/cmake" -DCMAKE_PREFIX_PATH="$prefix" >>"$work/log"
 cmake --build "$work/cmake" >>"$work/log"
 expect "CMake, shared library" "$work/cmake/decode_block"

@@ -37,7 +37,7 @@ void forEachProbe(Check check) {
         {"avx2", avx2Probe},
         {"sse4.1", sse41Probe},
 #endif
-        {"baseline", baselineProbe},
+        {lanes::candidates().end()[-1].name, baselineProbe},
     };
     for (const lanes::Candidate& candidate : supportedCandidates()) {
         const auto* found = std::find_if(std::begin(probes), std::end(probes), [&](const auto& known) {

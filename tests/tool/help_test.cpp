@@ -1,30 +1,21 @@
 // SPDX-License-Identifier: MIT
 #include <gtest/gtest.h>
 
-#include <cstdlib>
-#include <fstream>
 #include <sstream>
 
+#include "golden.hpp"
 #include "run_tool.hpp"
-#include "temporary_directory.hpp"
 
 namespace quarzel::test {
 
 namespace {
 
-/// Compare a help with the one in golden/. With QUARZEL_RENEW_GOLDEN=1 in the environment the stored one is
-/// renewed instead.
+/// Compare a help with the one in golden/.
 void expectHelp(const std::vector<std::string>& arguments, const std::string& name) {
     const ToolRun run = runTool(arguments);
     EXPECT_EQ(run.err, "");
     EXPECT_EQ(run.exitCode, 0);
-    const std::string file = std::string(QUARZEL_GOLDEN) + '/' + name;
-    const char* const renew = std::getenv("QUARZEL_RENEW_GOLDEN");
-    if (renew != nullptr && std::string(renew) == "1") {
-        ASSERT_TRUE(std::ofstream(file, std::ios::binary) << run.out << std::flush) << file;
-        return;
-    }
-    EXPECT_EQ(run.out, readFile(file));
+    expectGolden(run.out, name);
     std::istringstream lines(run.out);
     for (std::string line; std::getline(lines, line);) {
         EXPECT_LE(line.size(), 80U) << "too wide for a terminal: " << line;
@@ -47,6 +38,18 @@ TEST(Help, TeachesTraceDiff) {
 }
 TEST(Help, TeachesCompare) {
     expectHelp({"compare", "--help"}, "compare_help.txt");
+}
+TEST(Help, TeachesVectors) {
+    expectHelp({"vectors", "--help"}, "vectors_help.txt");
+}
+TEST(Help, TeachesPlot) {
+    expectHelp({"plot", "--help"}, "plot_help.txt");
+}
+TEST(Help, TeachesManual) {
+    expectHelp({"manual", "--help"}, "manual_help.txt");
+}
+TEST(Help, TeachesCompletion) {
+    expectHelp({"completion", "--help"}, "completion_help.txt");
 }
 
 TEST(Help, HasAShortOption) {

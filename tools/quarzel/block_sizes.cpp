@@ -7,6 +7,14 @@
 
 namespace quarzel::tool {
 
+const LteParams& blockSizeRow(std::uint64_t K, const std::string& subject) {
+    if (const LteParams* row = lte::findBlockSize(K)) {
+        return *row;
+    }
+    throw ToolError(ExitCode::usage, subject, fmt::format("{} is no block size of LTE", K),
+                    "the nearest: " + lte::nearestBlockSizesText(K));
+}
+
 std::uint32_t blockSizeOf(std::uint64_t positions, const std::string& where) {
     if (const LteParams* row = lte::findPositions(positions)) {
         return row->K;

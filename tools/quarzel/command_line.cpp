@@ -12,11 +12,14 @@
 #include "decode_command.hpp"
 #include "info_command.hpp"
 #include "nearest_name.hpp"
+#include "plot/plot_command.hpp"
+#include "shell/shell_commands.hpp"
 #include "sweeps/merge_command.hpp"
 #include "sweeps/verify_result_command.hpp"
 #include "tool_error.hpp"
 #include "trace_diff_command.hpp"
 #include "vectors/compare_command.hpp"
+#include "vectors/vectors_command.hpp"
 
 namespace quarzel::tool {
 
@@ -33,8 +36,10 @@ Examples:
   quarzel decode capture.npy --units 8 --reference sent.npy
   quarzel decode capture.npy --trace 12 --trace-file model.txt
   quarzel trace-diff model.txt simulation.txt --ignore-termination
+  quarzel vectors vectors --block-size 40,6144 --ebn0 0.8
   quarzel compare vectors/u2_a1 simulated.hex
   quarzel sweep --ebn0 0:0.2:1 --iterations 8 -o result.json
+  quarzel plot result.json -o curves.svg
 )";
 
 class HelpFormatter : public CLI::Formatter {
@@ -117,10 +122,13 @@ ExitCode runCommandLine(int argc, const char* const* argv, std::ostream& results
     addInfoCommand(app, results);
     ExitCode exitCode = ExitCode::done;
     addTraceDiffCommand(app, results, exitCode);
+    addVectorsCommand(app, results);
     addCompareCommand(app, results, exitCode);
     addSweepCommand(app, results, makeWorkers);
     addMergeCommand(app, results);
     addVerifyResultCommand(app, results, exitCode, makeWorkers);
+    addPlotCommand(app);
+    addShellCommands(app, results);
     try {
         app.parse(argc, argv);
     } catch (const CLI::CallForHelp&) {

@@ -10,10 +10,10 @@ namespace quarzel::tool {
 
 /// Do what the command line asks for.
 /// @param results  receives what the user asked for, help included, and nothing else
-/// @param makeWorkers  who do the work of sweeps
+/// @param makeWorkers  makes who do the work of sweeps
 /// @return        how the tool is to end
 /// @throws ToolError when the command line is wrong or its command fails
 ExitCode runCommandLine(int argc, const char* const* argv, std::ostream& results,
-                        const MakeWorkers& makeWorkers = makeThreadWorkers);
+                        const MakeWorkers& makeWorkers);
 
 }  // namespace quarzel::tool

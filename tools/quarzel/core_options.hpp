@@ -12,6 +12,11 @@ struct CoreOptions {
     int iterations = 6;
 };
 
+/// The checks of these options, for commands that take lists of them.
+CLI::Validator unitsCheck();
+CLI::Validator algorithmCheck();
+CLI::Validator iterationsCheck();
+
 /// Add --units, --algorithm and --iterations to a command.
 /// @param options  holds the defaults and receives the choice; must outlive the parse
 void addCoreOptions(CLI::App& command, CoreOptions& options);

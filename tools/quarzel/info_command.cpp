@@ -95,14 +95,6 @@ void printSizeJson(std::ostream& stream, const LteParams& row) {
     stream << object.dump() << '\n';
 }
 
-const LteParams& rowOf(std::uint64_t K) {
-    if (const LteParams* row = lte::findBlockSize(K)) {
-        return *row;
-    }
-    throw ToolError(ExitCode::usage, "K", fmt::format("{} is no block size of LTE", K),
-                    "the nearest: " + lte::nearestBlockSizesText(K));
-}
-
 }  // namespace
 
 void addInfoCommand(CLI::App& app, std::ostream& results) {
@@ -119,7 +111,7 @@ void addInfoCommand(CLI::App& app, std::ostream& results) {
     command->add_flag("--json", options->json, "Print one JSON object instead of text");
     command->callback([options, &results] {
         if (options->K) {
-            (options->json ? printSizeJson : printSize)(results, rowOf(*options->K));
+            (options->json ? printSizeJson : printSize)(results, blockSizeRow(*options->K, "K"));
         } else {
             (options->json ? printSizesJson : printSizes)(results);
         }

@@ -9,7 +9,8 @@ namespace quarzel::tool {
 unsigned allCores();
 
 /// Add --threads to a command.
-/// @param threads  holds the default, allCores(), and receives the choice; must outlive the parse
+/// @param threads  holds the default, which is to mean all cores, and receives the choice; must outlive the
+/// parse
 void addThreadsOption(CLI::App& command, unsigned& threads);
 
 }  // namespace quarzel::tool

@@ -9,8 +9,8 @@ namespace quarzel::tool {
 
 const char* const exitCodesHelp = R"(Exit codes:
   0  done
-  1  decoding failed; for trace-diff, compare and verify-result: there is a
-     difference
+  1  decoding or plotting failed; for trace-diff, compare and verify-result:
+     there is a difference
   2  the command line is wrong
   3  a file cannot be read, understood or written
   4  interrupted by a signal)";

@@ -11,6 +11,7 @@ namespace quarzel::tool {
 enum class ExitCode {
     done = 0,
     decodingFailed = 1,
+    plottingFailed = 1,
     tracesDiffer = 1,
     decisionsDiffer = 1,
     resultsDiffer = 1,

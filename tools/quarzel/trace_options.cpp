@@ -3,6 +3,7 @@
 
 #include <limits>
 
+#include "choices.hpp"
 #include "whole_number.hpp"
 
 namespace quarzel::tool {
@@ -30,7 +31,7 @@ void addTraceOptions(CLI::App& command, TraceOptions& options) {
         ->needs(trace);
     command.add_option("--trace-format", options.form, "text, csv or json (default text)")
         ->type_name("FORM")
-        ->check(CLI::IsMember({"text", "csv", "json"}).description(""))
+        ->check(withChoices(CLI::IsMember({"text", "csv", "json"}).description(""), {"text", "csv", "json"}))
         ->needs(trace);
 }
 

@@ -4,7 +4,7 @@
 #include <algorithm>
 #include <utility>
 
-#include "error.hpp"
+#include "part.hpp"
 
 namespace quarzel::sweep {
 
@@ -30,15 +30,13 @@ std::vector<std::uint64_t> groupNumbers(const Task& task, const Shard& shard) {
 }
 
 Dispatcher::Dispatcher(Plan plan) : itsPlan(std::move(plan)), itsCurves(checked(configuration()).curves()) {
-    const std::size_t points = configuration().points();
-    itsPoints.reserve(points);
-    for (std::size_t p = 0; p < points; ++p) {
+    const std::vector<PointState> start =
+        itsPlan.start.empty() ? freshPart(configuration(), shard()).points : itsPlan.start;
+    itsPoints.reserve(start.size());
+    for (std::size_t p = 0; p < start.size(); ++p) {
         const std::uint64_t end = itsPlan.timedOut.empty() ? 0 : itsPlan.timedOut[p];
-        PointProgress progress(
-            configuration(), shard(), end != 0 ? end : configuration().maxBlocks,
-            itsPlan.start.empty()
-                ? PointState(configuration().countsOf(itsCurves[p / configuration().ebN0.size()]))
-                : itsPlan.start[p]);
+        PointProgress progress(configuration(), shard(), end != 0 ? end : configuration().maxBlocks,
+                               start[p]);
         const std::uint64_t nextGroup = progress.groupsDone();
         itsPoints.push_back({std::move(progress), nextGroup, std::nullopt});
     }

@@ -86,6 +86,15 @@ bool Part::isComplete() const {
                        [](const PointState& point) { return point.stoppedBy.has_value(); });
 }
 
+Part freshPart(const Configuration& configuration, const Shard& shard) {
+    Part part{configuration, shard, {}};
+    for (const Curve& curve : configuration.curves()) {
+        part.points.insert(part.points.end(), configuration.ebN0.size(),
+                           PointState(configuration.countsOf(curve)));
+    }
+    return part;
+}
+
 std::string partText(const Part& part) {
     Json document = newDocument(format);
     document["configuration"] = toJson(part.configuration);

@@ -20,6 +20,9 @@ struct Part {
     bool isComplete() const;
 };
 
+/// A part of which nothing is done.
+Part freshPart(const Configuration& configuration, const Shard& shard);
+
 /// The file of a part.
 std::string partText(const Part& part);
 

@@ -9,8 +9,6 @@ namespace quarzel::sweep {
 
 namespace {
 
-constexpr std::string_view format = "quarzel sweep result";
-
 Json intervalJson(const Interval& interval) {
     return Json::array({interval.low, interval.high});
 }
@@ -61,7 +59,7 @@ PointState pointFrom(const Json& json) {
 
 std::string resultText(const Result& result) {
     const Configuration& configuration = result.configuration;
-    Json document = newDocument(format);
+    Json document = newDocument(resultFormat);
     document["configuration"] = toJson(configuration);
     document["curves"] = Json::array();
     std::size_t next = 0;
@@ -80,7 +78,7 @@ std::string resultText(const Result& result) {
 }
 
 Result readResult(std::string_view text) {
-    const Json document = readDocument(text, format);
+    const Json document = readDocument(text, resultFormat);
     try {
         Result result{configurationFrom(document.at("configuration")), {}};
         for (const Json& curve : document.at("curves")) {

@@ -10,6 +10,9 @@
 
 namespace quarzel::sweep {
 
+/// What a result file says it is.
+constexpr std::string_view resultFormat = "quarzel sweep result";
+
 /// What comes of a sweep. It depends on the configuration alone: not on threads, shards or interruptions.
 /// (With a time limit the clock decides how many blocks a point has.)
 struct Result {

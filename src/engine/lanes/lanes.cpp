@@ -13,6 +13,13 @@ extern const LaneKernel avx512bwKernels[3];
 
 namespace {
 
+/// What every processor of its kind runs: vectors of 128 bits, however the machine makes them.
+#if defined(__aarch64__)
+constexpr const char* everywhere = "neon";
+#else
+constexpr const char* everywhere = "baseline";
+#endif
+
 constexpr Candidate list[] = {
 #if defined(__x86_64__)
     {"avx512bw",
@@ -24,7 +31,7 @@ constexpr Candidate list[] = {
     {"avx2", [] { return __builtin_cpu_supports("avx2") != 0; }, avx2Kernels, 2},
     {"sse4.1", [] { return __builtin_cpu_supports("sse4.1") != 0; }, sse41Kernels, 1},
 #endif
-    {"baseline", [] { return true; }, baselineKernels, 1},
+    {everywhere, [] { return true; }, baselineKernels, 1},
 };
 
 }  // namespace

@@ -28,7 +28,7 @@ struct Options {
     std::optional<std::string> checkpoint;
     std::uint64_t checkpointSeconds = 30;
     bool resume = false;
-    unsigned threads = allCores();
+    unsigned threads = 0;  // as is usual
     SweepForm form = SweepForm::table;
 
     bool isShard() const { return sweep.shard != "1/1"; }
@@ -185,7 +185,7 @@ void runSweep(const Options& options, std::ostream& results, const MakeWorkers& 
 }  // namespace
 
 std::unique_ptr<sweep::Workers> makeThreadWorkers(unsigned threads) {
-    return std::make_unique<sweep::ThreadWorkers>(threads);
+    return std::make_unique<sweep::ThreadWorkers>(threads == 0 ? allCores() : threads);
 }
 
 void addSweepCommand(CLI::App& app, std::ostream& results, MakeWorkers makeWorkers) {
@@ -201,8 +201,7 @@ void addSweepCommand(CLI::App& app, std::ostream& results, MakeWorkers makeWorke
     command
         ->add_option("--checkpoint-every", options->checkpointSeconds, "How often it is renewed (default 30)")
         ->type_name("SECONDS")
-        ->transform(
-            wholeNumber([](std::uint64_t n) { return n >= 1 && n <= 86400; }, "a number from 1 to 86400"));
+        ->transform(wholeNumber([](std::uint64_t n) { return n <= 86400; }, "a number from 0 to 86400"));
     command->add_flag("--resume", options->resume, "Go on where an earlier run was interrupted");
     addThreadsOption(*command, options->threads);
     addFormOptions(*command, options->form);

@@ -11,10 +11,10 @@
 namespace quarzel::tool {
 
 /// Makes those who do the work of a sweep.
-/// @param threads  of each process
+/// @param threads  of each process; 0: as is usual
 using MakeWorkers = std::function<std::unique_ptr<sweep::Workers>(unsigned threads)>;
 
-/// Workers that are threads of this process.
+/// Workers that are threads of this process, usually one for each core.
 std::unique_ptr<sweep::Workers> makeThreadWorkers(unsigned threads);
 
 /// Add `quarzel sweep`, which simulates a link over Eb/N0.

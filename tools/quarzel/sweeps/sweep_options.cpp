@@ -7,6 +7,7 @@
 #include <vector>
 
 #include "block_sizes.hpp"
+#include "choices.hpp"
 #include "sweep/error.hpp"
 #include "tool_error.hpp"
 #include "value_lists.hpp"
@@ -36,11 +37,7 @@ std::vector<T> readList(const std::string& option, const std::string& text,
 std::vector<std::uint32_t> readBlockSizes(const std::string& text) {
     std::vector<std::uint32_t> sizes;
     for (const std::uint64_t K : readNumberList("--block-size", text)) {
-        if (lte::findBlockSize(K) == nullptr) {
-            throw ToolError(ExitCode::usage, "--block-size", fmt::format("{} is no block size of LTE", K),
-                            "the nearest: " + lte::nearestBlockSizesText(K));
-        }
-        sizes.push_back(static_cast<std::uint32_t>(K));
+        sizes.push_back(blockSizeRow(K, "--block-size").K);
     }
     return sizes;
 }
@@ -65,7 +62,7 @@ lte::Quantiser quantiserOf(const SweepOptions& options) {
 void addSweepOptions(CLI::App& command, SweepOptions& options) {
     const auto add = [&command](const char* group, const char* name, auto& value, const char* type,
                                 const char* text) {
-        return command.add_option(name, value, text)->type_name(type)->group(group);
+        return command.add_option(name, value, text)->type_name(type)->group(group)->check(anyText());
     };
     add(points, "--ebn0", options.ebN0, "LIST", "Eb/N0 in dB: 0.5 or 0:0.1:1.5 or 0,1:0.5:3")->required();
     add(points, "--block-size", options.blockSizes, "LIST", "K (default 1024)");
@@ -88,7 +85,8 @@ void addSweepOptions(CLI::App& command, SweepOptions& options) {
     add(stopping, "--max-time", options.maxSeconds, "SECONDS", "Time for a point (default: no limit)")
         ->transform(atLeast(1));
     command.add_option("--shard", options.shard, "Decode part I of N only, for 'quarzel merge'")
-        ->type_name("I/N");
+        ->type_name("I/N")
+        ->check(anyText());
 }
 
 sweep::Configuration configurationOf(const SweepOptions& options) {

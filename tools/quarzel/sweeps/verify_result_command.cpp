@@ -19,7 +19,7 @@ namespace {
 
 struct Options {
     std::string file;
-    unsigned threads = allCores();
+    unsigned threads = 0;  // as is usual
 };
 
 constexpr const char* description = "Run the sweep of a result file again";

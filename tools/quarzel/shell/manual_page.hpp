@@ -1,0 +1,13 @@
+// SPDX-License-Identifier: MIT
+#pragma once
+
+#include <string>
+
+#include "tool_description.hpp"
+
+namespace quarzel::tool {
+
+/// The manual page of the tool, for man(1).
+std::string manualPage(const ToolDescription& description);
+
+}  // namespace quarzel::tool

@@ -1,0 +1,14 @@
+// SPDX-License-Identifier: MIT
+#pragma once
+
+#include <CLI/CLI.hpp>
+#include <ostream>
+
+namespace quarzel::tool {
+
+/// Add `quarzel manual` and `quarzel completion`, which print what the installed tool ships for man and for
+/// shells. They tell of all commands that the app has when they run.
+/// @param results  where they write; must outlive the parse
+void addShellCommands(CLI::App& app, std::ostream& results);
+
+}  // namespace quarzel::tool

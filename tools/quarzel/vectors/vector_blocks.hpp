@@ -1,0 +1,28 @@
+// SPDX-License-Identifier: MIT
+#pragma once
+
+#include <cstddef>
+#include <cstdint>
+#include <functional>
+#include <vector>
+
+#include "stimulus_source.hpp"
+
+namespace quarzel::tool {
+
+/// A block of a set: what goes into the core and what comes out.
+struct StimulusAndResponse {
+    std::vector<std::int8_t> soft;         ///< 3 (K + 4) values
+    std::vector<unsigned char> decisions;  ///< K bits
+};
+
+/// Make planned blocks and decode them.
+/// @param threads   how many threads do so; the result is the same
+/// @param progress  told one after the other, by any of the threads, how many blocks are made
+/// @throws ToolError when one cannot be decoded
+std::vector<StimulusAndResponse> makeBlocks(const std::vector<PlannedBlock>& plan,
+                                            const StimulusSource& source, int units, int algorithm,
+                                            unsigned threads,
+                                            const std::function<void(std::size_t)>& progress);
+
+}  // namespace quarzel::tool

@@ -1,0 +1,100 @@
+// SPDX-License-Identifier: MIT
+#include "vector_configuration.hpp"
+
+#include <fmt/format.h>
+
+#include <algorithm>
+#include <nlohmann/json.hpp>
+
+#include "interleaver/lte_params.hpp"
+#include "report_text.hpp"
+
+namespace quarzel::tool {
+
+namespace {
+
+using Json = nlohmann::ordered_json;
+
+constexpr std::string_view readme = R"text(# Test vectors of a turbo decoder core
+
+Made by quarzel {version}:
+
+    {command}
+
+manifest.json tells the configuration, every block, what the blocks reach, and the SHA-256 of every file:
+
+    jq -r '.files[] | "\(.sha256)  \(.name)"' manifest.json | sha256sum --check
+
+Each core has a directory:
+
+{cores}
+- config.vh: UNITS, ALGORITHM, BLOCKS, SOFT_WORDS, DOUT_WORDS, MAX_K as localparams, to be included
+- blocks.hex: for $readmemh; four 32-bit words a block: K, iterations, address of its first soft value, address of its
+  first decision
+- rsc1_sys.hex, rsc1_par.hex, rsc2_par.hex: for $readmemh; soft values, two's complement bytes, K + 4 a block; positive
+  means bit 1, the unit is 1/8
+- dout.hex: for $readmemh; the hard decisions that the core is to give, a bit a word, K a block
+- npy/: the same blocks by K and iterations, for 'quarzel decode' and numpy
+
+A bench that writes its decisions with $writememh is checked by
+
+    quarzel compare {first} simulated.hex
+)text";
+
+Json stimuliJson(const VectorRequest& request) {
+    Json names = Json::array();
+    for (const Stimulus stimulus : request.stimuli) {
+        names.push_back(nameOf(stimulus));
+    }
+    return names;
+}
+
+bool isLlr(const VectorRequest& request) {
+    return request.quantiser.kind == lte::Quantiser::Kind::llr;
+}
+
+/// The block sizes as the option takes them.
+std::string sizesText(const std::vector<std::uint32_t>& sizes) {
+    return sizes.size() == lteParams.size() ? "all" : fmt::format("{}", fmt::join(sizes, ","));
+}
+
+}  // namespace
+
+Json configurationJson(const VectorRequest& request) {
+    return {{"seed", request.seed},
+            {"cover", request.cover},
+            {"block_sizes", request.blockSizes},
+            {"units", request.units},
+            {"algorithms", request.algorithms},
+            {"iterations", request.iterations},
+            {"stimuli", stimuliJson(request)},
+            {"blocks", request.blocks},
+            {"ebn0_db", request.ebN0.value()},
+            {"quantiser", {{"kind", isLlr(request) ? "llr" : "scale"}, {"scale", request.quantiser.scale}}},
+            {"command", commandOf(request)}};
+}
+
+std::string commandOf(const VectorRequest& request) {
+    const std::string what =
+        request.cover ? "--cover"
+                      : fmt::format("--block-size {} --stimulus {}", sizesText(request.blockSizes),
+                                    fmt::join(stimuliJson(request).get<std::vector<std::string>>(), ","));
+    return fmt::format(
+        "quarzel vectors DIRECTORY {} --units {} --algorithm {} --iterations {} --blocks {} "
+        "--ebn0 {} --{} {} --seed {}",
+        what, fmt::join(request.units, ","), fmt::join(request.algorithms, ","),
+        fmt::join(request.iterations, ","), request.blocks, request.ebN0.value(),
+        isLlr(request) ? "llr" : "scale", request.quantiser.scale, request.seed);
+}
+
+std::string readmeText(const VectorRequest& request, const std::vector<VectorCore>& cores) {
+    std::string list;
+    for (const VectorCore& core : cores) {
+        list += fmt::format("- {}/: {} units, algorithm {}, {}\n", core.directory, core.units, core.algorithm,
+                            counted(core.blocks.size(), "block", "blocks"));
+    }
+    return fmt::format(readme, fmt::arg("version", QUARZEL_VERSION), fmt::arg("command", commandOf(request)),
+                       fmt::arg("cores", list), fmt::arg("first", cores.front().directory));
+}
+
+}  // namespace quarzel::tool
