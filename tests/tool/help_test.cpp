@@ -52,6 +52,16 @@ TEST(Help, TeachesCompletion) {
     expectHelp({"completion", "--help"}, "completion_help.txt");
 }
 
+TEST(Help, TeachesSweep) {
+    expectHelp({"sweep", "--help"}, "sweep_help.txt");
+}
+TEST(Help, TeachesMerge) {
+    expectHelp({"merge", "--help"}, "merge_help.txt");
+}
+TEST(Help, TeachesVerifyResult) {
+    expectHelp({"verify-result", "--help"}, "verify_result_help.txt");
+}
+
 TEST(Help, HasAShortOption) {
     EXPECT_EQ(runTool({"decode", "-h"}).out, runTool({"decode", "--help"}).out);
 }

@@ -20,10 +20,10 @@ class VectorsDirectory : public testing::Test {
         return runTool(options, setting);
     }
 
-    void expectRefused(const ToolRun& run, const std::string& message) {
+    void expectRefused(const ToolRun& run, const std::string& message, int exitCode = 3) {
         EXPECT_EQ(run.err, "quarzel: error: " + message + '\n');
         EXPECT_EQ(run.out, "");
-        EXPECT_EQ(run.exitCode, 3);
+        EXPECT_EQ(run.exitCode, exitCode);
     }
 
     TemporaryDirectory itsDirectory;
@@ -82,6 +82,14 @@ TEST_F(VectorsDirectory, IsRefusedWhereItCannotBe) {
 TEST_F(VectorsDirectory, IsNotThereWhenAFileCannotBeWritten) {
     expectRefused(make({"--block-size", "6144"}, {.fileSizeLimit = 10000}),
                   itsCore + "/rsc1_sys.hex: cannot be written: File too large; raise the limit (ulimit -f)");
+    EXPECT_EQ(itsDirectory.names(), std::vector<std::string>{});
+}
+
+TEST_F(VectorsDirectory, IsNotThereWhenTheToolIsInterrupted) {
+    const ToolRun run = runTool({"--preserve-status", "-s", "INT", "0.3", QUARZEL_TOOL, "vectors", itsSet,
+                                 "--block-size", "6144", "--blocks", "100000"},
+                                {.program = "/usr/bin/timeout"});
+    expectRefused(run, itsSet + ": was not made, since a signal came; run the command again", 4);
     EXPECT_EQ(itsDirectory.names(), std::vector<std::string>{});
 }
 

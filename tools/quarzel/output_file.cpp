@@ -84,8 +84,10 @@ void OutputFile::finish() {
 
 bool isSameFile(const std::string& a, const std::string& b) {
     std::error_code ignored;
-    const fs::path first = fs::weakly_canonical(a, ignored);
-    return fs::equivalent(a, b, ignored) || (!first.empty() && first == fs::weakly_canonical(b, ignored));
+    // Absolute first: of a relative name that is not there yet nothing would be canonical.
+    const fs::path first = fs::weakly_canonical(fs::absolute(a, ignored), ignored);
+    return fs::equivalent(a, b, ignored) ||
+           (!first.empty() && first == fs::weakly_canonical(fs::absolute(b, ignored), ignored));
 }
 
 void probeOutput(const std::string& file) {

@@ -20,8 +20,9 @@ Json newDocument(std::string_view format);
 std::string textOf(Json document, int indent);
 
 /// Read a document.
+/// @param indent  with which it was written
 /// @throws Error when it is truncated, altered, of another format, or of another version of quarzel
-Json readDocument(std::string_view text, std::string_view format);
+Json readDocument(std::string_view text, std::string_view format, int indent);
 
 Json toJson(const Configuration& configuration);
 

@@ -11,6 +11,7 @@ namespace quarzel::sweep {
 namespace {
 
 constexpr std::string_view format = "quarzel sweep part";
+constexpr int indent = -1;  // one line: there can be very many blocks in error
 
 Json errorsJson(const ErrorList& errors, std::size_t counts) {
     Json json = Json::array();
@@ -104,11 +105,11 @@ std::string partText(const Part& part) {
     for (const PointState& point : part.points) {
         document["points"].push_back(pointJson(point, part));
     }
-    return textOf(std::move(document), -1);
+    return textOf(std::move(document), indent);
 }
 
 Part readPart(std::string_view text) {
-    const Json document = readDocument(text, format);
+    const Json document = readDocument(text, format, indent);
     try {
         Part part{configurationFrom(document.at("configuration")), {}, {}};
         part.shard = {document.at("shard").at("index").get<std::uint64_t>() - 1,

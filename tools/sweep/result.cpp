@@ -9,6 +9,8 @@ namespace quarzel::sweep {
 
 namespace {
 
+constexpr int indent = 1;
+
 Json intervalJson(const Interval& interval) {
     return Json::array({interval.low, interval.high});
 }
@@ -21,6 +23,7 @@ Json pointJson(const PointState& point, lte::Decibels ebN0, const Curve& curve, 
         {"bits", point.blocks * curve.blockSize},
         {"bit_errors", point.last().bitErrors},
         {"block_errors", point.last().blockErrors},
+        {"bit_error_squares", point.bitErrorSquares},
         {"ber", rates.ber},
         {"bler", rates.bler},
         {"ber_interval", intervalJson(rates.berInterval)},
@@ -44,6 +47,7 @@ ErrorCount countFrom(const Json& json) {
 PointState pointFrom(const Json& json) {
     PointState point;
     point.blocks = json.at("blocks").get<std::uint64_t>();
+    point.bitErrorSquares = json.at("bit_error_squares").get<std::uint64_t>();
     point.stoppedBy = stopReasonOf(json.at("stopped_by").get<std::string>()).value();
     point.counts = {countFrom(json)};
     if (json.contains("per_iteration")) {
@@ -74,11 +78,11 @@ std::string resultText(const Result& result) {
                                       {"iterations", curve.iterations},
                                       {"points", std::move(points)}});
     }
-    return textOf(std::move(document), 1);
+    return textOf(std::move(document), indent);
 }
 
 Result readResult(std::string_view text) {
-    const Json document = readDocument(text, resultFormat);
+    const Json document = readDocument(text, resultFormat, indent);
     try {
         Result result{configurationFrom(document.at("configuration")), {}};
         for (const Json& curve : document.at("curves")) {

@@ -24,7 +24,6 @@ struct Result {
 std::string resultText(const Result& result);
 
 /// Read a result file.
-/// @return what the file tells; the squares of bit errors, which it does not, are 0
 /// @throws Error when it is not a whole, unaltered result of this version
 Result readResult(std::string_view text);
 

@@ -44,14 +44,15 @@ quantisers get the same bits and the same noise.
 
 The result depends on nothing but the options above --shard: not on threads,
 parts, interruptions or the machine. (With --max-time it depends on the clock.)
+The interval holds the true block error rate with a probability of 95 %.
 
 Files:
   OUT         the result, JSON: for 'quarzel plot' and 'quarzel verify-result'.
               With --shard a part of it, for 'quarzel merge'. It is written
               whole or not at all, at the end.
-  CHECKPOINT  what is done so far, renewed while the sweep runs and when it is
-              interrupted (SIGINT, SIGTERM); removed at the end. If there is one,
-              --resume goes on from it; otherwise it begins at the beginning.
+  FILE        what is done so far, renewed while the sweep runs and when it is
+              interrupted (SIGINT, SIGTERM), removed at the end. --resume goes
+              on from it, or begins at the beginning when there is none.
 
 Examples:
   quarzel sweep --ebn0 0:0.2:1 --iterations 8 -o result.json
@@ -197,7 +198,7 @@ void addSweepCommand(CLI::App& app, std::ostream& results, MakeWorkers makeWorke
     command
         ->add_option("--checkpoint", options->checkpoint,
                      "Keep what is done in this file (default:\nOUT.checkpoint)")
-        ->type_name("CHECKPOINT");
+        ->type_name("FILE");
     command
         ->add_option("--checkpoint-every", options->checkpointSeconds, "How often it is renewed (default 30)")
         ->type_name("SECONDS")

@@ -17,9 +17,6 @@ namespace quarzel::tool {
 
 namespace {
 
-constexpr const char* points = "Points";
-constexpr const char* stopping = "Where a point ends, whichever comes first";
-
 template <class T>
 std::vector<T> readList(const std::string& option, const std::string& text,
                         const std::function<bool(std::uint64_t)>& isWanted, std::string_view wanted) {
@@ -60,30 +57,27 @@ lte::Quantiser quantiserOf(const SweepOptions& options) {
 }  // namespace
 
 void addSweepOptions(CLI::App& command, SweepOptions& options) {
-    const auto add = [&command](const char* group, const char* name, auto& value, const char* type,
-                                const char* text) {
-        return command.add_option(name, value, text)->type_name(type)->group(group)->check(anyText());
+    const auto add = [&command](const char* name, auto& value, const char* type, const char* text) {
+        return command.add_option(name, value, text)->type_name(type)->check(anyText());
     };
-    add(points, "--ebn0", options.ebN0, "LIST", "Eb/N0 in dB: 0.5 or 0:0.1:1.5 or 0,1:0.5:3")->required();
-    add(points, "--block-size", options.blockSizes, "LIST", "K (default 1024)");
-    add(points, "--units", options.units, "LIST", "Processing units: 2, 4 or 8 (default 2)");
-    add(points, "--algorithm", options.algorithms, "LIST",
+    add("--ebn0", options.ebN0, "LIST", "Eb/N0 in dB: 0.5 or 0:0.1:1.5 or 0,1:0.5:3")->required();
+    add("--block-size", options.blockSizes, "LIST", "K, as 1024 or 40,6144 (default 1024)");
+    add("--units", options.units, "LIST", "Processing units: 2, 4 or 8 (default 2)");
+    add("--algorithm", options.algorithms, "LIST",
         "0 max-log, 1 max-log with extrinsic values\nscaled by 0.75, 2 max-star (default 1)");
-    add(points, "--iterations", options.iterations, "LIST", "Iterations, 1 to 15 (default 6)");
-    CLI::Option* const scale =
-        add(points, "--scale", options.scale, "S", "Soft value round(S y), y = +-1 + noise");
-    add(points, "--llr", options.llr, "S",
+    add("--iterations", options.iterations, "LIST", "Iterations, 1 to 15 (default 6)");
+    CLI::Option* const scale = add("--scale", options.scale, "S", "Soft value round(S y), y = +-1 + noise");
+    add("--llr", options.llr, "S",
         "Soft value round(S L), L the log-likelihood ratio\n2 y / sigma^2 (default, with S = 8)")
         ->excludes(scale);
-    add(points, "--seed", options.seed, "N", "Of bits and noise (default 1)")->transform(atLeast(0));
-    command.add_flag("--per-iteration", options.perIteration, "Count errors after every iteration")
-        ->group(points);
-    add(stopping, "--max-block-errors", options.maxBlockErrors, "N",
-        "Block errors (default 100; 0: no limit)")
+    add("--seed", options.seed, "N", "Of bits and noise (default 1)")->transform(atLeast(0));
+    command.add_flag("--per-iteration", options.perIteration, "Count errors after every iteration");
+    add("--max-block-errors", options.maxBlockErrors, "N",
+        "End a point at its Nth block error (default 100;\n0: never)")
         ->transform(atLeast(0));
-    add(stopping, "--max-blocks", options.maxBlocks, "N", "Blocks (default 10000)")->transform(atLeast(1));
-    add(stopping, "--max-time", options.maxSeconds, "SECONDS", "Time for a point (default: no limit)")
+    add("--max-blocks", options.maxBlocks, "N", "End a point after N blocks (default 10000)")
         ->transform(atLeast(1));
+    add("--max-time", options.maxSeconds, "SECONDS", "End a point after this time")->transform(atLeast(1));
     command.add_option("--shard", options.shard, "Decode part I of N only, for 'quarzel merge'")
         ->type_name("I/N")
         ->check(anyText());

@@ -38,7 +38,7 @@ std::vector<StimulusAndResponse> makeBlocks(const std::vector<PlannedBlock>& pla
     std::mutex mutex;
     std::size_t next = 0;
     std::size_t done = 0;
-    const auto work = [&] {
+    const auto makeSome = [&] {
         CoreModel core(units, algorithm);
         for (std::unique_lock lock(mutex); next < plan.size();) {
             const std::size_t block = next++;
@@ -47,6 +47,15 @@ std::vector<StimulusAndResponse> makeBlocks(const std::vector<PlannedBlock>& pla
             lock.lock();
             blocks[block] = std::move(made);
             progress(++done);
+        }
+    };
+    const auto work = [&] {
+        try {
+            makeSome();
+        } catch (...) {
+            const std::lock_guard lock(mutex);
+            next = plan.size();  // the others need not go on
+            throw;
         }
     };
     std::vector<std::future<void>> workers;

@@ -18,7 +18,8 @@ struct StimulusAndResponse {
 
 /// Make planned blocks and decode them.
 /// @param threads   how many threads do so; the result is the same
-/// @param progress  told one after the other, by any of the threads, how many blocks are made
+/// @param progress  told one after the other, by any of the threads, how many blocks are made; what it throws
+///                  ends the work and is passed on
 /// @throws ToolError when one cannot be decoded
 std::vector<StimulusAndResponse> makeBlocks(const std::vector<PlannedBlock>& plan,
                                             const StimulusSource& source, int units, int algorithm,

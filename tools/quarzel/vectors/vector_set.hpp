@@ -18,7 +18,7 @@ struct VectorSetSummary {
     std::size_t bytes = 0;
 };
 
-/// Told how many of how many blocks are made.
+/// Told how many of how many blocks are made. What it throws ends the work, and nothing is left of it.
 using VectorProgress = std::function<void(std::size_t done, std::size_t total)>;
 
 /// Make a vector set. The bytes of every file depend on the request alone.

@@ -19,6 +19,7 @@
 #include "list_option.hpp"
 #include "progress.hpp"
 #include "report_text.hpp"
+#include "sweeps/interruption.hpp"
 #include "threads_option.hpp"
 #include "tool_error.hpp"
 #include "vector_set.hpp"
@@ -184,10 +185,15 @@ void printSummary(std::ostream& results, const VectorsOptions& options, const Ve
 
 void makeVectors(const VectorsOptions& options, std::ostream& results) {
     const VectorRequest request = requestOf(options);
+    const Interruption interruption;
     std::optional<Progress> progress;
     const VectorSetSummary summary =
         makeVectorSet(request, options.directory, options.replace, options.threads,
-                      [&progress](std::size_t done, std::size_t total) {
+                      [&](std::size_t done, std::size_t total) {
+                          if (interruption.hasCome()) {
+                              throw ToolError(ExitCode::interrupted, options.directory,
+                                              "was not made, since a signal came", "run the command again");
+                          }
                           if (!progress) {
                               progress.emplace(std::cerr, ::isatty(STDERR_FILENO) != 0, total);
                           }

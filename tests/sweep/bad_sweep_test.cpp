@@ -1,0 +1,115 @@
+// SPDX-License-Identifier: MIT
+#include <gtest/gtest.h>
+
+#include "tool/run_tool.hpp"
+#include "tool/temporary_directory.hpp"
+
+namespace quarzel::test {
+
+namespace {
+
+/// A command line of `quarzel sweep` that is wrong, and what the tool says of it.
+struct BadSweep {
+    const char* title;
+    std::vector<std::string> arguments;
+    std::string message;
+};
+
+void PrintTo(const BadSweep& bad, std::ostream* stream) {
+    *stream << bad.title;
+}
+
+const std::string seeSweep = "; see 'quarzel sweep --help'";
+
+const std::vector<BadSweep> badSweeps = {
+    {"NoEbN0", {}, "--ebn0 is required" + seeSweep},
+    {"UnknownOption",
+     {"--ebn0", "1", "--unit", "2"},
+     "'--unit' is not understood; did you mean '--units'? see 'quarzel sweep --help'"},
+    {"SizeBetweenTwo",
+     {"--ebn0", "1", "--block-size", "40,41"},
+     "--block-size: 41 is no block size of LTE; the nearest: 40, 48"},
+    {"ThreeUnits", {"--ebn0", "1", "--units", "2,3"}, "--units: '3' is not 2, 4 or 8" + seeSweep},
+    {"Algorithm3", {"--ebn0", "1", "--algorithm", "3"}, "--algorithm: '3' is not 0, 1 or 2" + seeSweep},
+    {"NoIteration",
+     {"--ebn0", "1", "--iterations", "0"},
+     "--iterations: '0' is not a number from 1 to 15" + seeSweep},
+    {"ListEndsInComma",
+     {"--ebn0", "1", "--units", "2,"},
+     "--units: '' is not a whole number; give one or more, separated by commas"},
+    {"NoBlocks",
+     {"--ebn0", "1", "--max-blocks", "0"},
+     "--max-blocks: '0' is not a whole number from 1" + seeSweep},
+    {"VeryManyBlocks",
+     {"--ebn0", "1", "--max-blocks", "9999999999999999"},
+     "the number of blocks is not from 1 to 2^40; give one that is"},
+    {"TooManyPoints",
+     {"--ebn0", "0:0.001:5", "--iterations", "1,2,3"},
+     "there are 15003 points, more than 10000; make a range shorter or its step larger"},
+    {"LoudSignal", {"--ebn0", "50"}, "Eb/N0 lies outside -20 to 40 dB; give values inside"},
+    {"NoScale",
+     {"--ebn0", "1", "--scale", "0"},
+     "--scale: 0 is not above 0 and up to 1000000; give a number that is"},
+    {"TwoQuantisers", {"--ebn0", "1", "--scale", "1", "--llr", "1"}, "--scale excludes --llr" + seeSweep},
+    {"TwoForms", {"--ebn0", "1", "--json", "--csv"}, "--json excludes --csv" + seeSweep},
+    {"ShardBeyondLast",
+     {"--ebn0", "1", "--shard", "3/2", "-o", "x"},
+     "--shard: '3/2' is not I/N; give the number of the part, from 1, and how many there are, as 1/8"},
+    {"ShardWithoutFile",
+     {"--ebn0", "1", "--shard", "1/2"},
+     "--shard: a part is of use only in a file; name one with -o"},
+    {"ShardWithTime",
+     {"--ebn0", "1", "--shard", "1/2", "-o", "x", "--max-time", "3"},
+     "--max-time: parts that time has stopped do not fit together; leave it out, or --shard"},
+    {"ResumeWithoutFile",
+     {"--ebn0", "1", "--resume"},
+     "--resume: there is no file to go on from; name the output with -o, or the checkpoint with "
+     "--checkpoint"},
+    {"CheckpointIsOutput",
+     {"--ebn0", "1", "-o", "x", "--checkpoint", "./x"},
+     "--checkpoint: it is also the output of -o; give another name"},
+};
+
+class BadSweepTest : public testing::TestWithParam<BadSweep> {};
+
+}  // namespace
+
+TEST_P(BadSweepTest, EndsWithOneLineThatTellsWhatIsWrong) {
+    std::vector<std::string> arguments = GetParam().arguments;
+    arguments.insert(arguments.begin(), "sweep");
+    const ToolRun run = runTool(arguments);
+    EXPECT_EQ(run.err, "quarzel: error: " + GetParam().message + '\n');
+    EXPECT_EQ(run.out, "");
+    EXPECT_EQ(run.exitCode, 2);
+}
+
+INSTANTIATE_TEST_SUITE_P(, BadSweepTest, testing::ValuesIn(badSweeps),
+                         [](const auto& test) { return std::string(test.param.title); });
+
+TEST(BadSweep, IsToldOfAPathThatCannotBeWrittenBeforeItWorks) {
+    const TemporaryDirectory directory;
+    const std::string file = directory.path("missing/result.json");
+    const ToolRun run = runTool({"sweep", "--ebn0", "9", "--max-blocks", "1000000000", "-o", file});
+    EXPECT_EQ(run.err, "quarzel: error: " + file +
+                           ": cannot be written: No such file or directory; create its directory first\n");
+    EXPECT_EQ(run.exitCode, 3);
+}
+
+TEST(BadSweep, LeavesACheckpointAloneUnlessToldToGoOn) {
+    const TemporaryDirectory directory;
+    const std::string checkpoint = directory.write("result.json.checkpoint", "precious");
+    const ToolRun run = runTool({"sweep", "--ebn0", "9", "-o", directory.path("result.json")});
+    EXPECT_EQ(run.err,
+              "quarzel: error: " + checkpoint +
+                  ": is the checkpoint of an interrupted sweep; go on from it with --resume, or remove it "
+                  "to begin anew\n");
+    EXPECT_EQ(run.exitCode, 3);
+    const ToolRun resumed =
+        runTool({"sweep", "--ebn0", "9", "-o", directory.path("result.json"), "--resume"});
+    EXPECT_EQ(resumed.err,
+              "quarzel: error: " + checkpoint + ": is no quarzel sweep part; give the name of one\n");
+    EXPECT_EQ(resumed.exitCode, 3);
+    EXPECT_EQ(readFile(checkpoint), "precious");
+}
+
+}  // namespace quarzel::test

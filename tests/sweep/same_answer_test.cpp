@@ -1,0 +1,130 @@
+// SPDX-License-Identifier: MIT
+// One sweep, one result, byte for byte: whoever computes it.
+#include <gtest/gtest.h>
+
+#include <fstream>
+#include <iterator>
+#include <random>
+
+#include "support/random.hpp"
+#include "sweeps.hpp"
+#include "tool/run_tool.hpp"
+#include "tool/temporary_directory.hpp"
+
+namespace quarzel::test {
+
+namespace {
+
+/// Stops a sweep after some ticks.
+class Impatience : public sweep::Observer {
+  public:
+    explicit Impatience(unsigned ticks) : itsTicks(ticks) {}
+    void tick(sweep::Dispatcher& dispatcher) override {
+        if (itsTicks-- == 0) {
+            dispatcher.stop();
+        }
+    }
+
+  private:
+    unsigned itsTicks;
+};
+
+const std::vector<std::string> longerSweep = {
+    "sweep", "--block-size",       "40,512", "--iterations", "6",    "--ebn0",
+    "0:1:3", "--algorithm",        "1,2",    "--max-blocks", "2501", "--seed",
+    "99",    "--max-block-errors", "400"};
+
+std::vector<std::string> with(std::vector<std::string> arguments, const std::vector<std::string>& more) {
+    arguments.insert(arguments.end(), more.begin(), more.end());
+    return arguments;
+}
+
+}  // namespace
+
+// The stored result pins bits, noise, channel, core and the form of the file, on every machine and in every
+// version: what alters it alters every result that users have kept.
+TEST(SameAnswer, IsTheStoredOne) {
+    std::ifstream stream(QUARZEL_SWEEP_DATA "/small_sweep.json");
+    const std::string stored{std::istreambuf_iterator<char>(stream), {}};
+    sweep::Configuration configuration = smallSweep();
+    configuration.perIteration = true;
+    EXPECT_EQ(sweep::resultText(resultOf(configuration)), stored);
+    const ToolRun run = runTool({"verify-result", QUARZEL_SWEEP_DATA "/small_sweep.json"});
+    EXPECT_EQ(run.out,
+              QUARZEL_SWEEP_DATA "/small_sweep.json: the same byte for byte, 12 points with 2731 blocks\n");
+    EXPECT_EQ(run.exitCode, 0);
+}
+
+TEST(SameAnswer, ComesFromAnyNumberOfThreads) {
+    const std::string expected = sweep::resultText(resultOf(smallSweep()));
+    for (const unsigned threads : {2U, 8U}) {
+        EXPECT_EQ(sweep::resultText(resultOf(smallSweep(), threads)), expected) << threads;
+    }
+}
+
+TEST(SameAnswer, ComesFromAnyNumberOfShards) {
+    for (const bool perIteration : {false, true}) {
+        sweep::Configuration configuration = smallSweep();
+        configuration.perIteration = perIteration;
+        const std::string expected = sweep::resultText(resultOf(configuration));
+        for (const std::uint64_t shards : {2U, 9U}) {
+            std::vector<sweep::NamedPart> parts;
+            for (std::uint64_t index = shards; index-- > 0;) {
+                parts.push_back(partOf(configuration, {index, shards}));
+            }
+            EXPECT_EQ(sweep::resultText(sweep::merge(parts)), expected) << shards;
+        }
+    }
+}
+
+TEST(SameAnswer, ComesOutForFewerPointsAndForThemAlone) {
+    const sweep::Result all = resultOf(smallSweep());
+    sweep::Configuration one = smallSweep();
+    one.blockSizes = {104};
+    one.algorithms = {2};
+    one.ebN0 = {{1'500'000}};
+    const sweep::PointState alone = resultOf(one).points[0];
+    const sweep::PointState& among = all.points[10];
+    EXPECT_EQ(alone.blocks, among.blocks);
+    EXPECT_EQ(alone.last().bitErrors, among.last().bitErrors);
+}
+
+TEST(SameAnswer, ComesOutAfterAnyNumberOfInterruptions) {
+    sweep::Configuration configuration = smallSweep();
+    configuration.blockSizes = {1024};
+    configuration.maxBlocks = 150;
+    const std::string expected = sweep::resultText(resultOf(configuration));
+    sweep::Plan plan{configuration, {}, {}, {}};
+    for (bool isFinished = false; !isFinished;) {
+        sweep::Dispatcher dispatcher(plan);
+        Impatience impatience(0);
+        sweep::ThreadWorkers(2).run(dispatcher, impatience);
+        isFinished = dispatcher.hasFinished();
+        plan.start = sweep::readPart(sweep::partText({configuration, {}, dispatcher.states()})).points;
+    }
+    EXPECT_EQ(sweep::resultText({configuration, plan.start}), expected);
+}
+
+TEST(SameAnswer, SurvivesTwentyKills) {
+    std::mt19937 random = seededRandom();
+    const TemporaryDirectory directory;
+    const std::string file = directory.path("result.json");
+    const std::string expected = runTool(with(longerSweep, {"--json"})).out;
+    int kills = 0;
+    for (int round = 0; round < 20; ++round) {
+        const std::string seconds = std::to_string(0.02 + 0.0002 * static_cast<double>(random() % 1000));
+        const ToolRun run =
+            runTool(with({"-s", "KILL", seconds, QUARZEL_TOOL},
+                         with(longerSweep, {"-o", file, "--checkpoint-every", "0", "--resume"})),
+                    {.program = "/usr/bin/timeout"});
+        EXPECT_TRUE(run.exitCode == 0 || run.exitCode == -9 || run.exitCode == 137) << run.err;
+        kills += run.exitCode == 0 ? 0 : 1;
+    }
+    EXPECT_GT(kills, 0);
+    const ToolRun run = runTool(with(longerSweep, {"-o", file, "--resume", "--json"}));
+    EXPECT_EQ(run.err, "");
+    EXPECT_EQ(run.out, expected);
+    EXPECT_EQ(readFile(file), expected);
+}
+
+}  // namespace quarzel::test
