@@ -34,11 +34,7 @@ std::vector<T> readList(const std::string& option, const std::string& text,
 std::vector<std::uint32_t> readBlockSizes(const std::string& text) {
     std::vector<std::uint32_t> sizes;
     for (const std::uint64_t K : readNumberList("--block-size", text)) {
-        if (lte::findBlockSize(K) == nullptr) {
-            throw ToolError(ExitCode::usage, "--block-size", fmt::format("{} is no block size of LTE", K),
-                            "the nearest: " + lte::nearestBlockSizesText(K));
-        }
-        sizes.push_back(static_cast<std::uint32_t>(K));
+        sizes.push_back(blockSizeRow(K, "--block-size").K);
     }
     return sizes;
 }
