@@ -24,6 +24,7 @@ bench:
 	@scripts/install-packages.sh test
 	@scripts/build.sh release
 	build/release/bench/quarzel_bench --benchmark_out=build/release/bench.json --benchmark_out_format=json
+	build/release/bench/quarzel_sweep_bench
 
 format:
 	@scripts/install-packages.sh test

@@ -126,13 +126,16 @@ TEST(SiText, WritesTheLargestAndTheSmallestNumbers) {
 }
 
 TEST(SiText, WritesNoMoreDecimalsThanTheSmallestNumberHas) {
-    constexpr std::size_t decimals = 16445;
+    // The smallest number is a power of two, 2^-16445 where a long double has 80 bits: as many decimals.
+    using Limits = std::numeric_limits<long double>;
+    constexpr std::size_t decimals = Limits::digits - Limits::min_exponent;
     const std::string smallest = toSIString(std::numeric_limits<long double>::denorm_min(), decimals);
     EXPECT_EQ(smallest.size(), 2 + decimals + 1);
     EXPECT_EQ(smallest.substr(smallest.size() - 2), "5 ");
     EXPECT_EQ(toSIString(2.0, decimals), "2." + std::string(decimals, '0') + " ");
     EXPECT_EQ(toSIString(2.0, decimals - 1), "2." + std::string(decimals - 1, '0') + " ");
-    for (const unsigned precision : {16446U, 0x7FFFFFFFU, 0x80000000U, 0xFFFFFFFFU}) {
+    for (const unsigned precision :
+         {static_cast<unsigned>(decimals) + 1, 0x7FFFFFFFU, 0x80000000U, 0xFFFFFFFFU}) {
         EXPECT_EQ(toSIString(2.0, precision), toSIString(2.0, decimals)) << precision;
     }
 }

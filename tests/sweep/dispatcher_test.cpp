@@ -37,7 +37,7 @@ sweep::ErrorList outcomeOf(const sweep::Task& task, const sweep::Shard& shard, c
 void runInAnyOrder(sweep::Dispatcher& dispatcher, const BitErrors& bitErrors, std::mt19937& random) {
     std::vector<sweep::Task> atWork;
     while (true) {
-        const std::optional<sweep::Task> task = dispatcher.next(1 + random() % 3);
+        const std::optional<sweep::Task> task = dispatcher.next(1 + static_cast<unsigned>(random() % 3));
         if (task) {
             atWork.push_back(*task);
         }
@@ -84,7 +84,7 @@ TEST(Dispatcher, EndsAPointWhereAPlainLoopDoesWhateverTheOrderAndTheShards) {
         configuration.maxBlocks = 1 + random() % 600;
         configuration.maxBlockErrors = random() % 20;
         BitErrors bitErrors(configuration.maxBlocks);
-        const unsigned oneIn = 1 + random() % 40;
+        const std::uint64_t oneIn = 1 + random() % 40;
         for (std::uint32_t& errors : bitErrors) {
             errors = random() % oneIn == 0 ? 1 + static_cast<std::uint32_t>(random() % 500) : 0;
         }

@@ -18,9 +18,10 @@ class Refinement {
     explicit Refinement(const RandomSource& source) : itsSource(source) {}
 
     std::uint32_t next() {
-        const std::uint32_t place = itsUsed % wordsPerGroup;
+        const std::size_t place = itsUsed % wordsPerGroup;
         if (place == 0) {
-            itsSource.words(Purpose::refinement, itsUsed / wordsPerGroup, 1, itsWords.data());
+            itsSource.words(Purpose::refinement, static_cast<std::uint32_t>(itsUsed / wordsPerGroup), 1,
+                            itsWords.data());
         }
         ++itsUsed;
         return itsWords[place];
@@ -29,7 +30,7 @@ class Refinement {
   private:
     const RandomSource& itsSource;
     std::array<std::uint32_t, wordsPerGroup> itsWords;  // drawn when the first is needed
-    std::uint32_t itsUsed = 0;
+    std::size_t itsUsed = 0;
 };
 
 /// The 16 random bits of a value, as the look-up takes them.

@@ -57,11 +57,12 @@ PhiloxInput RandomSource::input(Purpose purpose, std::uint32_t index) const {
 
 void RandomSource::words(Purpose purpose, std::uint32_t firstGroup, std::size_t groups,
                          std::uint32_t* words) const {
-    drawFunctions().drawWords(input(purpose, firstGroup * (wordsPerGroup / 4)), groups, words);
+    drawFunctions().drawWords(input(purpose, firstGroup * static_cast<std::uint32_t>(wordsPerGroup / 4)),
+                              groups, words);
 }
 
 void RandomSource::informationBits(unsigned lane, std::uint8_t* bits) const {
-    constexpr std::size_t bitsPerGroup = 32 * wordsPerGroup;
+    constexpr std::uint32_t bitsPerGroup = 32 * wordsPerGroup;
     std::array<std::uint32_t, wordsPerGroup> words;
     for (std::uint32_t at = 0; at < itsBlockSize; at += bitsPerGroup) {
         this->words(Purpose::informationBits, at / bitsPerGroup, 1, words.data());

@@ -128,6 +128,10 @@ class HeaderScanner {
 
 }  // namespace
 
+bool isNpy(std::istream& stream, const std::string& file) {
+    return file.ends_with(".npy") || stream.peek() == std::char_traits<char>::to_int_type(magic.front());
+}
+
 NpyHeader readNpyHeader(std::istream& stream, const std::string& file) {
     const std::string start = readBytes(stream, magic.size() + 2, file);
     if (!start.starts_with(magic)) {

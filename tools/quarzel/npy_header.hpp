@@ -15,8 +15,8 @@ struct NpyHeader {
     std::vector<std::uint64_t> shape;
 };
 
-/// The first byte of every npy file; no text begins with it.
-constexpr char npyFirstByte = '\x93';
+/// Whether an input is an npy file: by its name, or by its first byte, with which no text begins.
+bool isNpy(std::istream& stream, const std::string& file);
 
 /// Read the header of an npy file and leave the stream at the first element.
 ///

@@ -5,6 +5,7 @@
 #include <fmt/format.h>
 #include <unistd.h>
 
+#include <array>
 #include <filesystem>
 
 #include "open_file.hpp"
@@ -23,6 +24,13 @@ fs::path targetOf(const std::string& file) {
     return error ? fs::path(file) : target;
 }
 
+/// A name that no other process uses, not even one on another machine that sees the same directory.
+std::string temporaryName() {
+    std::array<char, 256> host{};
+    ::gethostname(host.data(), host.size() - 1);
+    return fmt::format(".quarzel-{}-{}.tmp", host.data(), ::getpid());
+}
+
 bool isWrittenDirectly(const fs::path& target) {
     std::error_code ignored;
     return fs::exists(target, ignored) && !fs::is_regular_file(target, ignored);
@@ -35,9 +43,8 @@ class OutputFile::Target {
   public:
     explicit Target(const std::string& shown)
         : itsTarget(targetOf(shown)),
-          itsTemporaryName(isWrittenDirectly(itsTarget)
-                               ? fs::path()
-                               : itsTarget.parent_path() / fmt::format(".quarzel-{}.tmp", ::getpid())),
+          itsTemporaryName(isWrittenDirectly(itsTarget) ? fs::path()
+                                                        : itsTarget.parent_path() / temporaryName()),
           itsShown(shown),
           itsFile(itsTemporaryName.empty() ? OpenFile(itsTarget.string(), 0, shown)
                                            : OpenFile(itsTemporaryName.string(), O_CREAT | O_EXCL, shown)) {}

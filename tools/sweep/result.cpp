@@ -9,8 +9,6 @@ namespace quarzel::sweep {
 
 namespace {
 
-constexpr int indent = 1;
-
 Json intervalJson(const Interval& interval) {
     return Json::array({interval.low, interval.high});
 }
@@ -85,11 +83,11 @@ std::string resultText(const Result& result) {
                                       {"iterations", curve.iterations},
                                       {"points", std::move(points)}});
     }
-    return textOf(std::move(document), indent);
+    return textOf(std::move(document), resultIndent);
 }
 
 Result readResult(std::string_view text) {
-    const Json document = readDocument(text, resultFormat, indent);
+    const Json document = readDocument(text, resultFormat, resultIndent);
     try {
         Result result{configurationFrom(document.at("configuration")), {}};
         for (const Json& curve : document.at("curves")) {

@@ -13,6 +13,9 @@ namespace quarzel::sweep {
 /// What a result file says it is.
 constexpr std::string_view resultFormat = "quarzel sweep result";
 
+/// Blanks that a level of it is indented by.
+constexpr int resultIndent = 1;
+
 /// What comes of a sweep. It depends on the configuration alone: not on threads, shards or interruptions.
 /// (With a time limit the clock decides how many blocks a point has.)
 struct Result {

@@ -45,7 +45,7 @@ std::vector<SweepCurve> readSweepCurves(const std::string& file) {
     std::ifstream stream = openInput(file);
     const std::string text(std::istreambuf_iterator<char>(stream), {});
     try {
-        const Json document = sweep::readDocument(text, sweep::resultFormat);
+        const Json document = sweep::readDocument(text, sweep::resultFormat, sweep::resultIndent);
         const Json& configuration = document.at("configuration");
         std::vector<SweepCurve> curves;
         for (const Json& json : document.at("curves")) {

@@ -43,10 +43,8 @@ Example:
 
 MemoryImage readActual(const std::string& file, const ExpectedDecisions& expected) {
     std::ifstream stream = openInput(file);
-    const bool isNpy =
-        file.ends_with(".npy") || stream.peek() == std::char_traits<char>::to_int_type(npyFirstByte);
-    return isNpy ? readMemoryNpy(stream, expected.bits.size(), expected.packedSize(), file)
-                 : readMemoryText(stream, expected.bits.size(), file);
+    return isNpy(stream, file) ? readMemoryNpy(stream, expected.bits.size(), expected.packedSize(), file)
+                               : readMemoryText(stream, expected.bits.size(), file);
 }
 
 ExitCode compare(const CompareOptions& options, std::ostream& results) {

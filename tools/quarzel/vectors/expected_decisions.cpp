@@ -163,7 +163,7 @@ ExpectedDecisions readExpected(const std::string& name) {
         return readCore(name);
     }
     std::ifstream stream = openInput(name);
-    if (name.ends_with(".npy") || stream.peek() == std::char_traits<char>::to_int_type(npyFirstByte)) {
+    if (isNpy(stream, name)) {
         return readPacked(stream, name);
     }
     if (fs::path(name).filename() != memoryFile(decisionMemory)) {
