@@ -59,6 +59,13 @@ PointState pointFrom(const Json& json) {
 
 }  // namespace
 
+std::string pointText(const Configuration& configuration, std::size_t number, const PointState& point) {
+    const std::size_t points = configuration.ebN0.size();
+    return pointJson(point, configuration.ebN0.at(number % points),
+                     configuration.curves().at(number / points), configuration.perIteration)
+        .dump();
+}
+
 std::string resultText(const Result& result) {
     const Configuration& configuration = result.configuration;
     Json document = newDocument(resultFormat);

@@ -26,6 +26,11 @@ struct Result {
 /// The result file.
 std::string resultText(const Result& result);
 
+/// A point as the result file tells it, a JSON object in one line.
+/// @param number  of the point, see Configuration::points
+/// @param point   has ended
+std::string pointText(const Configuration& configuration, std::size_t number, const PointState& point);
+
 /// Read a result file.
 /// @throws Error when it is not a whole, unaltered result of this version
 Result readResult(std::string_view text);

@@ -17,15 +17,19 @@ from ._core import version as __version__
 from .code import Segments, block_sizes, encode, qpp, segments
 from .decoder import Decoder, algorithms
 from .scoreboard import Mismatch, Scoreboard
+from .simulation import Curve, Point, SweepResult, sweep
 from .trace import BlockTrace, read_trace
 
 __all__ = [
     "BlockTrace",
+    "Curve",
     "Decoder",
     "Mismatch",
     "ModelWarning",
+    "Point",
     "Scoreboard",
     "Segments",
+    "SweepResult",
     "__version__",
     "algorithms",
     "block_sizes",
@@ -33,4 +37,5 @@ __all__ = [
     "qpp",
     "read_trace",
     "segments",
+    "sweep",
 ]

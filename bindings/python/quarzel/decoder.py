@@ -37,7 +37,7 @@ class Decoder:
         self, units: int = 2, algorithm: Union[str, int] = "scaled-max-log", tag_width: int = 8
     ) -> None:
         self._units = operator.index(units)
-        self._algorithm = _algorithm_number(algorithm)
+        self._algorithm = algorithm_number(algorithm)
         self._tag_width = operator.index(tag_width)
         self._core = _core.Core(self._units, self._algorithm, self._tag_width)
 
@@ -158,7 +158,11 @@ class Decoder:
         return f"Decoder(units={self.units}, algorithm={self.algorithm!r}, tag_width={self.tag_width})"
 
 
-def _algorithm_number(algorithm: Union[str, int]) -> int:
+def algorithm_number(algorithm: Union[str, int]) -> int:
+    """The number of an algorithm that is given by name or number; the model checks numbers.
+
+    :raises ValueError: there is none of that name
+    """
     if not isinstance(algorithm, str):
         return operator.index(algorithm)
     if algorithm not in algorithms:

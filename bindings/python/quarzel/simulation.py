@@ -1,0 +1,229 @@
+# SPDX-License-Identifier: MIT
+"""Links over Eb/N0: random bits, encoder, white Gaussian noise, quantiser, core, counting."""
+
+from __future__ import annotations
+
+import json
+import operator
+import os
+from dataclasses import dataclass, field
+from typing import Any, Callable, Iterable, Optional, Union
+
+import numpy as np
+from numpy.typing import ArrayLike, NDArray
+
+from .decoder import algorithm_number, algorithms
+
+
+@dataclass(frozen=True)
+class Point:
+    """What was counted at one Eb/N0."""
+
+    ebn0_db: float
+    blocks: int
+    bits: int
+    bit_errors: int
+    block_errors: int
+    bit_error_squares: int
+    """sum over the blocks of their squared bit errors"""
+    ber: float
+    bler: float
+    ber_interval: tuple[float, float]
+    """holds the true rate with a probability of 95 %"""
+    bler_interval: tuple[float, float]
+    stopped_by: str
+    """``"block errors"``, ``"blocks"`` or ``"time"``"""
+    per_iteration: Optional[list[dict[str, int]]] = None
+    """``bit_errors`` and ``block_errors`` after each iteration"""
+
+
+@dataclass(frozen=True)
+class Curve:
+    """The points of one core and block size."""
+
+    block_size: int
+    units: int
+    algorithm: str
+    iterations: int
+    points: list[Point] = field(default_factory=list)
+
+    @property
+    def ebn0_db(self) -> NDArray[np.float64]:
+        """Eb/N0 of the points, in dB."""
+        return np.array([point.ebn0_db for point in self.points])
+
+    @property
+    def ber(self) -> NDArray[np.float64]:
+        """Bit error rates of the points."""
+        return np.array([point.ber for point in self.points])
+
+    @property
+    def bler(self) -> NDArray[np.float64]:
+        """Block error rates of the points."""
+        return np.array([point.bler for point in self.points])
+
+    def __str__(self) -> str:
+        return f"K = {self.block_size}, {self.units} units, {self.algorithm}, {self.iterations} iterations"
+
+
+class SweepResult:
+    """The result of a sweep, as in the files of the tool: ``quarzel sweep``, ``plot`` and ``verify-result``."""
+
+    def __init__(self, text: str) -> None:
+        document = json.loads(text)
+        self.text = text
+        """the result file"""
+        self.configuration: dict[str, Any] = document["configuration"]
+        """what decides the result"""
+        self.curves: list[Curve] = [_curve(curve, curve["points"]) for curve in document["curves"]]
+        """a curve for each combination of block size, units, algorithm and iterations, in this order"""
+
+    @classmethod
+    def read(cls, path: Union[str, os.PathLike[str]]) -> SweepResult:
+        """Read a result file.
+
+        :raises ValueError: it is no whole, unaltered result
+        """
+        with open(path, encoding="utf-8", newline="") as file:
+            text = file.read()
+        _extension().check(text)
+        return cls(text)
+
+    def save(self, path: Union[str, os.PathLike[str]]) -> None:
+        """Write the result file; the tool writes the same bytes for the same configuration."""
+        with open(path, "w", encoding="utf-8", newline="") as file:
+            file.write(self.text)
+
+    def plot(self, axes: Any = None, rate: str = "bler") -> Any:
+        """Draw the curves with their 95 % intervals; points without an error are left out. Needs Matplotlib.
+
+        :param axes: Matplotlib axes to draw into; new ones when not given
+        :param rate: ``"bler"`` or ``"ber"``
+        :returns: the axes
+        """
+        if rate not in ("ber", "bler"):
+            raise ValueError(f"there is no rate {rate!r}; choose 'ber' or 'bler'")
+        if axes is None:
+            try:
+                import matplotlib.pyplot as plt
+            except ImportError as error:
+                raise ImportError("plot needs Matplotlib; install it, or use 'quarzel plot'") from error
+            axes = plt.figure(layout="constrained").add_subplot()
+        for curve in self.curves:
+            seen = [point for point in curve.points if getattr(point, rate) > 0]
+            rates = np.array([getattr(point, rate) for point in seen])
+            intervals = np.array([getattr(point, f"{rate}_interval") for point in seen]).reshape(-1, 2)
+            bars = np.abs(intervals - rates[:, None]).T
+            axes.errorbar([point.ebn0_db for point in seen], rates, bars, marker="o", capsize=2, label=str(curve))
+        axes.set_yscale("log")
+        axes.set(xlabel="Eb/N0 [dB]", ylabel="bit error rate" if rate == "ber" else "block error rate")
+        axes.grid(True, which="both", alpha=0.3)
+        axes.legend(fontsize="small")
+        return axes
+
+    def __repr__(self) -> str:
+        return f"<SweepResult: {len(self.curves)} curves of {len(self.configuration['ebn0_db'])} points>"
+
+
+def sweep(
+    ebn0_db: ArrayLike,
+    *,
+    block_size: Union[int, Iterable[int]] = 1024,
+    units: Union[int, Iterable[int]] = 2,
+    algorithm: Union[str, int, Iterable[Union[str, int]]] = "scaled-max-log",
+    iterations: Union[int, Iterable[int]] = 6,
+    llr: Optional[float] = None,
+    scale: Optional[float] = None,
+    seed: int = 1,
+    max_blocks: int = 10000,
+    max_block_errors: int = 100,
+    max_seconds: int = 0,
+    per_iteration: bool = False,
+    threads: Optional[int] = None,
+    on_point: Optional[Callable[[Curve, Point], None]] = None,
+) -> SweepResult:
+    """Simulate a link over Eb/N0. The same arguments give the same result, whatever the threads and the machine.
+
+    :param ebn0_db: Eb/N0 of an information bit at rate 1/3, one or many, in dB
+    :param block_size: K, one or many; likewise ``units``, ``algorithm`` and ``iterations``: every combination
+        gives a curve
+    :param llr: units for a log-likelihood ratio of 1; 8 when neither this nor ``scale`` is given
+    :param scale: units for the amplitude 1 that is sent, instead of ``llr``
+    :param max_blocks: a point ends after so many blocks,
+    :param max_block_errors: or with this block error (0: however many there are),
+    :param max_seconds: or after this time (0: however long it takes); the result then depends on the clock
+    :param per_iteration: count errors after every iteration; each takes its own decoding
+    :param threads: as many as the process may use when not given
+    :param on_point: called with a curve (without points) and a point of it when that has ended, in order; what
+        it raises ends the sweep
+    :raises ValueError: the sweep is not possible; the text says why
+    """
+    if llr is not None and scale is not None:
+        raise ValueError("llr and scale are two quantisers; give one of them")
+    count = len(os.sched_getaffinity(0)) if threads is None else operator.index(threads)
+    if count < 1:
+        raise ValueError(f"threads must be 1 or more, not {count}")
+    configuration = {
+        "seed": operator.index(seed),
+        "max_blocks": operator.index(max_blocks),
+        "max_block_errors": operator.index(max_block_errors),
+        "max_seconds": operator.index(max_seconds),
+        "per_iteration": bool(per_iteration),
+        "quantiser": {
+            "kind": "llr" if scale is None else "scale",
+            "scale": float(scale if scale is not None else llr if llr is not None else 8),
+        },
+        "block_size": [operator.index(value) for value in _listed(block_size)],
+        "units": [operator.index(value) for value in _listed(units)],
+        "algorithm": [algorithm_number(value) for value in _listed(algorithm)],
+        "iterations": [operator.index(value) for value in _listed(iterations)],
+        "ebn0_db": [round(float(value), 6) for value in np.asarray(ebn0_db, dtype=np.float64).reshape(-1)],
+    }
+    if not np.isfinite(configuration["ebn0_db"]).all():
+        raise ValueError("every Eb/N0 must be finite")
+    for name in ("seed", "max_blocks", "max_block_errors", "max_seconds"):
+        if not 0 <= configuration[name] < 2**64:
+            raise ValueError(f"{name} must be from 0 to 2^64 - 1, not {configuration[name]}")
+    heads = _heads(configuration)
+
+    def tell(curve: int, point: str) -> None:
+        assert on_point is not None
+        on_point(heads[curve], _point(json.loads(point)))
+
+    return SweepResult(_extension().run(json.dumps(configuration), count, tell if on_point else None))
+
+
+def _extension() -> Any:
+    try:
+        from . import _sweep
+    except ImportError as error:
+        raise ImportError(f"sweeps need libraries that are not installed ({error}); decoding does without") from error
+    return _sweep
+
+
+def _listed(values: Any) -> list[Any]:
+    return list(values) if isinstance(values, Iterable) and not isinstance(values, str) else [values]
+
+
+def _heads(configuration: dict[str, Any]) -> list[Curve]:
+    """The curves in the order of the engine, which checks the values later."""
+    names = dict(enumerate(algorithms))
+    return [
+        Curve(block_size, units, names.get(algorithm, str(algorithm)), iterations)
+        for block_size in configuration["block_size"]
+        for units in configuration["units"]
+        for algorithm in configuration["algorithm"]
+        for iterations in configuration["iterations"]
+    ]
+
+
+def _curve(head: dict[str, Any], points: list[dict[str, Any]]) -> Curve:
+    return Curve(
+        head["block_size"], head["units"], algorithms[head["algorithm"]], head["iterations"],
+        [_point(point) for point in points],
+    )  # fmt: skip
+
+
+def _point(values: dict[str, Any]) -> Point:
+    intervals = {name: tuple(values[name]) for name in ("ber_interval", "bler_interval")}
+    return Point(**{**values, **intervals})
