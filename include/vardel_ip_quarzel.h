@@ -14,7 +14,8 @@
  * Soft values. A soft value is a signed integer in units of 1/8, so 8 stands for 1.0. Its sign is the
  * decision: POSITIVE MEANS BIT 1, negative means bit 0. The core has 8-bit inputs, -128 to 127; what lies
  * outside is saturated, with one warning in the life of a state. The core neither knows nor needs the noise
- * variance: a log-likelihood ratio ln(P(1)/P(0)) times 8, or any other scale, may be given.
+ * variance: a log-likelihood ratio ln(P(1)/P(0)) times 8, or any other scale, may be given. Algorithm type 2
+ * does best with a log-likelihood ratio times 4.
  *
  * Code blocks. A code block of K information bits (188 sizes from 40 to 6144; 3GPP TS 36.212, Table 5.1.3-3)
  * comes as three streams of K + 4 soft values: systematic, parity of the first constituent code, parity of

@@ -26,7 +26,7 @@ struct Configuration {
     std::vector<int> algorithms = {1};
     std::vector<int> iterations = {6};
     std::vector<lte::Decibels> ebN0;  ///< of an information bit; the code rate is taken as 1/3
-    lte::Quantiser quantiser = {lte::Quantiser::Kind::llr, 8};
+    lte::Quantiser quantiser = {lte::Quantiser::Kind::llr, 4};
     std::uint64_t seed = 1;
     std::uint64_t maxBlocks = 10000;     ///< a point ends after so many blocks
     std::uint64_t maxBlockErrors = 100;  ///< or with this block error; 0: however many there are

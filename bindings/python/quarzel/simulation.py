@@ -147,7 +147,7 @@ def sweep(
     :param ebn0_db: Eb/N0 of an information bit at rate 1/3, one or many, in dB
     :param block_size: K, one or many; likewise ``units``, ``algorithm`` and ``iterations``: every combination
         gives a curve
-    :param llr: units for a log-likelihood ratio of 1; 8 when neither this nor ``scale`` is given
+    :param llr: units for a log-likelihood ratio of 1; 4 when neither this nor ``scale`` is given
     :param scale: units for the amplitude 1 that is sent, instead of ``llr``
     :param max_blocks: a point ends after so many blocks,
     :param max_block_errors: or with this block error (0: however many there are),
@@ -171,7 +171,7 @@ def sweep(
         "per_iteration": bool(per_iteration),
         "quantiser": {
             "kind": "llr" if scale is None else "scale",
-            "scale": float(scale if scale is not None else llr if llr is not None else 8),
+            "scale": float(scale if scale is not None else llr if llr is not None else 4),
         },
         "block_size": [operator.index(value) for value in _listed(block_size)],
         "units": [operator.index(value) for value in _listed(units)],

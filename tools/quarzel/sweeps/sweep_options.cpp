@@ -46,7 +46,7 @@ CLI::Validator atLeast(std::uint64_t least) {
 
 lte::Quantiser quantiserOf(const SweepOptions& options) {
     const bool isAmplitude = options.scale.has_value();
-    const double scale = isAmplitude ? *options.scale : options.llr.value_or(8);
+    const double scale = isAmplitude ? *options.scale : options.llr.value_or(4);
     if (!(scale > 0) || !(scale <= 1e6)) {
         throw ToolError(ExitCode::usage, isAmplitude ? "--scale" : "--llr",
                         fmt::format("{} is not above 0 and up to 1000000", scale), "give a number that is");
@@ -68,7 +68,7 @@ void addSweepOptions(CLI::App& command, SweepOptions& options) {
     add("--iterations", options.iterations, "LIST", "Iterations, 1 to 15 (default 6)");
     CLI::Option* const scale = add("--scale", options.scale, "S", "Soft value round(S y), y = +-1 + noise");
     add("--llr", options.llr, "S",
-        "Soft value round(S L), L the log-likelihood ratio\n2 y / sigma^2 (default, with S = 8)")
+        "Soft value round(S L), L the log-likelihood ratio\n2 y / sigma^2 (default, with S = 4)")
         ->excludes(scale);
     add("--seed", options.seed, "N", "Of bits and noise (default 1)")->transform(atLeast(0));
     command.add_flag("--per-iteration", options.perIteration, "Count errors after every iteration");

@@ -20,7 +20,7 @@ struct VectorRequest {
     std::size_t blocks = 0;  ///< of each stimulus
     bool cover = false;      ///< every block size once with each of its iterations in turn, and all stimuli
     lte::Decibels ebN0;      ///< of the noise
-    lte::Quantiser quantiser = {lte::Quantiser::Kind::llr, 8};
+    lte::Quantiser quantiser = {lte::Quantiser::Kind::llr, 4};
     std::uint64_t seed = 1;
 };
 
