@@ -1,12 +1,13 @@
 # SPDX-License-Identifier: MIT
 # The commands of the README. Each does its own set-up.
-.PHONY: help demo test bench format
+.PHONY: help demo test test-long bench format
 
 help:
-	@echo "make demo    install what is missing, build, and decode the captures that come with the project"
-	@echo "make test    install what is missing, build, and run every test, plain and with sanitizers"
-	@echo "make bench   build and run the benchmarks"
-	@echo "make format  format the sources"
+	@echo "make demo       install what is missing, build, and decode the captures that come with the project"
+	@echo "make test       install what is missing, build, and run every test, the library's with sanitizers, too"
+	@echo "make test-long  the checks that take an hour: the tool with sanitizers, 64-bit Arm, whole domains, the analyser"
+	@echo "make bench      build and run the benchmarks"
+	@echo "make format     format the sources"
 
 demo:
 	@scripts/install-packages.sh demo
@@ -19,6 +20,16 @@ test:
 	@ctest --preset release
 	@scripts/build.sh sanitize
 	@ctest --preset sanitize
+
+test-long:
+	@scripts/install-packages.sh long
+	@scripts/build.sh release
+	@tests/style/lint.sh . build/release --analyse
+	@QUARZEL_TEST_EXHAUSTIVE=1 ctest --preset release -R 'Lane|DecodeGrid|MaxStar|Wrap16'
+	@scripts/build.sh sanitize-tool
+	@ctest --preset sanitize-tool
+	@scripts/build.sh aarch64
+	@ctest --preset aarch64
 
 bench:
 	@scripts/install-packages.sh test
