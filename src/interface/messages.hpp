@@ -5,16 +5,16 @@
 
 #include "interface/soft_input.hpp"
 
-/// The lines of the model interface.
+/// The lines of the model interface. A line for which there is no memory is lost.
 namespace quarzel {
 
 /// "ERROR:decoder:" and the text, on the standard error stream.
-void decoderError(std::string_view text);
+void decoderError(std::string_view text) noexcept;
 
 /// The warning of the first saturated input, on the standard output stream.
-void warnSaturation(const Saturation& saturation);
+void warnSaturation(const Saturation& saturation) noexcept;
 
 /// The warning of the first truncated tag, on the standard output stream.
-void warnTagTruncation(int tagWidth);
+void warnTagTruncation(int tagWidth) noexcept;
 
 }  // namespace quarzel

@@ -14,6 +14,11 @@ namespace quarzel {
 
 namespace {
 
+/// A status that no call gives: the block has not been decided on yet.
+constexpr int pending = -1;
+
+constexpr const char* unhandledException = "Unhandled exception has occurred";
+
 /// The arrays of a batch.
 struct Batch {
     vardel_ip_quarzel_state* state;
@@ -131,7 +136,7 @@ class WaitingBlocks {
             if (status == 0) {
                 fillRecord(*itsBatch.state, itsBatch.outputs[index], itsBatch.inputs[index], size);
             } else {
-                decoderError("Unhandled exception has occurred");
+                decoderError(unhandledException);
             }
         }
     }
@@ -141,7 +146,7 @@ class WaitingBlocks {
     std::vector<LaneBlock> itsBlocks;
 };
 
-void simulateAll(const Batch& batch, int count) {
+void simulateEach(const Batch& batch, int count) {
     const bool together = !outputsOverlap(batch, count);
     WaitingBlocks waiting(batch);
     for (int i = 0; i < count; ++i) {
@@ -160,6 +165,20 @@ void simulateAll(const Batch& batch, int count) {
         }
     }
     waiting.decode();
+}
+
+/// The blocks that an exception leaves undecided get the status that a call for each would have given.
+void simulateAll(const Batch& batch, int count) {
+    try {
+        simulateEach(batch, count);
+    } catch (...) {
+        for (int i = 0; i < count; ++i) {
+            if (batch.statuses[i] == pending) {
+                batch.statuses[i] = 99;
+                decoderError(unhandledException);
+            }
+        }
+    }
 }
 
 }  // namespace
@@ -189,13 +208,20 @@ int vardel_ip_quarzel_bitacc_simulate_batch(vardel_ip_quarzel_state* state,
     if (inputs == nullptr) {
         return refuse("Simulate batch called with null input structures");
     }
-    std::vector<int> ownStatuses;
-    if (statuses == nullptr) {
-        ownStatuses.resize(static_cast<std::size_t>(count));
-        statuses = ownStatuses.data();
+    try {
+        std::vector<int> ownStatuses;
+        if (statuses == nullptr) {
+            ownStatuses.resize(static_cast<std::size_t>(count));
+            statuses = ownStatuses.data();
+        }
+        const std::span all(statuses, static_cast<std::size_t>(count));
+        std::fill(all.begin(), all.end(), quarzel::pending);
+        quarzel::simulateAll({state, outputs, inputs, statuses}, count);
+        const auto failed = std::find_if(all.begin(), all.end(), [](int status) { return status != 0; });
+        return failed == all.end() ? 0 : *failed;
+    } catch (...) {
+        // Out of memory for the statuses themselves: no block was looked at.
+        quarzel::decoderError(quarzel::unhandledException);
+        return 99;
     }
-    quarzel::simulateAll({state, outputs, inputs, statuses}, count);
-    const std::span all(statuses, static_cast<std::size_t>(count));
-    const auto failed = std::find_if(all.begin(), all.end(), [](int status) { return status != 0; });
-    return failed == all.end() ? 0 : *failed;
 }

@@ -9,4 +9,8 @@ namespace quarzel::test {
 /// new replaced by one that counts.
 std::size_t allocationCount();
 
+/// Let the allocation after the next `count` ones fail, and all later ones, until `allowAllocations`.
+void failAllocationsAfter(std::size_t count);
+void allowAllocations();
+
 }  // namespace quarzel::test
