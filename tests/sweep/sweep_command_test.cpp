@@ -13,7 +13,8 @@ namespace {
 
 const std::vector<std::string> quickSweep = {
     "sweep", "--block-size",       "40", "--iterations", "3", "--ebn0",      "0,1.5,20", "--max-blocks",
-    "301",   "--max-block-errors", "50", "--seed",       "7", "--algorithm", "0"};
+    "301",   "--max-block-errors", "50", "--seed",       "7", "--algorithm", "0",        "--llr",
+    "8"};
 
 std::vector<std::string> quickSweepWith(const std::vector<std::string>& more) {
     std::vector<std::string> arguments = quickSweep;
@@ -39,7 +40,7 @@ TEST(SweepCommand, PrintsErrorsAfterEveryIteration) {
     EXPECT_EQ(run.exitCode, 2) << "an option given twice";
     const ToolRun csv =
         runTool({"sweep", "--block-size", "40", "--iterations", "3", "--ebn0", "1.5", "--max-blocks", "301",
-                 "--seed", "7", "--algorithm", "0", "--per-iteration", "--csv"});
+                 "--llr", "8", "--seed", "7", "--algorithm", "0", "--per-iteration", "--csv"});
     EXPECT_EQ(
         csv.out,
         R"(block_size,units,algorithm,iterations,ebn0_db,iteration,blocks,bits,bit_errors,block_errors,ber,bler,ber_low,ber_high,bler_low,bler_high,stopped_by

@@ -68,7 +68,7 @@ TEST_F(PlotCommand, NamesTheCurvesInALegend) {
     ASSERT_EQ(plot({"-o", itsSvg, "--reference", "a & bound=" + reference}).exitCode, 0);
     const std::string svg = readFile(itsSvg);
     for (const char* const text :
-         {">max-log<", ">scaled max-log<", ">a &amp; bound<", ">K = 40, 2 units, 2 iterations, LLR \u00d7 8<",
+         {">max-log<", ">scaled max-log<", ">a &amp; bound<", ">K = 40, 2 units, 2 iterations, LLR \u00d7 4<",
           ">Bit error rate<", ">no error: 95 % upper bound<"}) {
         EXPECT_NE(svg.find(text), std::string::npos) << text;
     }
