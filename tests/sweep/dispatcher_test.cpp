@@ -77,7 +77,7 @@ void expectEqual(const sweep::PointState& point, const sweep::PointState& expect
 
 TEST(Dispatcher, EndsAPointWhereAPlainLoopDoesWhateverTheOrderAndTheShards) {
     std::mt19937 random = seededRandom();
-    for (int round = 0; round < 300; ++round) {
+    for (int round = 0; round < 100; ++round) {
         sweep::Configuration configuration;
         configuration.blockSizes = {1024};
         configuration.ebN0 = {{0}};

@@ -38,7 +38,7 @@ TEST(ErrorRates, LieNearIndependentFigures) {
         configuration.iterations = {8};
         configuration.quantiser = {lte::Quantiser::Kind::llr, 4};  // 4 L = 8 y / sigma^2
         configuration.ebN0 = {figure.ebN0};
-        configuration.maxBlocks = 480;
+        configuration.maxBlocks = 320;
         configuration.maxBlockErrors = 0;
         configuration.seed = seed;
         const sweep::PointState point = resultOf(configuration).points[0];

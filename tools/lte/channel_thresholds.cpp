@@ -25,6 +25,15 @@ class Number {
     mpfr_t itsValue;
 };
 
+/// Frees at its end the constants that the library keeps for each thread: threads come and go.
+class FreedCache {
+  public:
+    FreedCache() = default;
+    FreedCache(const FreedCache&) = delete;
+    FreedCache& operator=(const FreedCache&) = delete;
+    ~FreedCache() { mpfr_free_cache(); }
+};
+
 /// 1 / (2 R 10^(dB / 10)) = 1.5 * 10^(-micro / 10^7).
 void setNoiseVariance(Number& variance, Decibels ebN0) {
     mpfr_set_si(variance.get(), -ebN0.micro, MPFR_RNDN);
@@ -36,12 +45,14 @@ void setNoiseVariance(Number& variance, Decibels ebN0) {
 }  // namespace
 
 double noiseVariance(Decibels ebN0) {
+    const FreedCache freedCache;
     Number variance;
     setNoiseVariance(variance, ebN0);
     return mpfr_get_d(variance.get(), MPFR_RNDN);
 }
 
 ChannelThresholds channelThresholds(const Quantiser& quantiser, Decibels ebN0) {
+    const FreedCache freedCache;
     Number variance;
     setNoiseVariance(variance, ebN0);
     Number units(quantiser.scale);  // output units for an amplitude of 1
