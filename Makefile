@@ -23,6 +23,7 @@ test:
 
 test-long:
 	@scripts/install-packages.sh long
+	@scripts/build.sh bench
 	@scripts/build.sh release
 	@tests/style/lint.sh . build/release --analyse
 	@QUARZEL_TEST_EXHAUSTIVE=1 ctest --preset release -R 'Lane|DecodeGrid|MaxStar|Wrap16'
@@ -33,9 +34,10 @@ test-long:
 
 bench:
 	@scripts/install-packages.sh test
-	@scripts/build.sh release
+	@scripts/build.sh bench
 	build/release/bench/quarzel_bench --benchmark_out=build/release/bench.json --benchmark_out_format=json
 	build/release/bench/quarzel_sweep_bench
+	bench/bindings.sh
 
 format:
 	@scripts/install-packages.sh test
