@@ -2,6 +2,8 @@
 // One sweep, one result, byte for byte: whoever computes it.
 #include <gtest/gtest.h>
 
+#include <chrono>
+#include <filesystem>
 #include <fstream>
 #include <iterator>
 #include <random>
@@ -106,23 +108,31 @@ TEST(SameAnswer, ComesOutAfterAnyNumberOfInterruptions) {
     EXPECT_EQ(sweep::resultText({configuration, plan.start}), expected);
 }
 
+// Each kill comes at a random time within that of a whole run, during which it goes on from what the runs
+// before it have kept. When it is done before it is killed, it begins anew.
 TEST(SameAnswer, SurvivesTwentyKills) {
     std::mt19937 random = seededRandom();
     const TemporaryDirectory directory;
     const std::string file = directory.path("result.json");
+    const auto start = std::chrono::steady_clock::now();
     const std::string expected = runTool(with(longerSweep, {"--json"})).out;
+    const std::chrono::duration<double> wholeRun = std::chrono::steady_clock::now() - start;
+    const auto goOn = with(longerSweep, {"-o", file, "--checkpoint-every", "0", "--resume"});
     int kills = 0;
-    for (int round = 0; round < 20; ++round) {
-        const std::string seconds = std::to_string(0.02 + 0.0002 * static_cast<double>(random() % 1000));
-        const ToolRun run =
-            runTool(with({"-s", "KILL", seconds, QUARZEL_TOOL},
-                         with(longerSweep, {"-o", file, "--checkpoint-every", "0", "--resume"})),
-                    {.program = "/usr/bin/timeout"});
-        EXPECT_TRUE(run.exitCode == 0 || run.exitCode == -9 || run.exitCode == 137) << run.err;
-        kills += run.exitCode == 0 ? 0 : 1;
+    for (int round = 0; round < 200 && kills < 20; ++round) {
+        const double seconds = std::uniform_real_distribution<double>(0.001, wholeRun.count())(random);
+        const ToolRun run = runTool(with({"-s", "KILL", std::to_string(seconds), QUARZEL_TOOL}, goOn),
+                                    {.program = "/usr/bin/timeout"});
+        if (run.exitCode == 0) {
+            ASSERT_EQ(readFile(file), expected);
+            std::filesystem::remove(file);
+        } else {
+            ASSERT_TRUE(run.exitCode == -9 || run.exitCode == 137) << run.exitCode << ' ' << run.err;
+            ++kills;
+        }
     }
-    EXPECT_GT(kills, 0);
-    const ToolRun run = runTool(with(longerSweep, {"-o", file, "--resume", "--json"}));
+    EXPECT_EQ(kills, 20);
+    const ToolRun run = runTool(with(goOn, {"--json"}));
     EXPECT_EQ(run.err, "");
     EXPECT_EQ(run.out, expected);
     EXPECT_EQ(readFile(file), expected);
