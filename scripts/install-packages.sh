@@ -43,3 +43,9 @@ if ! install >"$log" 2>&1; then
     cat "$log" >&2
     exit 1
 fi
+# Headers of the system that were replaced keep the dates of their packages, which can be older than what was
+# precompiled from them.
+build=$(dirname "$0")/../build
+if [ -d "$build" ]; then
+    find "$build" \( -name '*.pch' -o -name '*.gch' \) -delete
+fi
