@@ -43,9 +43,8 @@ if ! install >"$log" 2>&1; then
     cat "$log" >&2
     exit 1
 fi
-# Headers of the system that were replaced keep the dates of their packages, which can be older than what was
-# precompiled from them.
+# Headers that were replaced keep the dates of their package, which can be older than what was precompiled from them.
 build=$(dirname "$0")/../build
-if [ -d "$build" ]; then
+if [ -d "$build" ] && grep -q '^The following packages will be upgraded' "$log"; then
     find "$build" \( -name '*.pch' -o -name '*.gch' \) -delete
 fi
