@@ -36,7 +36,7 @@ fi
 log=$(mktemp)
 trap 'rm -f "$log"' EXIT
 install() {
-    "${as_root[@]}" env DEBIAN_FRONTEND=noninteractive \
+    "${as_root[@]}" env DEBIAN_FRONTEND=noninteractive LC_ALL=C \
         sh -c 'apt-get update && apt-get install -y --no-install-recommends "$@"' sh "${missing[@]}"
 }
 if ! install >"$log" 2>&1; then
