@@ -49,7 +49,10 @@ class LaidOut {
 
   private:
     inline static LaneGroup kept;
-    static void keep(const LaneGroup& group) { kept = group; }
+    static bool keep(const LaneGroup& group) {
+        kept = group;
+        return false;
+    }
 
     lanes::LaneKernel itsKernel;
     lanes::Candidate itsCandidate;

@@ -24,6 +24,11 @@ void forEachWindow(const LaneGroup& group, Visit visit) {
     }
 }
 
+void readInputs(const LaneGroup& group) {
+    lanes::readInputs(group);
+    lanes::setStarts<true>(group);
+}
+
 template <int Algorithm>
 void forward(const LaneGroup& group) {
     using Decoder = lanes::GroupDecoder<width, false, Algorithm>;
@@ -49,7 +54,7 @@ void backward(const LaneGroup& group) {
 
 extern const LaneKernels QUARZEL_KERNELS;
 const LaneKernels QUARZEL_KERNELS = {width,
-                                     lanes::readInputs,
+                                     readInputs,
                                      {forward<0>, forward<1>, forward<2>},
                                      {backward<0>, backward<1>, backward<2>},
                                      lanes::writeDecisions};

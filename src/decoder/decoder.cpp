@@ -69,8 +69,10 @@ bool TDecoder::takesLanes(unsigned /*K*/) {
     return false;
 }
 
-void TDecoder::decodeLanes(unsigned /*K*/, unsigned /*iterations*/,
-                           std::span<const quarzel::LaneBlock> /*blocks*/) {}
+bool TDecoder::decodeLanes(unsigned /*K*/, unsigned /*iterations*/,
+                           std::span<const quarzel::LaneBlock> /*blocks*/) {
+    return false;
+}
 
 void TDecoder::dump(std::ostream& /*stream*/) {}
 

@@ -88,7 +88,8 @@ class TDecoder {
 
     /// Decode blocks of one size, for which `takesLanes` has just held, by the fast road.
     /// @param iterations  at least 1
-    virtual void decodeLanes(unsigned K, unsigned iterations, std::span<const quarzel::LaneBlock> blocks);
+    /// @return whether a soft value was saturated
+    virtual bool decodeLanes(unsigned K, unsigned iterations, std::span<const quarzel::LaneBlock> blocks);
 
     /// Hand the decoder its interleaver and engine. They are not owned and must outlive it.
     void connect(TInterleaver* interleaver, TCalculationEngine* engine) {

@@ -8,7 +8,7 @@
 
 #include "decoder/lane_decode.hpp"
 #include "decoder/segment_trace.hpp"
-#include "decoder/tail_metrics.hpp"
+#include "engine/tail_metrics.hpp"
 #include "fixed/text_output.hpp"
 #include "fixed/wrap16.hpp"
 
@@ -105,14 +105,16 @@ bool TDecoder3GPU::preCalcBeta(unsigned siso, unsigned step, T8* out) {
 
 bool TDecoder3GPU::preCalcBetaTail(unsigned siso, T8* out) const {
     const unsigned set = inputSet(siso);
-    quarzel::TailValues tail{};
+    quarzel::TailValues<std::int16_t> tail{};
     for (unsigned step = 0; step < tailSteps; ++step) {
         const unsigned at = itsBlockSize - tailSteps + step;
         tail.systematic[step] = itsSys[set][at];
         tail.parity0[step] = itsPar0[set][at];
         tail.parity1[step] = itsPar1[set][at];
     }
-    *out = quarzel::tailMetrics(tail);
+    T8 sums;
+    std::ranges::copy(quarzel::tailMetrics(tail), sums.element);
+    *out = toBoundary(sums);
     return true;
 }
 

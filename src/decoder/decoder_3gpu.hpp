@@ -53,7 +53,7 @@ class TDecoder3GPU : public TDecoder3G {
     void enableLanes(const quarzel::lanes::Candidate& candidate);
 
     bool takesLanes(unsigned K) override;
-    void decodeLanes(unsigned K, unsigned iterations, std::span<const quarzel::LaneBlock> blocks) override;
+    bool decodeLanes(unsigned K, unsigned iterations, std::span<const quarzel::LaneBlock> blocks) override;
 
     /// Blocks that the fast road decoded are decoded again first, as far as their metrics could show.
     bool extract(const std::vector<short>& soft) override;

@@ -56,12 +56,13 @@ bool TDecoder3GPU::takesLanes(unsigned K) {
            itsLanes->prepare(K, interleaver);
 }
 
-void TDecoder3GPU::decodeLanes(unsigned K, unsigned iterations, std::span<const LaneBlock> blocks) {
+bool TDecoder3GPU::decodeLanes(unsigned K, unsigned iterations, std::span<const LaneBlock> blocks) {
     growMetricStore(K + tailSteps);
     rememberLaneBlock(K);
-    itsLanes->decode(K, iterations, laneAlgorithm(), blocks);
+    const bool saturated = itsLanes->decode(K, iterations, laneAlgorithm(), blocks);
     itsDecodeCount += blocks.size();
     itsSISOCount += 2ULL * iterations * blocks.size();
+    return saturated;
 }
 
 /// Keep the last block of the fast road unless a block of `next` bits, which follows, covers it: it is

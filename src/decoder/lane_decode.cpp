@@ -5,8 +5,6 @@
 #include <memory>
 
 #include "decoder/segments.hpp"
-#include "decoder/tail_metrics.hpp"
-#include "fixed/soft_value.hpp"
 #include "interleaver/interleaver.hpp"
 
 namespace quarzel {
@@ -16,26 +14,16 @@ using lanes::octetLanes;
 
 namespace {
 
-/// What a lane without a block decodes: more zeros than a segment has steps.
+/// What a lane without a block decodes: as many zeros as a segment has steps and tail values, and more.
 constexpr int silence[1024] = {};
+
+/// Values of each stream after those of the steps.
+constexpr std::uint32_t tailValues = 4;
 
 constexpr std::size_t states = 8;
 
 /// Most segments that a block of up to 6144 bits is cut into.
 constexpr std::uint32_t mostSegments = 64;
-
-/// Calls `visit(octet, lane, segment)` for every lane of a block: the octet of its bundle, the lane there,
-/// and the thread segment in it.
-template <class Visit>
-void forEachSegment(const LaneLayout& layout, std::size_t index, Visit visit) {
-    for (std::uint32_t octet = 0; octet < layout.octets(); ++octet) {
-        for (std::uint32_t lane = 0; lane < octetLanes; ++lane) {
-            if (layout.blockOf(lane) == index % layout.blocksPerBundle()) {
-                visit(octet, lane, layout.segmentOf(octet, lane));
-            }
-        }
-    }
-}
 
 }  // namespace
 
@@ -45,7 +33,7 @@ bool LaneDecoder::prepare(std::uint32_t K, const TInterleaver& interleaver) {
     }
     const std::uint32_t segments = threadSegments(K, itsThreads);
     std::vector<std::uint32_t> permutation;
-    if (segments > mostSegments || K % segments != 0 || K / segments > std::size(silence) ||
+    if (segments > mostSegments || K % segments != 0 || K / segments + tailValues > std::size(silence) ||
         !interleaver.calcInterleaver(permutation, K)) {
         return false;
     }
@@ -73,16 +61,18 @@ LaneDecoder::Plan LaneDecoder::plan(const LaneLayout& layout, std::size_t blocks
     return best;
 }
 
-void LaneDecoder::decode(std::uint32_t K, unsigned iterations, int algorithm,
+bool LaneDecoder::decode(std::uint32_t K, unsigned iterations, int algorithm,
                          std::span<const LaneBlock> blocks) {
     const LaneLayout& layout = itsLayouts.at(K);
+    bool saturated = false;
     while (!blocks.empty()) {
         const Plan group = plan(layout, blocks.size());
         const std::size_t count =
             std::min<std::size_t>(blocks.size(), std::size_t{group.bundles} * layout.blocksPerBundle());
-        decodeGroup(layout, group, iterations, algorithm, blocks.first(count));
+        saturated |= decodeGroup(layout, group, iterations, algorithm, blocks.first(count));
         blocks = blocks.subspan(count);
     }
+    return saturated;
 }
 
 /// Give a group its parts of the store, each on a cache line of its own.
@@ -99,6 +89,7 @@ void LaneDecoder::shareStore(const LaneLayout& layout, const Plan& plan, LaneGro
         {&group.systematic, layout.steps * row},
         {&group.parity[0], layout.steps * row},
         {&group.parity[1], layout.steps * row},
+        {&group.tail, lanes::tailOctets * octetLanes * plan.bundles},
         {&group.channel, layout.steps * row},
         {&group.extrinsic, layout.steps * row},
         {&group.alphaState, 2 * states * row},
@@ -124,56 +115,25 @@ void LaneDecoder::shareStore(const LaneLayout& layout, const Plan& plan, LaneGro
         *part = next;
         next += rounded(words);
     }
-    for (std::size_t code = 0; code < 2; ++code) {
-        std::fill_n(group.alphaStart[code], states * row, std::int16_t{0});
-        std::fill_n(group.betaStart[code], betaRows * row, std::int16_t{0});
-    }
 }
 
-/// Point the lanes of a block to its values, and set the starts that are known: the first forward one, and
-/// the last backward one, which the tails give.
+/// Point the lanes of a block to its values.
 void LaneDecoder::placeBlock(const LaneLayout& layout, const LaneBlock& block, std::size_t index,
-                             LaneGroup& group) {
-    const TNumberFormat input(8, 3);
-    const TNumberFormat state(12, 3);
+                             const LaneGroup& group) {
     const std::size_t bundle = index / layout.blocksPerBundle();
     const std::size_t row = octetLanes * group.octets * group.bundles;
-    // The twelve tail values follow each other across the three streams.
-    for (std::size_t number = 0; number < 12; ++number) {
-        int saturated = 0;
-        itsLast.tail[number] =
-            toSoftValue(block.streams[number % 3][layout.K + number / 3], input, state, saturated);
-    }
-    forEachSegment(layout, index, [&](std::size_t octet, std::size_t lane, std::size_t segment) {
+    std::size_t position = 0;
+    layout.forEachSegment(index, [&](std::size_t octet, std::size_t lane) {
         const std::size_t at = (octet * group.bundles + bundle) * octetLanes + lane;
         for (std::size_t stream = 0; stream < 3; ++stream) {
-            itsInputs[stream * row + at] = block.streams[stream] + segment * layout.steps;
+            itsInputs[stream * row + at] = block.streams[stream] + position;
         }
-        itsOutputs[at] = block.bits + segment * layout.steps;
-        for (std::size_t code = 0; code < 2; ++code) {
-            if (segment == 0) {
-                for (std::size_t s = 1; s < states; ++s) {
-                    group.alphaStart[code][s * row + at] = static_cast<std::int16_t>(state.min / 2);
-                }
-            }
-            if (segment + 1 == layout.segments) {
-                TailValues tail{};
-                for (std::size_t step = 0; step < 3; ++step) {
-                    tail.systematic[step] = itsLast.tail[6 * code + 2 * step];
-                    tail.parity0[step] = itsLast.tail[6 * code + 2 * step + 1];
-                }
-                const T8 metrics = tailMetrics(tail);
-                const std::int16_t top = *std::max_element(metrics.element, metrics.element + states);
-                std::int16_t* const last = group.betaStart[code] + (group.windows - 1) * states * row;
-                for (std::size_t s = 0; s < states; ++s) {
-                    last[s * row + at] = sub(metrics[s], top);
-                }
-            }
-        }
+        itsOutputs[at] = block.bits + position;
+        position += layout.steps;
     });
 }
 
-void LaneDecoder::decodeGroup(const LaneLayout& layout, const Plan& plan, unsigned iterations, int algorithm,
+bool LaneDecoder::decodeGroup(const LaneLayout& layout, const Plan& plan, unsigned iterations, int algorithm,
                               std::span<const LaneBlock> blocks) {
     LaneGroup group{};
     group.steps = layout.steps;
@@ -200,7 +160,8 @@ void LaneDecoder::decodeGroup(const LaneLayout& layout, const Plan& plan, unsign
     }
     group.inputs = itsInputs.data();
     group.outputs = itsOutputs.data();
-    (plan.acrossOctets ? plan.kernel->acrossOctets : plan.kernel->acrossBundles)[algorithm](group);
+    const auto& kernels = plan.acrossOctets ? plan.kernel->acrossOctets : plan.kernel->acrossBundles;
+    const bool saturated = kernels[algorithm](group);
 
     itsLast.K = layout.K;
     itsLast.iterations = iterations;
@@ -209,24 +170,30 @@ void LaneDecoder::decodeGroup(const LaneLayout& layout, const Plan& plan, unsign
     itsRows[0] = group.systematic;
     itsRows[1] = group.parity[0];
     itsRows[2] = group.parity[1];
+    itsTail = group.tail;
+    return saturated;
 }
 
 void LaneDecoder::readLast(std::vector<std::int8_t>& soft) const {
     const LaneLayout& layout = itsLayouts.at(itsLast.K);
+    const std::size_t bundle = itsLast.index / layout.blocksPerBundle();
     const std::size_t row = octetLanes * layout.octets() * itsLast.bundles;
-    const auto value = [](std::int16_t word) { return static_cast<std::int8_t>(word >> 4); };
-    soft.resize(3 * std::size_t{layout.K} + std::size(itsLast.tail));
-    forEachSegment(layout, itsLast.index, [&](std::size_t octet, std::size_t lane, std::size_t segment) {
-        const std::size_t bundle = itsLast.index / layout.blocksPerBundle();
+    const auto append = [&soft](std::int16_t word) { soft.push_back(static_cast<std::int8_t>(word >> 4)); };
+    soft.clear();
+    soft.reserve(3 * std::size_t{layout.K} + lanes::tailOctets);
+    std::size_t lastLane = 0;
+    layout.forEachSegment(itsLast.index, [&](std::size_t octet, std::size_t lane) {
         const std::size_t at = (octet * itsLast.bundles + bundle) * octetLanes + lane;
         for (std::size_t t = 0; t < layout.steps; ++t) {
-            for (std::size_t stream = 0; stream < 3; ++stream) {
-                soft[3 * (segment * layout.steps + t) + stream] = value(itsRows[stream][t * row + at]);
+            for (const std::int16_t* stream : itsRows) {
+                append(stream[t * row + at]);
             }
         }
+        lastLane = lane;
     });
-    std::transform(std::begin(itsLast.tail), std::end(itsLast.tail), soft.end() - std::ssize(itsLast.tail),
-                   value);
+    for (std::size_t number = 0; number < lanes::tailOctets; ++number) {
+        append(itsTail[(bundle * lanes::tailOctets + number) * octetLanes + lastLane]);
+    }
 }
 
 }  // namespace quarzel

@@ -35,7 +35,8 @@ class LaneDecoder {
 
     /// Decode blocks of a size that `prepare` took.
     /// @param algorithm  0 max-log, 1 max-log with scaled extrinsics, 2 max-star with the 16-point table
-    void decode(std::uint32_t K, unsigned iterations, int algorithm, std::span<const LaneBlock> blocks);
+    /// @return whether a soft value was saturated
+    bool decode(std::uint32_t K, unsigned iterations, int algorithm, std::span<const LaneBlock> blocks);
 
     /// Size of the last block decoded, 0 before the first, and its iterations.
     std::uint32_t lastSize() const { return itsLast.K; }
@@ -57,14 +58,13 @@ class LaneDecoder {
         unsigned iterations = 0;
         std::size_t bundles = 0;
         std::size_t index = 0;  ///< in its group
-        std::int16_t tail[12] = {};
     };
 
     Plan plan(const LaneLayout& layout, std::size_t blocks) const;
     void shareStore(const LaneLayout& layout, const Plan& plan, lanes::LaneGroup& group);
     void placeBlock(const LaneLayout& layout, const LaneBlock& block, std::size_t index,
-                    lanes::LaneGroup& group);
-    void decodeGroup(const LaneLayout& layout, const Plan& plan, unsigned iterations, int algorithm,
+                    const lanes::LaneGroup& group);
+    bool decodeGroup(const LaneLayout& layout, const Plan& plan, unsigned iterations, int algorithm,
                      std::span<const LaneBlock> blocks);
 
     std::uint32_t itsThreads;
@@ -72,7 +72,8 @@ class LaneDecoder {
     ShuffleSet itsShuffles;
     std::map<std::uint32_t, LaneLayout> itsLayouts;
     std::vector<std::int16_t> itsStore;
-    std::int16_t* itsRows[3] = {};  ///< the soft inputs of the last group, inside the store
+    const std::int16_t* itsRows[3] = {};    ///< the soft inputs of the last group, inside the store
+    const std::int16_t* itsTail = nullptr;  ///< its tail octets
     std::vector<const int*> itsInputs;
     std::vector<unsigned char*> itsOutputs;
     Last itsLast;

@@ -45,6 +45,19 @@ struct LaneLayout {
         return segments >= octetLanes ? lane * octets() + octet : lane % segments;
     }
     std::uint32_t blockOf(std::uint32_t lane) const { return segments >= octetLanes ? 0 : lane / segments; }
+
+    /// Call `visit(octet, lane)` for the segments of a block, in their order.
+    /// @param index  of the block in its group
+    template <class Visit>
+    void forEachSegment(std::size_t index, Visit visit) const {
+        const std::size_t first = index % blocksPerBundle() * segments;
+        const std::size_t lanes = segments / octets();
+        for (std::size_t lane = first; lane < first + lanes; ++lane) {
+            for (std::size_t octet = 0; octet < octets(); ++octet) {
+                visit(octet, lane);
+            }
+        }
+    }
 };
 
 /// Lay out a block size.

@@ -27,6 +27,9 @@ inline LaneBlock laneBlock(const vardel_ip_quarzel_outputs& outputs, const varde
     return {{inputs.rsc1_sys, inputs.rsc1_par, inputs.rsc2_par}, outputs.dout};
 }
 
+/// Whether this tag is the first truncated one in the life of a state.
+bool truncates(const vardel_ip_quarzel_state& state, const vardel_ip_quarzel_inputs& inputs);
+
 /// Warn of the first truncated tag in the life of a state.
 void reportTruncation(vardel_ip_quarzel_state& state, const vardel_ip_quarzel_inputs& inputs);
 

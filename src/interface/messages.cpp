@@ -26,6 +26,11 @@ void decoderError(std::string_view text) noexcept {
     write(errorLine, [text] { return "ERROR:decoder:" + std::string(text); });
 }
 
+int unhandledException() noexcept {
+    decoderError("Unhandled exception has occurred");
+    return 99;
+}
+
 void warnSaturation(const Saturation& saturation) noexcept {
     static constexpr const char* streams[] = {"RSC1 systematic", "RSC1 parity", "RSC2 parity"};
     write(outputLine, [&saturation] {

@@ -11,6 +11,10 @@ namespace quarzel {
 /// "ERROR:decoder:" and the text, on the standard error stream.
 void decoderError(std::string_view text) noexcept;
 
+/// The error of a call that ended by an exception, such as a lack of memory.
+/// @return its status
+int unhandledException() noexcept;
+
 /// The warning of the first saturated input, on the standard output stream.
 void warnSaturation(const Saturation& saturation) noexcept;
 

@@ -5,6 +5,7 @@
 #include "decoder/decoder.hpp"
 #include "interface/block_call.hpp"
 #include "interface/messages.hpp"
+#include "interface/overlap.hpp"
 #include "interface/soft_input.hpp"
 
 namespace quarzel {
@@ -63,8 +64,12 @@ bool takesLanes(vardel_ip_quarzel_state& state, const vardel_ip_quarzel_outputs&
            state.decoder->takesLanes(blockSize(inputs));
 }
 
+bool truncates(const vardel_ip_quarzel_state& state, const vardel_ip_quarzel_inputs& inputs) {
+    return (inputs.tag & state.tag_mask) != inputs.tag && state.tag_truncation_reported == 0;
+}
+
 void reportTruncation(vardel_ip_quarzel_state& state, const vardel_ip_quarzel_inputs& inputs) {
-    if ((inputs.tag & state.tag_mask) != inputs.tag && state.tag_truncation_reported == 0) {
+    if (truncates(state, inputs)) {
         warnTagTruncation(state.generics.C_TAG_WIDTH);
         state.tag_truncation_reported = 1;
     }
@@ -82,16 +87,12 @@ namespace {
 /// @return the status; the outputs are filled when it is 0
 int decodeLiterally(vardel_ip_quarzel_state& state, vardel_ip_quarzel_outputs& outputs,
                     const vardel_ip_quarzel_inputs& inputs) {
+    reportSaturation(state, inputs);
     std::vector<short> soft;
     toSoftValues(inputs, *state.input_format, *state.state_format, soft);
     std::vector<unsigned char> hard;
-    try {
-        if (!state.decoder->decode(soft, hard, static_cast<unsigned>(inputs.iterations))) {
-            return 2;
-        }
-    } catch (...) {
-        decoderError("Unhandled exception has occurred");
-        return 99;
+    if (!state.decoder->decode(soft, hard, static_cast<unsigned>(inputs.iterations))) {
+        return 2;
     }
     if (!hasRoom(outputs, hard.size())) {
         decoderError("Insufficient allocated space for output array");
@@ -102,17 +103,35 @@ int decodeLiterally(vardel_ip_quarzel_state& state, vardel_ip_quarzel_outputs& o
     return 0;
 }
 
-/// Decode a block by the fast road.
-/// @return whether it was taken
-bool decodeInLanes(vardel_ip_quarzel_state& state, vardel_ip_quarzel_outputs& outputs,
+/// Decode a block that the fast road takes. It finds out whether a value was saturated while it decodes; the
+/// value is looked for when one was.
+void decodeInLanes(vardel_ip_quarzel_state& state, vardel_ip_quarzel_outputs& outputs,
                    const vardel_ip_quarzel_inputs& inputs) {
-    if (!takesLanes(state, outputs, inputs)) {
-        return false;
+    if (overwritesInputs(outputs, inputs)) {
+        reportSaturation(state, inputs);
     }
     const LaneBlock block = laneBlock(outputs, inputs);
-    state.decoder->decodeLanes(blockSize(inputs), static_cast<unsigned>(inputs.iterations), {&block, 1});
+    if (state.decoder->decodeLanes(blockSize(inputs), static_cast<unsigned>(inputs.iterations),
+                                   {&block, 1})) {
+        reportSaturation(state, inputs);
+    }
     fillRecord(state, outputs, inputs, blockSize(inputs));
-    return true;
+}
+
+/// Decode a block without a fault.
+/// @return the status
+int decode(vardel_ip_quarzel_state& state, vardel_ip_quarzel_outputs& outputs,
+           const vardel_ip_quarzel_inputs& inputs) {
+    try {
+        if (takesLanes(state, outputs, inputs)) {
+            decodeInLanes(state, outputs, inputs);
+            return 0;
+        }
+        return decodeLiterally(state, outputs, inputs);
+    } catch (...) {
+        reportSaturation(state, inputs);
+        return unhandledException();
+    }
 }
 
 }  // namespace
@@ -125,19 +144,9 @@ int vardel_ip_quarzel_bitacc_simulate(vardel_ip_quarzel_state* state, vardel_ip_
         quarzel::decoderError(fault);
         return 1;
     }
-    quarzel::reportSaturation(*state, inputs);
-    bool decoded = false;
-    try {
-        decoded = quarzel::decodeInLanes(*state, *outputs, inputs);
-    } catch (...) {
-        quarzel::decoderError("Unhandled exception has occurred");
-        return 99;
+    const int status = quarzel::decode(*state, *outputs, inputs);
+    if (status == 0) {
+        quarzel::reportTruncation(*state, inputs);
     }
-    if (!decoded) {
-        if (const int status = quarzel::decodeLiterally(*state, *outputs, inputs)) {
-            return status;
-        }
-    }
-    quarzel::reportTruncation(*state, inputs);
-    return 0;
+    return status;
 }

@@ -1,14 +1,13 @@
 // SPDX-License-Identifier: MIT
 #include <algorithm>
-#include <cstdint>
-#include <map>
+#include <compare>
 #include <span>
-#include <utility>
 #include <vector>
 
 #include "decoder/decoder.hpp"
 #include "interface/block_call.hpp"
 #include "interface/messages.hpp"
+#include "interface/overlap.hpp"
 
 namespace quarzel {
 
@@ -16,8 +15,6 @@ namespace {
 
 /// A status that no call gives: the block has not been decided on yet.
 constexpr int pending = -1;
-
-constexpr const char* unhandledException = "Unhandled exception has occurred";
 
 /// The arrays of a batch.
 struct Batch {
@@ -27,155 +24,121 @@ struct Batch {
     int* statuses;
 };
 
-/// Bytes of the caller's, by their addresses.
-struct Range {
-    std::uintptr_t first = 0;
-    std::uintptr_t end = 0;
-    bool written = false;
-
-    Range(const void* start, std::size_t bytes, bool isWritten)
-        : first(reinterpret_cast<std::uintptr_t>(start)), end(first + bytes), written(isWritten) {}
-
-    bool empty() const { return first == 0 || first == end; }
-};
-
-/// Call `visit` for the arrays of every block.
-template <class Visit>
-void forEachRange(const Batch& batch, int count, Visit visit) {
-    for (int i = 0; i < count; ++i) {
-        const auto& in = batch.inputs[i];
-        const auto size = static_cast<std::size_t>(std::max(in.din_size, 0));
-        for (const int* stream : {in.rsc1_sys, in.rsc1_par, in.rsc2_par}) {
-            visit(Range(stream, size * sizeof(int), false));
-        }
-        // A block has 4 decisions fewer than soft values.
-        visit(Range(batch.outputs[i].dout, size > 4 ? size - 4 : 0, true));
-    }
-}
-
-/// Whether a buffer for decisions shares bytes with anything else of the batch. Then the order of the writes
-/// shows, and the blocks have to be decoded one after the other.
-bool outputsOverlap(const Batch& batch, int count) {
-    // Most callers keep decisions and soft values apart, and the buffers in their order.
-    std::uintptr_t readFirst = UINTPTR_MAX;
-    std::uintptr_t readEnd = 0;
-    std::uintptr_t writtenFirst = UINTPTR_MAX;
-    std::uintptr_t writtenEnd = 0;
-    bool ascending = true;
-    forEachRange(batch, count, [&](const Range& range) {
-        if (range.empty()) {
-            return;
-        }
-        ascending = ascending && (!range.written || range.first >= writtenEnd);
-        std::uintptr_t& first = range.written ? writtenFirst : readFirst;
-        std::uintptr_t& end = range.written ? writtenEnd : readEnd;
-        first = std::min(first, range.first);
-        end = std::max(end, range.end);
-    });
-    if (ascending && (readEnd <= writtenFirst || writtenEnd <= readFirst)) {
-        return false;
-    }
-    std::vector<Range> ranges;
-    forEachRange(batch, count, [&](const Range& range) {
-        if (!range.empty()) {
-            ranges.push_back(range);
-        }
-    });
-    std::sort(ranges.begin(), ranges.end(), [](const Range& x, const Range& y) { return x.first < y.first; });
-    readEnd = writtenEnd = 0;
-    return std::any_of(ranges.begin(), ranges.end(), [&](const Range& range) {
-        const bool overlaps = range.first < writtenEnd || (range.written && range.first < readEnd);
-        std::uintptr_t& end = range.written ? writtenEnd : readEnd;
-        end = std::max(end, range.end);
-        return overlaps;
-    });
-}
-
 /// Blocks that wait for others of their size, to be decoded together.
 class WaitingBlocks {
   public:
-    explicit WaitingBlocks(const Batch& batch) : itsBatch(batch) {}
+    WaitingBlocks(const Batch& batch, int count) : itsBatch(batch) {
+        itsWaiting.reserve(static_cast<std::size_t>(count));
+    }
 
     void add(int index) {
         const vardel_ip_quarzel_inputs& in = itsBatch.inputs[index];
-        itsClasses[{blockSize(in), in.iterations}].push_back(index);
+        itsWaiting.push_back({blockSize(in), in.iterations, index});
+    }
+
+    /// Look for saturated values now, because something else is about to be said.
+    void reportSaturation() const {
+        for (const Block& block : itsWaiting) {
+            quarzel::reportSaturation(*itsBatch.state, itsBatch.inputs[block.index]);
+        }
     }
 
     /// Decode all that wait. Sizes are taken in the order of their last blocks, so that what the decoder
     /// keeps of the blocks is what the order of the calls would have left.
     void decode() {
-        std::vector<const Class*> order;
-        for (const Class& blocks : itsClasses) {
-            order.push_back(&blocks);
-        }
-        std::sort(order.begin(), order.end(),
-                  [](const Class* x, const Class* y) { return x->second.back() < y->second.back(); });
-        for (const Class* blocks : order) {
-            decode(*blocks);
+        itsSorted = itsWaiting;
+        if (!std::is_sorted(itsSorted.begin(), itsSorted.end())) {
+            std::sort(itsSorted.begin(), itsSorted.end());
         }
         itsClasses.clear();
+        for (auto first = itsSorted.begin(); first != itsSorted.end();) {
+            const auto end = std::find_if(first, itsSorted.end(),
+                                          [first](const Block& block) { return !block.isLike(*first); });
+            itsClasses.emplace_back(first, end);
+            first = end;
+        }
+        std::sort(itsClasses.begin(), itsClasses.end(),
+                  [](const auto& x, const auto& y) { return x.back().index < y.back().index; });
+        bool saturated = false;
+        for (const std::span<const Block>& blocks : itsClasses) {
+            saturated |= decode(blocks);
+        }
+        if (saturated) {
+            reportSaturation();
+        }
+        itsWaiting.clear();
     }
 
   private:
-    using Class = std::pair<const std::pair<unsigned, int>, std::vector<int>>;
+    struct Block {
+        unsigned size;
+        int iterations;
+        int index;
 
-    void decode(const Class& blocks) {
-        const auto& [size, iterations] = blocks.first;
-        itsBlocks.clear();
-        for (const int index : blocks.second) {
-            itsBlocks.push_back(laneBlock(itsBatch.outputs[index], itsBatch.inputs[index]));
+        auto operator<=>(const Block&) const = default;
+        bool isLike(const Block& other) const { return size == other.size && iterations == other.iterations; }
+    };
+
+    bool decode(std::span<const Block> blocks) {
+        itsLaneBlocks.clear();
+        for (const Block& block : blocks) {
+            itsLaneBlocks.push_back(laneBlock(itsBatch.outputs[block.index], itsBatch.inputs[block.index]));
         }
-        int status = 0;
-        try {
-            itsBatch.state->decoder->decodeLanes(size, static_cast<unsigned>(iterations), itsBlocks);
-        } catch (...) {
-            status = 99;
+        const auto [size, iterations, first] = blocks.front();
+        const bool saturated =
+            itsBatch.state->decoder->decodeLanes(size, static_cast<unsigned>(iterations), itsLaneBlocks);
+        for (const Block& block : blocks) {
+            itsBatch.statuses[block.index] = 0;
+            fillRecord(*itsBatch.state, itsBatch.outputs[block.index], itsBatch.inputs[block.index], size);
         }
-        for (const int index : blocks.second) {
-            itsBatch.statuses[index] = status;
-            if (status == 0) {
-                fillRecord(*itsBatch.state, itsBatch.outputs[index], itsBatch.inputs[index], size);
-            } else {
-                decoderError(unhandledException);
-            }
-        }
+        return saturated;
     }
 
     const Batch& itsBatch;
-    std::map<std::pair<unsigned, int>, std::vector<int>> itsClasses;
-    std::vector<LaneBlock> itsBlocks;
+    std::vector<Block> itsWaiting;  ///< in the order of the calls
+    std::vector<Block> itsSorted;
+    std::vector<std::span<const Block>> itsClasses;
+    std::vector<LaneBlock> itsLaneBlocks;
 };
 
+int simulateOne(const Batch& batch, int index) {
+    return vardel_ip_quarzel_bitacc_simulate(batch.state, &batch.outputs[index], batch.inputs[index]);
+}
+
+/// Every message comes where the calls would have given it: before one, the saturation that blocks before it
+/// would have told is told.
 void simulateEach(const Batch& batch, int count) {
-    const bool together = !outputsOverlap(batch, count);
-    WaitingBlocks waiting(batch);
+    const bool together = !outputsOverlap(batch.outputs, batch.inputs, count);
+    WaitingBlocks waiting(batch, count);
     for (int i = 0; i < count; ++i) {
         const vardel_ip_quarzel_inputs& in = batch.inputs[i];
-        if (const char* fault = findFault(batch.state, &batch.outputs[i], in)) {
-            decoderError(fault);
-            batch.statuses[i] = 1;
+        if (findFault(batch.state, &batch.outputs[i], in) != nullptr) {
+            waiting.reportSaturation();
+            batch.statuses[i] = simulateOne(batch, i);
         } else if (together && takesLanes(*batch.state, batch.outputs[i], in)) {
-            // Everything that a block says, it says here, in the order of the calls.
-            reportSaturation(*batch.state, in);
-            reportTruncation(*batch.state, in);
             waiting.add(i);
+            if (truncates(*batch.state, in)) {
+                waiting.reportSaturation();
+                reportTruncation(*batch.state, in);
+            }
         } else {
             waiting.decode();
-            batch.statuses[i] = vardel_ip_quarzel_bitacc_simulate(batch.state, &batch.outputs[i], in);
+            batch.statuses[i] = simulateOne(batch, i);
         }
     }
     waiting.decode();
 }
 
-/// The blocks that an exception leaves undecided get the status that a call for each would have given.
+/// Where there is no memory for decoding together, what is left is decoded block by block.
 void simulateAll(const Batch& batch, int count) {
     try {
         simulateEach(batch, count);
     } catch (...) {
         for (int i = 0; i < count; ++i) {
             if (batch.statuses[i] == pending) {
-                batch.statuses[i] = 99;
-                decoderError(unhandledException);
+                batch.statuses[i] = simulateOne(batch, i);
+            } else if (batch.statuses[i] == 0) {
+                reportSaturation(*batch.state, batch.inputs[i]);
             }
         }
     }
@@ -221,7 +184,7 @@ int vardel_ip_quarzel_bitacc_simulate_batch(vardel_ip_quarzel_state* state,
         return failed == all.end() ? 0 : *failed;
     } catch (...) {
         // Out of memory for the statuses themselves: no block was looked at.
-        quarzel::decoderError(quarzel::unhandledException);
+        quarzel::unhandledException();
         return 99;
     }
 }

@@ -3,7 +3,9 @@
 #include <gtest/gtest.h>
 
 #include <algorithm>
+#include <memory>
 #include <string>
+#include <utility>
 #include <vector>
 
 #include "engine/engine_mod_base.hpp"
@@ -127,16 +129,40 @@ TEST(LaneArithmetic, SoftInputsAreConvertedAsInTheLiteralRoadForEveryInteger) {
     forEachProbe([&](const LaneProbe& probe) {
         std::vector<int> values(chunk);
         Words converted(chunk);
+        const auto saturated = std::make_unique<bool[]>(chunk / 8);
         for (std::uint64_t high = 0; high < 65536; high += exhaustive() ? 1 : 61) {
             for (std::uint64_t low = 0; low < chunk; ++low) {
                 values[low] = static_cast<int>(static_cast<std::uint32_t>(high * chunk + low));
             }
-            probe.toWords(values.data(), converted.data(), chunk);
+            probe.toWords(values.data(), converted.data(), saturated.get(), chunk);
+            bool anyOfEight = false;
             for (std::uint64_t low = 0; low < chunk; ++low) {
-                int saturated = 0;
-                if (converted[low] != toSoftValue(values[low], input, state, saturated)) {
+                int how = 0;
+                if (converted[low] != toSoftValue(values[low], input, state, how)) {
                     FAIL() << values[low];
                 }
+                anyOfEight = anyOfEight || how != 0;
+                if (low % 8 == 7 && saturated[low / 8] != std::exchange(anyOfEight, false)) {
+                    FAIL() << "saturation of one of the eight up to " << values[low];
+                }
+            }
+        }
+    });
+}
+
+TEST(LaneArithmetic, OneSaturatedValueAmongEightIsSeen) {
+    forEachProbe([&](const LaneProbe& probe) {
+        for (const int value : {-129, -128, 127, 128, 1 << 23, 1 << 24}) {
+            for (std::size_t lane = 0; lane < 8; ++lane) {
+                std::vector<int> values(32);
+                values[8 + lane] = value;
+                Words converted(32);
+                bool saturated[4] = {};
+                probe.toWords(values.data(), converted.data(), saturated, values.size());
+                // 2^24 is shifted out whole.
+                const bool expected = value < -128 || (value > 127 && value != 1 << 24);
+                EXPECT_EQ(saturated[1], expected) << value << " in lane " << lane;
+                EXPECT_FALSE(saturated[0] || saturated[2] || saturated[3]);
             }
         }
     });

@@ -33,9 +33,11 @@ void larger(const std::int16_t* x, const std::int16_t* y, std::int16_t* result, 
     }
 }
 
-void words(const int* values, std::int16_t* result, std::size_t count) {
+void words(const int* values, std::int16_t* result, bool* saturated, std::size_t count) {
     for (std::size_t i = 0; i < count; i += lanes::octetLanes) {
-        lanes::toWords(values + i).store(result + i);
+        lanes::SoftInput input;
+        input.toWords(values + i, values + i + 4).store(result + i);
+        saturated[i / lanes::octetLanes] = input.saturated();
     }
 }
 

@@ -26,6 +26,9 @@ inline constexpr std::size_t maxWindow = 64;
 /// Vectors that the forward half of a window may keep for a step.
 inline constexpr std::size_t mostStepVectors = 11;
 
+/// Tail values of a block, in its own order: position by position systematic, parity 1, parity 2.
+inline constexpr std::size_t tailOctets = 12;
+
 /// Where a pass finds the lanes of an octet: in octet `octet` of the source row, after shuffle `shuffle`.
 struct OctetSource {
     std::uint16_t octet;
@@ -60,7 +63,7 @@ struct LaneGroup {
     alignas(16) std::int16_t lastSegment[octetLanes];
 
     /// [3][octets * bundles][8]: for each stream of the caller (systematic, parity 1, parity 2) and lane, the
-    /// segment's first value. A lane without a block points to `steps` zeros.
+    /// segment's first value. A lane without a block points to `steps` + 4 zeros.
     const int* const* inputs;
 
     /// [octets * bundles][8]: where the segment's decisions go, a byte a bit; null for a lane without a
@@ -71,6 +74,7 @@ struct LaneGroup {
     /// @{
     std::int16_t* systematic;  ///< [steps] rows, natural order
     std::int16_t* parity[2];   ///< [steps] rows of code 1 and of code 2
+    std::int16_t* tail;        ///< [bundles][tailOctets] octets: in lanes of a last segment its block's tail
     std::int16_t* channel;     ///< [steps] rows: systematic plus extrinsic of code 1, halved; at the end LLRs
     std::int16_t* extrinsic;   ///< [steps] rows: extrinsic of code 2, halved
     std::int16_t* alphaState;  ///< [16] rows: forward metrics and pending corrections between windows
@@ -88,10 +92,11 @@ struct LaneKernel {
 
     /// Decode a group whose vectors hold the same octet of width / 8 bundles: bundles == width / 8.
     /// [algorithm type 0, 1, 2]
-    void (*acrossBundles[3])(const LaneGroup&);
+    /// @return whether a soft value was saturated
+    bool (*acrossBundles[3])(const LaneGroup&);
 
     /// Decode one bundle whose vectors hold width / 8 of its octets. Null at a width of 8.
-    void (*acrossOctets[3])(const LaneGroup&);
+    bool (*acrossOctets[3])(const LaneGroup&);
 };
 
 }  // namespace quarzel::lanes

@@ -8,6 +8,7 @@
 #include <type_traits>
 #include <utility>
 
+#include "engine/lanes/lane_boundaries.hpp"
 #include "engine/lanes/lane_rules.hpp"
 #include "engine/lanes/lane_transpose.hpp"
 #include "engine/steps.hpp"
@@ -22,10 +23,6 @@
 namespace quarzel::lanes {
 namespace {
 
-/// Boundary metrics and the steps of the normalisation are multiples of 128, so that neither disturbs the
-/// other.
-constexpr std::int16_t boundaryGrain = -128;
-
 /// Rows after which the metrics are normalised, and rows after a start for which their spread is not bounded.
 constexpr std::size_t normalisedRows = 8;
 constexpr std::size_t unboundedRows = 3;
@@ -34,14 +31,6 @@ constexpr std::size_t unboundedRows = 3;
 /// the largest metric where ratios use it.
 constexpr std::int16_t mostSpread = 12288;
 constexpr std::int16_t mostLargest = 127 + 7 * 2048;
-
-template <std::size_t W>
-using Metrics = StateWords<Lanes<W>>;
-
-template <std::size_t W>
-inline Lanes<W> largest(const Metrics<W>& m) {
-    return max(max(max(m[0], m[1]), max(m[2], m[3])), max(max(m[4], m[5]), max(m[6], m[7])));
-}
 
 /// Whether the plain maximum may compare paths over these metrics.
 template <std::size_t W>
@@ -55,24 +44,6 @@ inline bool withinBounds(const Metrics<W>& m) {
         }
     }
     return true;
-}
-
-template <std::size_t W>
-inline Metrics<W> loadMetrics(const std::int16_t* from, std::size_t stride) {
-    Metrics<W> m;
-    unrolled<8>([&](auto state) { m[state] = Lanes<W>::load(from + state * stride); });
-    return m;
-}
-
-template <std::size_t W>
-inline void storeMetrics(const Metrics<W>& m, std::int16_t* to, std::size_t stride) {
-    unrolled<8>([&](auto state) { m[state].store(to + state * stride); });
-}
-
-/// The lanes of an octet that a mask names from one place, the others from another.
-inline Lanes<8> choose(const std::int16_t* mask, Lanes<8> where, Lanes<8> elsewhere) {
-    const Lanes<8> m = Lanes<8>::load(mask);
-    return {(m.v & where.v) | (~m.v & elsewhere.v)};
 }
 
 /// Decodes one group at one width. `AcrossOctets` tells whether a vector holds octets of one bundle rather
@@ -101,13 +72,16 @@ class GroupDecoder {
     explicit GroupDecoder(const LaneGroup& group)
         : itsGroup(group), itsRow(octetLanes * group.octets * group.bundles), itsColumns(itsRow / W) {}
 
-    void decode() {
-        readInputs(itsGroup);
+    /// @return whether a soft value was saturated
+    bool decode() {
+        const bool saturated = readInputs(itsGroup);
+        setStarts<Rules::normalised>(itsGroup);
         for (unsigned iteration = 0; iteration < itsGroup.iterations; ++iteration) {
             pass<1>(iteration == 0, false);
             pass<0>(iteration == 0, iteration + 1 == itsGroup.iterations);
         }
         writeDecisions(itsGroup);
+        return saturated;
     }
 
     /// The window that a recursion is at.
@@ -237,14 +211,14 @@ class GroupDecoder {
                 storeBoundary(end, ends + at);
             }
             if (w == 0 && handDownAtOnce) {
-                handDown(lastStarts);
+                handDown(itsGroup, lastStarts);
             }
             bottom += window.length;
         }
         if (!handDownAtOnce) {
-            handDown(lastStarts);
+            handDown(itsGroup, lastStarts);
         }
-        handUp(itsGroup.alphaStart[Code]);
+        handUp(itsGroup, itsGroup.alphaStart[Code]);
     }
 
     template <int Code>
@@ -309,7 +283,7 @@ class GroupDecoder {
 
     static void normalise(State& state) {
         if constexpr (Rules::normalised) {
-            const Word offset = largest<W>(state) & Word::of(boundaryGrain);
+            const Word offset = largest<W>(state) & Word::of(boundaryMask);
             unrolled<states>([&](auto i) { state[i] = sub(state[i], offset); });
         }
     }
@@ -326,19 +300,8 @@ class GroupDecoder {
         return state;
     }
 
-    /// Keep metrics as a boundary: low bits cleared, the largest one at 0.
     void storeBoundary(const State& state, std::int16_t* to) const {
-        Metrics<W> m = words(state);
-        for (Word& metric : m) {
-            metric = metric & Word::of(boundaryGrain);
-        }
-        if constexpr (Rules::normalised) {
-            const Word top = largest<W>(m);
-            for (Word& metric : m) {
-                metric = sub(metric, top);
-            }
-        }
-        storeMetrics<W>(m, to, itsRow);
+        storeMetrics<W>(toBoundary<Rules::normalised, W>(words(state)), to, itsRow);
     }
 
     State loadAlphaState(const std::int16_t* from) const {
@@ -359,48 +322,11 @@ class GroupDecoder {
             }
         }
     }
-
-    /// Start each segment where the one below it ended; a block's first one keeps its start.
-    void handUp(std::int16_t* starts) const {
-        for (std::size_t metric = 0; metric < states; ++metric) {
-            for (std::size_t bundle = 0; bundle < itsGroup.bundles; ++bundle) {
-                const auto at = [&](std::size_t octet) {
-                    return metric * itsRow + octetLanes * (octet * itsGroup.bundles + bundle);
-                };
-                for (std::size_t octet = 1; octet < itsGroup.octets; ++octet) {
-                    Lanes<8>::load(itsGroup.alphaState + at(octet - 1)).store(starts + at(octet));
-                }
-                const Lanes<8> top = Lanes<8>::load(itsGroup.alphaState + at(itsGroup.octets - 1));
-                const Lanes<8> moved{__builtin_shufflevector(top.v, top.v, 7, 0, 1, 2, 3, 4, 5, 6)};
-                choose(itsGroup.firstSegment, Lanes<8>::load(starts + at(0)), moved).store(starts + at(0));
-            }
-        }
-    }
-
-    /// Start the last window of each segment where the first one of the segment above it ended; a block's
-    /// last one keeps its start.
-    void handDown(std::int16_t* starts) const {
-        for (std::size_t metric = 0; metric < states; ++metric) {
-            for (std::size_t bundle = 0; bundle < itsGroup.bundles; ++bundle) {
-                const auto at = [&](std::size_t octet) {
-                    return metric * itsRow + octetLanes * (octet * itsGroup.bundles + bundle);
-                };
-                const std::size_t last = itsGroup.octets - 1;
-                for (std::size_t octet = 0; octet < last; ++octet) {
-                    Lanes<8>::load(itsGroup.boundary + at(octet + 1)).store(starts + at(octet));
-                }
-                const Lanes<8> low = Lanes<8>::load(itsGroup.boundary + at(0));
-                const Lanes<8> moved{__builtin_shufflevector(low.v, low.v, 1, 2, 3, 4, 5, 6, 7, 0)};
-                choose(itsGroup.lastSegment, Lanes<8>::load(starts + at(last)), moved)
-                    .store(starts + at(last));
-            }
-        }
-    }
 };
 
 template <std::size_t W, bool AcrossOctets, int Algorithm>
-void decodeGroup(const LaneGroup& group) {
-    GroupDecoder<W, AcrossOctets, Algorithm>(group).decode();
+bool decodeGroup(const LaneGroup& group) {
+    return GroupDecoder<W, AcrossOctets, Algorithm>(group).decode();
 }
 
 /// The kernel of one width.

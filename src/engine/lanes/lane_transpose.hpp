@@ -26,20 +26,39 @@ inline Square transpose(const Square& x) {
     return interleaveHalves(interleaveHalves(interleaveHalves(x)));
 }
 
-/// Eight of the caller's values, saturated to the input format, as words of the state format. Bits that the
-/// first shift moves out are lost before the comparison, as in the core.
-inline Lanes<8> toWords(const int* values) {
+/// Soft values on their way from the caller's integers to words of the state format, eight at a time.
+class SoftInput {
+  public:
+    /// Four values from each of two places, saturated to the input format. Bits that the first shift moves
+    /// out are lost before the comparison, as in the core.
+    Lanes<8> toWords(const int* first, const int* second) {
+        typedef std::uint32_t Unsigned __attribute__((vector_size(32)));
+        Ints values;
+        std::memcpy(&values, first, sizeof values / 2);
+        std::memcpy(reinterpret_cast<char*>(&values) + sizeof values / 2, second, sizeof values / 2);
+        constexpr std::int32_t most = 32512;
+        constexpr std::int32_t least = -32768;
+        const auto given = (Ints)((Unsigned)values << 8);
+        Ints x = given > most ? Ints{} + most : given;
+        x = x < least ? Ints{} + least : x;
+        itsChanges |= x ^ given;
+        return {__builtin_convertvector(x >> 4, Lanes<8>::Signed)};
+    }
+
+    /// Whether a value was saturated.
+    bool saturated() const {
+        std::int32_t changes = 0;
+        for (std::size_t i = 0; i < 8; ++i) {
+            changes |= itsChanges[i];
+        }
+        return changes != 0;
+    }
+
+  private:
     typedef std::int32_t Ints __attribute__((vector_size(32)));
-    typedef std::uint32_t Unsigned __attribute__((vector_size(32)));
-    constexpr std::int32_t most = 32512;
-    constexpr std::int32_t least = -32768;
-    Ints x;
-    std::memcpy(&x, values, sizeof x);
-    x = (Ints)((Unsigned)x << 8);
-    x = x > most ? Ints{} + most : x;
-    x = x < least ? Ints{} + least : x;
-    return {__builtin_convertvector(x >> 4, Lanes<8>::Signed)};
-}
+
+    Ints itsChanges = {};
+};
 
 /// Call `block` for the rows from t to t + 7, for every t that it takes to cover all rows. The last eight may
 /// overlap those before.
@@ -52,7 +71,7 @@ inline void forEightRows(std::size_t rows, Block block) {
 }
 
 /// Fill the rows of the soft inputs from the caller's arrays.
-inline void readInputs(const LaneGroup& group) {
+inline void readSteps(const LaneGroup& group, SoftInput& input) {
     const std::size_t octets = group.octets * group.bundles;
     const std::size_t row = octetLanes * octets;
     std::int16_t* const rows[3] = {group.systematic, group.parity[0], group.parity[1]};
@@ -62,7 +81,7 @@ inline void readInputs(const LaneGroup& group) {
             forEightRows(group.steps, [&](std::size_t t) {
                 Square square;
                 for (std::size_t lane = 0; lane < octetLanes; ++lane) {
-                    square[lane] = toWords(lanes[lane] + t);
+                    square[lane] = input.toWords(lanes[lane] + t, lanes[lane] + t + 4);
                 }
                 square = transpose(square);
                 for (std::size_t i = 0; i < square.size(); ++i) {
@@ -71,6 +90,38 @@ inline void readInputs(const LaneGroup& group) {
             });
         }
     }
+}
+
+/// Fill the tail octets from the four values of each stream that follow a last segment's.
+inline void readTails(const LaneGroup& group, SoftInput& input) {
+    const std::size_t octets = group.octets * group.bundles;
+    for (std::size_t bundle = 0; bundle < group.bundles; ++bundle) {
+        const std::size_t last = (group.octets - 1) * group.bundles + bundle;
+        // Two streams side by side fill a square; the third one stands alone.
+        static constexpr int nothing[4] = {};
+        for (std::size_t stream = 0; stream < 3; stream += 2) {
+            Square square;
+            for (std::size_t lane = 0; lane < octetLanes; ++lane) {
+                const int* const* from = group.inputs + (stream * octets + last) * octetLanes + lane;
+                square[lane] = input.toWords(from[0] + group.steps,
+                                             stream == 0 ? from[octets * octetLanes] + group.steps : nothing);
+            }
+            square = transpose(square);
+            for (std::size_t i = 0; i < (stream == 0 ? 8U : 4U); ++i) {
+                const std::size_t number = 3 * (i % 4) + stream + i / 4;
+                square[i].store(group.tail + (bundle * tailOctets + number) * octetLanes);
+            }
+        }
+    }
+}
+
+/// Read every value of the caller's, once.
+/// @return whether one was saturated
+inline bool readInputs(const LaneGroup& group) {
+    SoftInput input;
+    readSteps(group, input);
+    readTails(group, input);
+    return input.saturated();
 }
 
 /// Write a byte for every LLR in the channel rows: 1 where it is not negative.
