@@ -69,6 +69,18 @@ void batchCall(benchmark::State& bench) {
     measure(bench, batchSize(bench), asItIs, decodeBatch);
 }
 
+/// Batches on several threads, a state each: the bits of all of them together in the time that passes.
+void batchOnThreads(benchmark::State& bench) {
+    Blocks blocks(static_cast<std::size_t>(bench.range(0)), batchSize(bench));
+    const State state = makeState(bench.range(1), bench.range(2));
+    for (auto _ : bench) {
+        check(decodeBatch(state.get(), blocks));
+        benchmark::DoNotOptimize(blocks.bits.data());
+    }
+    bench.counters["bit/s"] = benchmark::Counter(
+        static_cast<double>(bench.iterations()) * blocks.informationBits(), benchmark::Counter::kIsRate);
+}
+
 /// Batches of few blocks: how the speed grows with the group.
 void groupOf(benchmark::State& bench) {
     measure(bench, static_cast<std::size_t>(bench.range(3)), asItIs, decodeBatch);
@@ -103,6 +115,7 @@ void someShapes(benchmark::internal::Benchmark* bench) {
 
 BENCHMARK(batchCall)->Apply(everyShape);
 BENCHMARK(singleCall)->Apply(everyShape);
+BENCHMARK(batchOnThreads)->Apply(someShapes)->ThreadRange(1, 2)->UseRealTime();
 BENCHMARK(groupOf)
     ->ArgNames({"K", "units", "algorithm", "blocks"})
     ->ArgsProduct({{40, 1024, 6144}, {8}, {1}, {1, 2, 4, 8, 16, 32, 64}})

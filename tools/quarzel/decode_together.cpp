@@ -10,6 +10,7 @@
 #include <mutex>
 #include <optional>
 #include <span>
+#include <streambuf>
 #include <system_error>
 #include <thread>
 #include <utility>
@@ -32,16 +33,24 @@ std::size_t groupSize(const Capture& capture, unsigned threads) {
                                    bits / capture.blockSize);
 }
 
-/// While it lives, what is written to std::cout is lost.
-class Silence {
+/// While it lives, what any thread writes to std::cout is lost, but not that something was.
+class Silence : std::streambuf {
   public:
-    Silence() : itsBuffer(std::cout.rdbuf(nullptr)) {}
-    ~Silence() { std::cout.rdbuf(itsBuffer); }
+    Silence() : itsBuffer(std::cout.rdbuf(this)) {}
+    ~Silence() override { std::cout.rdbuf(itsBuffer); }
     Silence(const Silence&) = delete;
     Silence& operator=(const Silence&) = delete;
 
+    bool broken() const { return itsBroken; }
+
   private:
+    std::streamsize xsputn(const char* /*text*/, std::streamsize count) override {
+        itsBroken = true;
+        return count;
+    }
+
     std::streambuf* itsBuffer;
+    std::atomic<bool> itsBroken = false;
 };
 
 /// Let the library warn of the first soft value that it will saturate.
@@ -127,15 +136,12 @@ class SharedWork {
     std::exception_ptr itsException;
 };
 
-}  // namespace
-
-PackedBits decodeTogether(const Capture& capture, const CoreOptions& core, unsigned threads,
-                          Progress& progress) {
-    SharedWork work(capture, core, groupSize(capture, threads), progress);
-    warnOfSaturation(capture, core);
+/// Do the work on this thread and on others.
+/// @return whether a model had something to say. It would be its warning of the first value that it
+///         saturates, once for each model
+bool runSilently(SharedWork& work, unsigned threads) {
+    const Silence silence;
     {
-        // Each model would give the warning once more.
-        const Silence silence;
         std::vector<std::jthread> helpers;
         try {
             while (helpers.size() + 1 < threads) {
@@ -145,6 +151,17 @@ PackedBits decodeTogether(const Capture& capture, const CoreOptions& core, unsig
             // The system gives no more threads. Those that there are do the work.
         }
         work.run();
+    }
+    return silence.broken();
+}
+
+}  // namespace
+
+PackedBits decodeTogether(const Capture& capture, const CoreOptions& core, unsigned threads,
+                          Progress& progress) {
+    SharedWork work(capture, core, groupSize(capture, threads), progress);
+    if (runSilently(work, threads)) {
+        warnOfSaturation(capture, core);
     }
     return work.result();
 }
