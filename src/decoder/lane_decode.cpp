@@ -76,29 +76,28 @@ bool LaneDecoder::decode(std::uint32_t K, unsigned iterations, int algorithm,
 }
 
 /// Give a group its parts of the store, each on a cache line of its own.
-void LaneDecoder::shareStore(const LaneLayout& layout, const Plan& plan, LaneGroup& group) {
+void LaneDecoder::shareStore(const LaneLayout& layout, std::size_t width) {
     constexpr std::size_t line = 64;
     constexpr std::size_t lineWords = line / sizeof(std::int16_t);
-    const std::size_t row = octetLanes * layout.octets() * plan.bundles;
-    const std::size_t width = plan.kernel->width;
+    const std::size_t row = octetLanes * layout.octets() * itsGroup.bundles;
     const std::size_t betaRows = layout.windowLength.size() * states;
     const struct {
         std::int16_t** part;
         std::size_t words;
     } parts[] = {
-        {&group.systematic, layout.steps * row},
-        {&group.parity[0], layout.steps * row},
-        {&group.parity[1], layout.steps * row},
-        {&group.tail, lanes::tailOctets * octetLanes * plan.bundles},
-        {&group.channel, layout.steps * row},
-        {&group.extrinsic, layout.steps * row},
-        {&group.alphaState, 2 * states * row},
-        {&group.alphaStart[0], states * row},
-        {&group.alphaStart[1], states * row},
-        {&group.betaStart[0], betaRows * row},
-        {&group.betaStart[1], betaRows * row},
-        {&group.boundary, states * row},
-        {&group.stepRows, lanes::maxWindow * lanes::mostStepVectors * width},
+        {&itsGroup.systematic, layout.steps * row},
+        {&itsGroup.parity[0], layout.steps * row},
+        {&itsGroup.parity[1], layout.steps * row},
+        {&itsGroup.tail, lanes::tailOctets * octetLanes * itsGroup.bundles},
+        {&itsGroup.channel, layout.steps * row},
+        {&itsGroup.extrinsic, layout.steps * row},
+        {&itsGroup.alphaState, 2 * states * row},
+        {&itsGroup.alphaStart[0], states * row},
+        {&itsGroup.alphaStart[1], states * row},
+        {&itsGroup.betaStart[0], betaRows * row},
+        {&itsGroup.betaStart[1], betaRows * row},
+        {&itsGroup.boundary, states * row},
+        {&itsGroup.stepRows, lanes::maxWindow * lanes::mostStepVectors * width},
     };
     const auto rounded = [](std::size_t words) { return (words + lineWords - 1) / lineWords * lineWords; };
     std::size_t needed = lineWords;
@@ -118,13 +117,12 @@ void LaneDecoder::shareStore(const LaneLayout& layout, const Plan& plan, LaneGro
 }
 
 /// Point the lanes of a block to its values.
-void LaneDecoder::placeBlock(const LaneLayout& layout, const LaneBlock& block, std::size_t index,
-                             const LaneGroup& group) {
+void LaneDecoder::placeBlock(const LaneLayout& layout, const LaneBlock& block, std::size_t index) {
     const std::size_t bundle = index / layout.blocksPerBundle();
-    const std::size_t row = octetLanes * group.octets * group.bundles;
+    const std::size_t row = octetLanes * itsGroup.octets * itsGroup.bundles;
     std::size_t position = 0;
     layout.forEachSegment(index, [&](std::size_t octet, std::size_t lane) {
-        const std::size_t at = (octet * group.bundles + bundle) * octetLanes + lane;
+        const std::size_t at = (octet * itsGroup.bundles + bundle) * octetLanes + lane;
         for (std::size_t stream = 0; stream < 3; ++stream) {
             itsInputs[stream * row + at] = block.streams[stream] + position;
         }
@@ -135,7 +133,8 @@ void LaneDecoder::placeBlock(const LaneLayout& layout, const LaneBlock& block, s
 
 bool LaneDecoder::decodeGroup(const LaneLayout& layout, const Plan& plan, unsigned iterations, int algorithm,
                               std::span<const LaneBlock> blocks) {
-    LaneGroup group{};
+    LaneGroup& group = itsGroup;
+    group = {};
     group.steps = layout.steps;
     group.octets = layout.octets();
     group.bundles = plan.bundles;
@@ -149,14 +148,16 @@ bool LaneDecoder::decodeGroup(const LaneLayout& layout, const Plan& plan, unsign
         group.firstSegment[lane] = layout.segmentOf(0, lane) == 0 ? -1 : 0;
         group.lastSegment[lane] = layout.segmentOf(layout.octets() - 1, lane) + 1 == layout.segments ? -1 : 0;
     }
+    group.octetWords = octetLanes * (plan.acrossOctets ? 1 : group.bundles * group.steps);
+    group.rowWords = octetLanes * group.bundles * (plan.acrossOctets ? group.octets : 1);
     // Until this group is done the store holds no block that could be read back.
     itsLast.K = 0;
-    shareStore(layout, plan, group);
+    shareStore(layout, plan.kernel->width);
     const std::size_t row = octetLanes * group.octets * group.bundles;
     itsInputs.assign(3 * row, silence);
     itsOutputs.assign(row, nullptr);
     for (std::size_t index = 0; index < blocks.size(); ++index) {
-        placeBlock(layout, blocks[index], index, group);
+        placeBlock(layout, blocks[index], index);
     }
     group.inputs = itsInputs.data();
     group.outputs = itsOutputs.data();
@@ -165,34 +166,29 @@ bool LaneDecoder::decodeGroup(const LaneLayout& layout, const Plan& plan, unsign
 
     itsLast.K = layout.K;
     itsLast.iterations = iterations;
-    itsLast.bundles = group.bundles;
     itsLast.index = blocks.size() - 1;
-    itsRows[0] = group.systematic;
-    itsRows[1] = group.parity[0];
-    itsRows[2] = group.parity[1];
-    itsTail = group.tail;
     return saturated;
 }
 
 void LaneDecoder::readLast(std::vector<std::int8_t>& soft) const {
     const LaneLayout& layout = itsLayouts.at(itsLast.K);
     const std::size_t bundle = itsLast.index / layout.blocksPerBundle();
-    const std::size_t row = octetLanes * layout.octets() * itsLast.bundles;
     const auto append = [&soft](std::int16_t word) { soft.push_back(static_cast<std::int8_t>(word >> 4)); };
     soft.clear();
     soft.reserve(3 * std::size_t{layout.K} + lanes::tailOctets);
     std::size_t lastLane = 0;
     layout.forEachSegment(itsLast.index, [&](std::size_t octet, std::size_t lane) {
-        const std::size_t at = (octet * itsLast.bundles + bundle) * octetLanes + lane;
         for (std::size_t t = 0; t < layout.steps; ++t) {
-            for (const std::int16_t* stream : itsRows) {
-                append(stream[t * row + at]);
+            const std::size_t word =
+                octet * itsGroup.octetWords + t * itsGroup.rowWords + bundle * octetLanes + lane;
+            for (const std::int16_t* stream : {itsGroup.systematic, itsGroup.parity[0], itsGroup.parity[1]}) {
+                append(stream[word]);
             }
         }
         lastLane = lane;
     });
     for (std::size_t number = 0; number < lanes::tailOctets; ++number) {
-        append(itsTail[(bundle * lanes::tailOctets + number) * octetLanes + lastLane]);
+        append(itsGroup.tail[(bundle * lanes::tailOctets + number) * octetLanes + lastLane]);
     }
 }
 

@@ -56,14 +56,12 @@ class LaneDecoder {
     struct Last {
         std::uint32_t K = 0;
         unsigned iterations = 0;
-        std::size_t bundles = 0;
         std::size_t index = 0;  ///< in its group
     };
 
     Plan plan(const LaneLayout& layout, std::size_t blocks) const;
-    void shareStore(const LaneLayout& layout, const Plan& plan, lanes::LaneGroup& group);
-    void placeBlock(const LaneLayout& layout, const LaneBlock& block, std::size_t index,
-                    const lanes::LaneGroup& group);
+    void shareStore(const LaneLayout& layout, std::size_t width);
+    void placeBlock(const LaneLayout& layout, const LaneBlock& block, std::size_t index);
     bool decodeGroup(const LaneLayout& layout, const Plan& plan, unsigned iterations, int algorithm,
                      std::span<const LaneBlock> blocks);
 
@@ -72,8 +70,7 @@ class LaneDecoder {
     ShuffleSet itsShuffles;
     std::map<std::uint32_t, LaneLayout> itsLayouts;
     std::vector<std::int16_t> itsStore;
-    const std::int16_t* itsRows[3] = {};    ///< the soft inputs of the last group, inside the store
-    const std::int16_t* itsTail = nullptr;  ///< its tail octets
+    lanes::LaneGroup itsGroup = {};  ///< the last one, inside the store
     std::vector<const int*> itsInputs;
     std::vector<unsigned char*> itsOutputs;
     Last itsLast;

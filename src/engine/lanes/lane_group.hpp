@@ -70,14 +70,19 @@ struct LaneGroup {
     /// block.
     unsigned char* const* outputs;
 
+    /// The words of the step rows: octet o of bundle b of row t starts at o * octetWords + t * rowWords + 8 *
+    /// b. Vectors that hold one octet of several bundles find their rows next to each other.
+    std::size_t octetWords;
+    std::size_t rowWords;
+
     /// @name Work storage; a row is 8 * octets * bundles words
     /// @{
-    std::int16_t* systematic;  ///< [steps] rows, natural order
-    std::int16_t* parity[2];   ///< [steps] rows of code 1 and of code 2
+    std::int16_t* systematic;  ///< [steps] step rows, natural order
+    std::int16_t* parity[2];   ///< [steps] step rows of code 1 and of code 2
     std::int16_t* tail;        ///< [bundles][tailOctets] octets: in lanes of a last segment its block's tail
-    std::int16_t* channel;     ///< [steps] rows: systematic plus extrinsic of code 1, halved; at the end LLRs
-    std::int16_t* extrinsic;   ///< [steps] rows: extrinsic of code 2, halved
-    std::int16_t* alphaState;  ///< [16] rows: forward metrics and pending corrections between windows
+    std::int16_t* channel;  ///< [steps] step rows: systematic plus half the extrinsic of code 1; at last LLRs
+    std::int16_t* extrinsic;      ///< [steps] step rows: half the extrinsic of code 2
+    std::int16_t* alphaState;     ///< [16] rows: forward metrics and pending corrections between windows
     std::int16_t* alphaStart[2];  ///< per code, [8] rows: starts of the next pass
     std::int16_t* betaStart[2];   ///< per code, [windows][8] rows: starts of the next pass
     std::int16_t* boundary;       ///< [8] rows: the last metrics of each segment in the direction at hand

@@ -70,7 +70,7 @@ class GroupDecoder {
 
   public:
     explicit GroupDecoder(const LaneGroup& group)
-        : itsGroup(group), itsRow(octetLanes * group.octets * group.bundles), itsColumns(itsRow / W) {}
+        : itsGroup(group), itsRow(octetLanes * group.octets * group.bundles) {}
 
     /// @return whether a soft value was saturated
     bool decode() {
@@ -188,8 +188,12 @@ class GroupDecoder {
 
   private:
     const LaneGroup itsGroup;
-    const std::size_t itsRow;      ///< words in a row
-    const std::size_t itsColumns;  ///< vectors in a row
+    const std::size_t itsRow;  ///< words in a row
+
+    /// The first word of a vector in the step rows.
+    std::size_t stepWord(std::size_t row, std::size_t column) const {
+        return AcrossOctets ? row * itsGroup.rowWords + column * W : column * itsGroup.octetWords + row * W;
+    }
 
     /// One pass of a constituent code over all windows, from the lowest up.
     template <int Code>
@@ -204,7 +208,7 @@ class GroupDecoder {
         for (std::size_t w = 0; w < itsGroup.windows; ++w) {
             const Window window{bottom, itsGroup.windowLength[w], w == 0, w + 1 == itsGroup.windows};
             std::int16_t* const ends = w == 0 ? itsGroup.boundary : starts + (w - 1) * boundaryWords;
-            for (std::size_t column = 0; column < itsColumns; ++column) {
+            for (std::size_t column = 0; column * W < itsRow; ++column) {
                 const std::size_t at = column * W;
                 forward<Code>(window, column, firstIteration);
                 const State end = backward<Code>(window, column, starts + w * boundaryWords + at, lastPass);
@@ -223,7 +227,7 @@ class GroupDecoder {
 
     template <int Code>
     void output(std::size_t row, std::size_t column, Word llr, Word channel, bool lastPass) const {
-        const std::size_t at = row * itsRow + column * W;
+        const std::size_t at = stepWord(row, column);
         if constexpr (Code == 1) {
             halfExtrinsic<Rules>(llr, channel).store(itsGroup.extrinsic + at);
         } else if (lastPass) {
@@ -236,7 +240,7 @@ class GroupDecoder {
 
     template <int Code>
     Word parity(std::size_t row, std::size_t column) const {
-        return Word::load(itsGroup.parity[Code] + row * itsRow + column * W);
+        return Word::load(itsGroup.parity[Code] + stepWord(row, column));
     }
 
     /// The channel value plus half the extrinsic value of the other code, in the order of this one: twice the
@@ -247,16 +251,18 @@ class GroupDecoder {
         const std::int16_t* given = Code == 0        ? itsGroup.extrinsic
                                     : firstIteration ? itsGroup.systematic
                                                      : itsGroup.channel;
-        const Word value = permuted(given + sources.row[row] * itsRow, sources.octets + row * itsGroup.octets,
-                                    column, std::make_index_sequence<slots>());
+        const Word value =
+            permuted(given + stepWord(sources.row[row], 0), sources.octets + row * itsGroup.octets, column,
+                     std::make_index_sequence<slots>());
         if constexpr (Code == 0) {
-            return add(value, Word::load(itsGroup.systematic + row * itsRow + column * W));
+            return add(value, Word::load(itsGroup.systematic + stepWord(row, column)));
         } else {
             return value;
         }
     }
 
     /// A vector of the source row's lanes, where this row wants them.
+    /// @param from  the source row's first octet
     template <std::size_t... Slot>
     Word permuted(const std::int16_t* from, const OctetSource* sources, std::size_t column,
                   std::index_sequence<Slot...>) const {
@@ -267,7 +273,8 @@ class GroupDecoder {
         } else {
             const OctetSource source = sources[column];
             const Lanes<8> shuffle = loadShuffle(itsGroup.shuffles[source.shuffle]);
-            return shuffleOctets(Word::load(from + source.octet * W), joinOctets(((void)Slot, shuffle)...));
+            return shuffleOctets(Word::load(from + source.octet * itsGroup.octetWords),
+                                 joinOctets(((void)Slot, shuffle)...));
         }
     }
 

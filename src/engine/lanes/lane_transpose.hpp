@@ -70,14 +70,24 @@ inline void forEightRows(std::size_t rows, Block block) {
     block(rows - 8);
 }
 
+/// Call `visit(octet, word)` for every octet of a group, with the word of its first step row.
+template <class Visit>
+inline void forEachOctet(const LaneGroup& group, Visit visit) {
+    for (std::size_t octet = 0; octet < group.octets; ++octet) {
+        for (std::size_t bundle = 0; bundle < group.bundles; ++bundle) {
+            visit(octet * group.bundles + bundle, octet * group.octetWords + bundle * octetLanes);
+        }
+    }
+}
+
 /// Fill the rows of the soft inputs from the caller's arrays.
 inline void readSteps(const LaneGroup& group, SoftInput& input) {
-    const std::size_t octets = group.octets * group.bundles;
-    const std::size_t row = octetLanes * octets;
     std::int16_t* const rows[3] = {group.systematic, group.parity[0], group.parity[1]};
     for (std::size_t stream = 0; stream < 3; ++stream) {
-        for (std::size_t octet = 0; octet < octets; ++octet) {
-            const int* const* lanes = group.inputs + (stream * octets + octet) * octetLanes;
+        forEachOctet(group, [&](std::size_t octet, std::size_t word) {
+            const std::size_t place = stream * group.octets * group.bundles + octet;
+            const int* const* lanes = group.inputs + place * octetLanes;
+            std::int16_t* const first = rows[stream] + word;
             forEightRows(group.steps, [&](std::size_t t) {
                 Square square;
                 for (std::size_t lane = 0; lane < octetLanes; ++lane) {
@@ -85,10 +95,10 @@ inline void readSteps(const LaneGroup& group, SoftInput& input) {
                 }
                 square = transpose(square);
                 for (std::size_t i = 0; i < square.size(); ++i) {
-                    square[i].store(rows[stream] + (t + i) * row + octet * octetLanes);
+                    square[i].store(first + (t + i) * group.rowWords);
                 }
             });
-        }
+        });
     }
 }
 
@@ -127,14 +137,13 @@ inline bool readInputs(const LaneGroup& group) {
 /// Write a byte for every LLR in the channel rows: 1 where it is not negative.
 inline void writeDecisions(const LaneGroup& group) {
     typedef std::uint8_t Bytes __attribute__((vector_size(8)));
-    const std::size_t octets = group.octets * group.bundles;
-    const std::size_t row = octetLanes * octets;
-    for (std::size_t octet = 0; octet < octets; ++octet) {
+    forEachOctet(group, [&](std::size_t octet, std::size_t word) {
         unsigned char* const* lanes = group.outputs + octet * octetLanes;
+        const std::int16_t* const first = group.channel + word;
         forEightRows(group.steps, [&](std::size_t t) {
             Square square;
             for (std::size_t i = 0; i < square.size(); ++i) {
-                square[i] = Lanes<8>::load(group.channel + (t + i) * row + octet * octetLanes);
+                square[i] = Lanes<8>::load(first + (t + i) * group.rowWords);
             }
             square = transpose(square);
             for (std::size_t lane = 0; lane < octetLanes; ++lane) {
@@ -145,7 +154,7 @@ inline void writeDecisions(const LaneGroup& group) {
                 }
             }
         });
-    }
+    });
 }
 
 }  // namespace
