@@ -106,7 +106,7 @@ void arguments(benchmark::internal::Benchmark* bench, const std::vector<std::vec
 }
 
 void everyShape(benchmark::internal::Benchmark* bench) {
-    arguments(bench, {{40, 512, 1024, 2048, 6144}, {2, 4, 8}, {0, 1, 2}});
+    arguments(bench, {{40, 64, 512, 1024, 2048, 6144}, {2, 4, 8}, {0, 1, 2}});
 }
 
 void someShapes(benchmark::internal::Benchmark* bench) {

@@ -154,7 +154,7 @@ bool LaneDecoder::decodeGroup(const LaneLayout& layout, const Plan& plan, unsign
     itsLast.K = 0;
     shareStore(layout, plan.kernel->width);
     const std::size_t row = octetLanes * group.octets * group.bundles;
-    itsInputs.assign(3 * row, silence);
+    itsInputs.assign(3 * row + octetLanes, silence);  // with an octet ahead of the last one
     itsOutputs.assign(row, nullptr);
     for (std::size_t index = 0; index < blocks.size(); ++index) {
         placeBlock(layout, blocks[index], index);

@@ -63,7 +63,8 @@ struct LaneGroup {
     alignas(16) std::int16_t lastSegment[octetLanes];
 
     /// [3][octets * bundles][8]: for each stream of the caller (systematic, parity 1, parity 2) and lane, the
-    /// segment's first value. A lane without a block points to `steps` + 4 zeros.
+    /// segment's first value. A lane without a block points to `steps` + 4 zeros. Eight more follow, because
+    /// the octet ahead is fetched from memory.
     const int* const* inputs;
 
     /// [octets * bundles][8]: where the segment's decisions go, a byte a bit; null for a lane without a

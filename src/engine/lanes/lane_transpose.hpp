@@ -91,6 +91,8 @@ inline void readSteps(const LaneGroup& group, SoftInput& input) {
             forEightRows(group.steps, [&](std::size_t t) {
                 Square square;
                 for (std::size_t lane = 0; lane < octetLanes; ++lane) {
+                    // What comes next lies elsewhere: in other segments, or another stream.
+                    __builtin_prefetch(lanes[octetLanes + lane] + t);
                     square[lane] = input.toWords(lanes[lane] + t, lanes[lane] + t + 4);
                 }
                 square = transpose(square);
