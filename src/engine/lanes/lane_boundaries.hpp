@@ -31,7 +31,6 @@ inline void storeMetrics(const Metrics<W>& m, std::int16_t* to, std::size_t stri
 }
 
 /// Metrics as a boundary: low bits cleared and, where metrics are kept from wrapping, the largest one at 0.
-/// That changes no comparison: boundaries are multiples of what is cleared.
 template <bool Normalised, std::size_t W>
 inline Metrics<W> toBoundary(Metrics<W> m) {
     for (Lanes<W>& metric : m) {
@@ -64,7 +63,7 @@ inline Metrics<8> tailMetricsOf(const LaneGroup& group, std::size_t bundle, std:
 /// its tail, and of the others nothing is known.
 template <bool Normalised>
 inline void setStarts(const LaneGroup& group) {
-    constexpr std::int16_t otherState = -16384;
+    constexpr std::int16_t otherState = -32768 / 2;  // half of the smallest metric
     constexpr Lanes<8> unknown{};
     const std::size_t octets = group.octets * group.bundles;
     const std::size_t row = octetLanes * octets;

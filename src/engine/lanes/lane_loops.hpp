@@ -37,7 +37,7 @@ template <std::size_t W>
 inline bool withinBounds(const Metrics<W>& m) {
     const Lanes<W> top = largest<W>(m);
     Lanes<W> bottom = m[0];
-    unrolled<8>([&](auto state) { bottom = min(bottom, m[state]); });
+    unrolled<states>([&](auto state) { bottom = min(bottom, m[state]); });
     for (std::size_t lane = 0; lane < W; ++lane) {
         if (top.v[lane] < 0 || top.v[lane] > mostLargest || top.v[lane] - bottom.v[lane] > mostSpread) {
             return false;
@@ -55,7 +55,6 @@ class GroupDecoder {
     using Recursion = typename Rules::Recursion;
     using State = StateMetrics<Recursion>;
     static constexpr std::size_t slots = W / octetLanes;
-    static constexpr std::size_t states = trellis::states;
 
     /// Whether the forward half of a window keeps the branch metrics for the backward half. At 32 lanes they
     /// would drive the forward metrics out of the first-level cache.
@@ -288,6 +287,8 @@ class GroupDecoder {
         return symmetric(clamp(add(channel, parity)), clamp(sub(channel, parity)));
     }
 
+    /// Keep metrics from wrapping. The steps are multiples of what a boundary clears, so that neither
+    /// disturbs the other.
     static void normalise(State& state) {
         if constexpr (Rules::normalised) {
             const Word offset = largest<W>(state) & Word::of(boundaryMask);
