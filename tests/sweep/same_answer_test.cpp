@@ -75,6 +75,14 @@ TEST(SameAnswer, IsTheStoredOne) {
     EXPECT_EQ(run.exitCode, 0);
 }
 
+// All units and algorithms, a size of many windows, amplitudes, and the greatest seed.
+TEST(SameAnswer, IsTheStoredOneForEveryCore) {
+    const ToolRun run = runTool({"verify-result", QUARZEL_SWEEP_DATA "/every_core.json"});
+    EXPECT_EQ(run.out,
+              QUARZEL_SWEEP_DATA "/every_core.json: the same byte for byte, 36 points with 327 blocks\n");
+    EXPECT_EQ(run.exitCode, 0);
+}
+
 TEST(SameAnswer, ComesFromAnyNumberOfThreads) {
     const std::string expected = sweep::resultText(resultOf(smallSweep()));
     for (const unsigned threads : {2U, 8U}) {
