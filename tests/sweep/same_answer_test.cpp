@@ -31,7 +31,7 @@ class Impatience : public sweep::Observer {
     unsigned itsTicks;
 };
 
-#ifdef __SANITIZE_ADDRESS__
+#if defined(__SANITIZE_ADDRESS__) || defined(QUARZEL_EMULATED)
 const char* const blocksOfLongerSweep = "101";
 #else
 const char* const blocksOfLongerSweep = "2501";
