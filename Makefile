@@ -5,7 +5,7 @@
 help:
 	@echo "make demo       install what is missing, build, and decode the captures that come with the project"
 	@echo "make test       install what is missing, build, and run every test, the library's with sanitizers, too"
-	@echo "make test-long  the checks that take an hour: the tool with sanitizers, 64-bit Arm, whole domains, the analyser"
+	@echo "make test-long  the checks that take an hour or two: the tool with sanitizers, 64-bit Arm, whole domains, the analyser"
 	@echo "make bench      build and run the benchmarks"
 	@echo "make format     format the sources"
 

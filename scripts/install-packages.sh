@@ -14,10 +14,21 @@ long) purposes='demo|test|long' ;;
     ;;
 esac
 
+# A package is the machine's own unless its name ends in ":" and another architecture; both may be installed.
+own_architecture=$(dpkg --print-architecture)
+is_installed() {
+    local architecture=$own_architecture
+    [[ $1 != *:* ]] || architecture=${1#*:}
+    dpkg-query -W -f '${Architecture} ${db:Status-Status}\n' "${1%:*}" 2>/dev/null |
+        grep -qxE "($architecture|all) installed"
+}
+
 missing=()
+foreign=()
 for package in $(awk -v purposes="^($purposes)\$" '$1 ~ purposes { print $2 }' "$list"); do
-    if [ "$(dpkg-query -W -f '${db:Status-Status}' "$package" 2>/dev/null)" != installed ]; then
+    if ! is_installed "$package"; then
         missing+=("$package")
+        [[ $package != *:* ]] || foreign+=("${package#*:}")
     fi
 done
 if [ ${#missing[@]} -eq 0 ]; then
@@ -28,7 +39,7 @@ echo "Installing from Debian: ${missing[*]}"
 as_root=()
 if [ "$(id -u)" -ne 0 ]; then
     if ! command -v sudo >/dev/null; then
-        echo "Please run as root: apt-get install ${missing[*]}" >&2
+        echo "Please run as root: $0 $1" >&2
         exit 1
     fi
     as_root=(sudo)
@@ -36,6 +47,10 @@ fi
 log=$(mktemp)
 trap 'rm -f "$log"' EXIT
 install() {
+    local architecture
+    for architecture in "${foreign[@]}"; do
+        "${as_root[@]}" dpkg --add-architecture "$architecture"
+    done
     "${as_root[@]}" env DEBIAN_FRONTEND=noninteractive LC_ALL=C \
         sh -c 'apt-get update && apt-get install -y --no-install-recommends "$@"' sh "${missing[@]}"
 }

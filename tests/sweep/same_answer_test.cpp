@@ -31,7 +31,7 @@ class Impatience : public sweep::Observer {
     unsigned itsTicks;
 };
 
-#ifdef __SANITIZE_ADDRESS__
+#if defined(__SANITIZE_ADDRESS__) || defined(QUARZEL_EMULATED)
 const char* const blocksOfLongerSweep = "101";
 #else
 const char* const blocksOfLongerSweep = "2501";
@@ -72,6 +72,14 @@ TEST(SameAnswer, IsTheStoredOne) {
     const ToolRun run = runTool({"verify-result", QUARZEL_SWEEP_DATA "/small_sweep.json"});
     EXPECT_EQ(run.out,
               QUARZEL_SWEEP_DATA "/small_sweep.json: the same byte for byte, 12 points with 2731 blocks\n");
+    EXPECT_EQ(run.exitCode, 0);
+}
+
+// All units and algorithms, a size of many windows, amplitudes, and the greatest seed.
+TEST(SameAnswer, IsTheStoredOneForEveryCore) {
+    const ToolRun run = runTool({"verify-result", QUARZEL_SWEEP_DATA "/every_core.json"});
+    EXPECT_EQ(run.out,
+              QUARZEL_SWEEP_DATA "/every_core.json: the same byte for byte, 36 points with 327 blocks\n");
     EXPECT_EQ(run.exitCode, 0);
 }
 

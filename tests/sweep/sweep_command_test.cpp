@@ -50,6 +50,14 @@ TEST(SweepCommand, PrintsErrorsAfterEveryIteration) {
 )");
 }
 
+TEST(SweepCommand, TakesEveryItemOfAListOnceAndInTheOrderGiven) {
+    const ToolRun run = runTool({"sweep", "--block-size", "48,40,048", "--units", "8", "--units", "2,8",
+                                 "--ebn0", "20", "--max-blocks", "1", "--csv"});
+    const std::string rest = "[^\n]*\n";
+    EXPECT_THAT(run.out, testing::MatchesRegex(rest + "48,8," + rest + "48,2," + rest + "40,8," + rest +
+                                               "40,2," + rest));
+}
+
 TEST(SweepCommand, PrintsTheResultThatItWrites) {
     const TemporaryDirectory directory;
     const std::string file = directory.path("result.json");
@@ -78,6 +86,7 @@ TEST(SweepCommand, GoesInPartsThatMergeIntoTheSameFile) {
               "quarzel: error: 1 of 3 shards are missing: 3/3; run them and give their files too\n");
 }
 
+// Twice in a row, as `timeout` and the shell of a cluster job do.
 TEST(SweepCommand, KeepsWhatIsDoneWhenASignalComes) {
     for (const char* const signal : {"TERM", "INT"}) {
         const TemporaryDirectory directory;
@@ -85,6 +94,7 @@ TEST(SweepCommand, KeepsWhatIsDoneWhenASignalComes) {
             {"-c",
              R"("$0" sweep --ebn0 8,9 --max-blocks 1000000000 --block-size 40 -o "$1" --checkpoint-every 0 &
                 until [ -e "$1.checkpoint" ]; do sleep 0.01; done
+                kill -s "$2" $!
                 kill -s "$2" $!
                 wait $!)",
              QUARZEL_TOOL, directory.path("result.json"), signal},

@@ -5,6 +5,7 @@
 #include <filesystem>
 #include <nlohmann/json.hpp>
 
+#include "long_runs.hpp"
 #include "npy_data.hpp"
 #include "run_tool.hpp"
 #include "trace_cases.hpp"
@@ -206,11 +207,11 @@ TEST(TraceDecode, EndsWithTheCaptureWhenMorePassesAreWanted) {
 
 TEST(TraceDecode, DecidesAsWithoutATrace) {
     const TemporaryDirectory directory;
+    const std::string capture = shipped(runsTakeLong ? "k40.soft.npy" : "k6144.soft.npy");
     for (const char* units : {"2", "4", "8"}) {
         for (const char* algorithm : {"0", "1", "2"}) {
-            const Arguments arguments = {
-                "decode", shipped("k6144.soft.npy"), "--units", units, "--algorithm", algorithm,
-                "-o",     directory.path("out.npy")};
+            const Arguments arguments = {"decode",      capture,   "--units", units,
+                                         "--algorithm", algorithm, "-o",      directory.path("out.npy")};
             ASSERT_EQ(runTool(arguments).exitCode, 0);
             const std::string decided = readFile(directory.path("out.npy"));
             ASSERT_EQ(runTool(arguments + Arguments{"--trace", "1", "--trace-block", "24", "--trace-file",
@@ -247,6 +248,9 @@ TEST(TraceDecode, IsTheSameInEveryLanguageOfItsUser) {
 }
 
 TEST(TraceDecode, HoldsNoTraceInMemory) {
+    if (runsTakeLong) {
+        GTEST_SKIP() << "no limit of memory holds here";
+    }
     const TemporaryDirectory directory;
     const std::string file = directory.path("trace");
     constexpr unsigned long memoryLimit = 48UL << 20;

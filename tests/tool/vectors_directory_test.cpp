@@ -86,9 +86,12 @@ TEST_F(VectorsDirectory, IsNotThereWhenAFileCannotBeWritten) {
 }
 
 TEST_F(VectorsDirectory, IsNotThereWhenTheToolIsInterrupted) {
-    const ToolRun run = runTool({"--preserve-status", "-s", "INT", "0.3", QUARZEL_TOOL, "vectors", itsSet,
-                                 "--block-size", "6144", "--blocks", "100000"},
-                                {.program = "/usr/bin/timeout"});
+    const std::string interrupted = R"sh("$0" vectors "$1" --block-size 6144 --blocks 100000 &
+                                         until [ -n "$(ls -A "$2")" ]; do sleep 0.01; done
+                                         kill -s INT $!
+                                         wait $!)sh";
+    const ToolRun run =
+        runTool({"-c", interrupted, QUARZEL_TOOL, itsSet, itsDirectory.path("")}, {.program = "/bin/sh"});
     expectRefused(run, itsSet + ": was not made, since a signal came; run the command again", 4);
     EXPECT_EQ(itsDirectory.names(), std::vector<std::string>{});
 }

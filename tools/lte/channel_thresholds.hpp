@@ -16,7 +16,9 @@ struct Quantiser {
         llr,        ///< scale * 2 y / sigma^2: `scale` units for a log-likelihood ratio of 1
     };
     Kind kind = Kind::llr;
-    double scale = 4;  ///< above 0, finite
+    double scale = 4;  ///< above 0, at most highestScale
+
+    static constexpr double highestScale = 1e6;
 
     bool operator==(const Quantiser&) const = default;
 };

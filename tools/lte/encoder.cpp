@@ -84,7 +84,7 @@ void Encoder::encode(const std::uint8_t* bits, std::uint8_t* streams) const {
     }
     // The tail of the first code fills two positions of all three streams, that of the second the next two.
     const auto [x, z] = encoders.terminate();
-    for (const unsigned code : {0U, 1U}) {
+    for (const std::size_t code : {0U, 1U}) {
         const std::size_t at = K + 2 * code;
         const auto bitsOf = [code](std::uint32_t both) {
             return static_cast<std::uint8_t>(both >> 8 * code);

@@ -4,9 +4,14 @@
 #include <CLI/CLI.hpp>
 #include <cstdint>
 #include <functional>
+#include <optional>
 #include <string>
+#include <string_view>
 
 namespace quarzel::tool {
+
+/// A whole number in decimal; none when the text is anything else or the number too large.
+std::optional<std::uint64_t> readWholeNumber(std::string_view text);
 
 /// A check that the text of an option is a whole number in decimal and one of those wanted, for an option's
 /// transform(). CLI11 by itself reads a leading 0 as octal and lets a negative number wrap.

@@ -16,7 +16,6 @@ constexpr std::size_t mostPoints = 10000;
 constexpr std::uint64_t mostBlocks = std::uint64_t{1} << 40;
 constexpr lte::Decibels lowestEbN0 = {-20'000'000};
 constexpr lte::Decibels highestEbN0 = {40'000'000};
-constexpr double highestScale = 1e6;
 
 bool isBlockSize(std::uint32_t K) {
     return std::any_of(lteParams.begin(), lteParams.end(), [K](const LteParams& row) { return row.K == K; });
@@ -67,7 +66,7 @@ void Configuration::check() const {
     if (*lowest < lowestEbN0 || *highest > highestEbN0) {
         throw Error("Eb/N0 lies outside -20 to 40 dB", "give values inside");
     }
-    if (!(quantiser.scale > 0) || !(quantiser.scale <= highestScale)) {
+    if (!(quantiser.scale > 0) || !(quantiser.scale <= lte::Quantiser::highestScale)) {
         throw Error("the scale of the quantiser is not a number above 0 and up to 1000000", "give one");
     }
     if (maxBlocks == 0 || maxBlocks > mostBlocks) {

@@ -5,8 +5,8 @@
 
 namespace quarzel::tool {
 
-/// While it lives, the first SIGINT or SIGTERM is noted and does not end the process; the next one does.
-/// One at a time.
+/// While it lives, the first SIGINT or SIGTERM is noted and does not end the process; one that comes more
+/// than a second later does. One at a time.
 class Interruption {
   public:
     Interruption();

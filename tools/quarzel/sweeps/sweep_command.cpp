@@ -115,10 +115,19 @@ std::optional<sweep::Result> finishedResult(const Options& options, const Checkp
         throw ToolError(ExitCode::interrupted, "", problem, "next time name an output with -o to keep them");
     }
     if (!isKept) {
-        throw ToolError(ExitCode::interrupted, checkpoint.file(), problem + ", and they could not be kept",
-                        "go on from what was kept before with --resume");
+        throw ToolError(
+            ExitCode::interrupted, checkpoint.file(), problem + ", and they could not be kept",
+            checkpoint.exists() ? "go on from what was kept before with --resume" : "run the command again");
     }
     throw ToolError(ExitCode::interrupted, "", problem, "go on with the same command and --resume");
+}
+
+/// What the user can do, beyond what the failure itself tells, when the result could not be written.
+const char* remedyForResult(bool isKept, const Checkpoint& checkpoint) {
+    if (isKept) {
+        return "the sweep is done: --resume then writes it at once";
+    }
+    return checkpoint.exists() ? "--resume then goes on from what was kept" : "the sweep then begins anew";
 }
 
 /// Write the output of a finished sweep. What it is written from stays until it is there.
@@ -132,9 +141,7 @@ void writeResult(const Options& options, const sweep::Dispatcher& dispatcher, co
                             ? sweep::resultText(result)
                             : sweep::partText({result.configuration, dispatcher.shard(), result.points}));
         } catch (const ToolError& error) {
-            throw ToolError(error.code(), "", error.what(),
-                            isKept ? "the sweep is done: --resume then writes it at once"
-                                   : "--resume then goes on from what was kept");
+            throw ToolError(error.code(), "", error.what(), remedyForResult(isKept, checkpoint));
         }
     }
     checkpoint.remove();
@@ -179,7 +186,14 @@ void runSweep(const Options& options, std::ostream& results, const MakeWorkers& 
         failInterrupted(dispatcher, checkpoint.save(dispatcher), checkpoint);
     }
     const sweep::Result result{configuration, dispatcher.states()};
-    writeResult(options, dispatcher, result, checkpoint);
+    try {
+        writeResult(options, dispatcher, result, checkpoint);
+    } catch (const ToolError&) {
+        if (shard.isWhole()) {
+            printSweep(results, result, options.form);  // perhaps all that is left of it
+        }
+        throw;
+    }
     printResult(options, shard, result, results);
 }
 

@@ -3,22 +3,21 @@
 
 #include <CLI/CLI.hpp>
 #include <cstdint>
-#include <optional>
 #include <string>
+#include <vector>
 
 #include "sweep/configuration.hpp"
 
 namespace quarzel::tool {
 
-/// What the user of a sweep chooses, as text where it is a list.
+/// What the user of a sweep chooses; Eb/N0 and shard as text.
 struct SweepOptions {
-    std::string blockSizes = "1024";
-    std::string units = "2";
-    std::string algorithms = "1";
-    std::string iterations = "6";
+    std::vector<std::uint64_t> blockSizes = {1024};
+    std::vector<int> units = {2};
+    std::vector<int> algorithms = {1};
+    std::vector<int> iterations = {6};
     std::string ebN0;
-    std::optional<double> scale;
-    std::optional<double> llr;
+    lte::Quantiser quantiser;
     std::uint64_t maxBlocks = 10000;
     std::uint64_t maxBlockErrors = 100;
     std::uint64_t maxSeconds = 0;

@@ -18,6 +18,7 @@
 #include "core_options.hpp"
 #include "list_option.hpp"
 #include "progress.hpp"
+#include "quantiser_options.hpp"
 #include "report_text.hpp"
 #include "sweeps/interruption.hpp"
 #include "threads_option.hpp"
@@ -35,8 +36,6 @@ struct VectorsOptions {
     std::vector<std::string> stimuli;
     std::optional<std::size_t> blocks;
     double ebN0 = 1.0;
-    std::optional<double> scale;
-    std::optional<double> llr;
     unsigned threads = allCores();
     bool replace = false;
     bool json = false;
@@ -83,16 +82,10 @@ Examples:
   quarzel compare vectors/u8_a1 simulated.hex
 )";
 
-/// The values of an option in their order, each once, or what stands for them when it is not given.
+/// The values of an option, or what stands for them when it is not given.
 template <class Value>
 std::vector<Value> orDefault(const std::vector<Value>& values, std::vector<Value> standard) {
-    std::vector<Value> chosen;
-    for (const Value& value : values) {
-        if (std::find(chosen.begin(), chosen.end(), value) == chosen.end()) {
-            chosen.push_back(value);
-        }
-    }
-    return chosen.empty() ? std::move(standard) : chosen;
+    return values.empty() ? std::move(standard) : values;
 }
 
 std::vector<std::uint32_t> allBlockSizes() {
@@ -127,16 +120,6 @@ void requireUnused(bool isGiven, const char* option) {
     }
 }
 
-lte::Quantiser quantiserOf(const VectorsOptions& options) {
-    lte::Quantiser quantiser = options.request.quantiser;
-    if (options.scale) {
-        quantiser = {lte::Quantiser::Kind::amplitude, *options.scale};
-    } else if (options.llr) {
-        quantiser = {lte::Quantiser::Kind::llr, *options.llr};
-    }
-    return quantiser;
-}
-
 VectorRequest requestOf(const VectorsOptions& options) {
     VectorRequest request = options.request;
     if (request.cover) {
@@ -162,7 +145,6 @@ VectorRequest requestOf(const VectorsOptions& options) {
     }
     request.blocks = options.blocks.value_or(request.cover ? 1 : 10);
     request.ebN0.micro = static_cast<std::int32_t>(std::lround(options.ebN0 * 1e6));
-    request.quantiser = quantiserOf(options);
     return request;
 }
 
@@ -260,17 +242,7 @@ void addVectorsCommand(CLI::App& app, std::ostream& results) {
     command->add_option("--ebn0", options->ebN0, "Eb/N0 of the noise in dB, at rate 1/3 (default 1)")
         ->type_name("DB")
         ->transform(numberIn(-50, 50));
-    CLI::Option* const llr =
-        command
-            ->add_option("--llr", options->llr,
-                         fmt::format("Soft values are log-likelihood ratios times this\n(default {})",
-                                     request.quantiser.scale))
-            ->type_name("S")
-            ->transform(numberIn(0.001, 1000));
-    command->add_option("--scale", options->scale, "Soft values are received amplitudes times this\ninstead")
-        ->type_name("S")
-        ->transform(numberIn(0.001, 1000))
-        ->excludes(llr);
+    addQuantiserOptions(*command, request.quantiser);
     command->add_option("--seed", request.seed, "Seed of bits and noise (default 1)")
         ->type_name("N")
         ->transform(wholeNumber([](std::uint64_t) { return true; }, "a whole number"));

@@ -1,15 +1,16 @@
 // SPDX-License-Identifier: MIT
-#include "value_lists.hpp"
+#include "ebn0_list.hpp"
 
 #include <fmt/format.h>
 
 #include <algorithm>
-#include <charconv>
 #include <cstddef>
 #include <optional>
 #include <string_view>
 
+#include "text_items.hpp"
 #include "tool_error.hpp"
+#include "whole_number.hpp"
 
 namespace quarzel::tool {
 
@@ -17,22 +18,6 @@ namespace {
 
 constexpr std::int64_t mostValues = 10000;
 constexpr std::size_t decimals = 6;
-
-std::vector<std::string_view> split(std::string_view text, char separator) {
-    std::vector<std::string_view> items;
-    for (std::size_t from = 0; from <= text.size();) {
-        const std::size_t to = std::min(text.find(separator, from), text.size());
-        items.push_back(text.substr(from, to - from));
-        from = to + 1;
-    }
-    return items;
-}
-
-std::optional<std::uint64_t> readDigits(std::string_view text) {
-    std::uint64_t number = 0;
-    const auto [stop, error] = std::from_chars(text.data(), text.data() + text.size(), number);
-    return error == std::errc() && stop == text.data() + text.size() ? std::optional(number) : std::nullopt;
-}
 
 /// A decimal number in millionths.
 std::int64_t readDecibels(const std::string& option, std::string_view text) {
@@ -55,15 +40,15 @@ std::int64_t readDecibels(const std::string& option, std::string_view text) {
         throw fail("has more than 6 decimals");
     }
     fraction.resize(decimals, '0');
-    const std::optional<std::uint64_t> wholeNumber = whole.empty() ? 0 : readDigits(whole);
-    const std::optional<std::uint64_t> millionths = readDigits(fraction);
-    if (!wholeNumber || !millionths) {
+    const std::optional<std::uint64_t> decibels = whole.empty() ? 0 : readWholeNumber(whole);
+    const std::optional<std::uint64_t> millionths = readWholeNumber(fraction);
+    if (!decibels || !millionths) {
         throw fail("is no number of dB");
     }
-    if (*wholeNumber > 1000) {
+    if (*decibels > 1000) {
         throw fail("lies outside -20 to 40 dB");
     }
-    const auto value = static_cast<std::int64_t>(*wholeNumber * 1'000'000 + *millionths);
+    const auto value = static_cast<std::int64_t>(*decibels * 1'000'000 + *millionths);
     return isNegative ? -value : value;
 }
 
@@ -97,8 +82,8 @@ void appendRange(const std::string& option, std::string_view item, const std::ve
 
 std::vector<lte::Decibels> readEbN0List(const std::string& option, const std::string& text) {
     std::vector<lte::Decibels> list;
-    for (const std::string_view item : split(text, ',')) {
-        const std::vector<std::string_view> parts = split(item, ':');
+    for (const std::string_view item : itemsOf(text, ',')) {
+        const std::vector<std::string_view> parts = itemsOf(item, ':');
         if (parts.size() > 1) {
             appendRange(option, item, parts, list);
         } else {
@@ -107,21 +92,6 @@ std::vector<lte::Decibels> readEbN0List(const std::string& option, const std::st
     }
     std::sort(list.begin(), list.end());
     list.erase(std::unique(list.begin(), list.end()), list.end());
-    return list;
-}
-
-std::vector<std::uint64_t> readNumberList(const std::string& option, const std::string& text) {
-    std::vector<std::uint64_t> list;
-    for (const std::string_view item : split(text, ',')) {
-        const std::optional<std::uint64_t> number = readDigits(item);
-        if (!number) {
-            throw ToolError(ExitCode::usage, option, fmt::format("'{}' is not a whole number", item),
-                            "give one or more, separated by commas");
-        }
-        if (std::find(list.begin(), list.end(), *number) == list.end()) {
-            list.push_back(*number);
-        }
-    }
     return list;
 }
 

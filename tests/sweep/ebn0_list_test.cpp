@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: MIT
-#include "sweeps/value_lists.hpp"
+#include "sweeps/ebn0_list.hpp"
 
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
@@ -63,13 +63,6 @@ TEST(EbN0List, RefusesWhatIsNoneInOneLine) {
         complaintOf("0:0.0001:1.5"),
         "--ebn0: the range '0:0.0001:1.5' has 15001 values, more than 10000; make it shorter or its step "
         "larger");
-}
-
-TEST(NumberList, KeepsTheOrderAndDropsWhatIsGivenTwice) {
-    EXPECT_THAT(tool::readNumberList("", "6144,40,0040,6144"), testing::ElementsAre(6144, 40));
-    EXPECT_THROW(tool::readNumberList("", "40,"), tool::ToolError);
-    EXPECT_THROW(tool::readNumberList("", "-1"), tool::ToolError);
-    EXPECT_THROW(tool::readNumberList("", "1.5"), tool::ToolError);
 }
 
 }  // namespace quarzel::test
