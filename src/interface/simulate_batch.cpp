@@ -1,7 +1,7 @@
 // SPDX-License-Identifier: MIT
 #include <algorithm>
-#include <compare>
 #include <span>
+#include <tuple>
 #include <vector>
 
 #include "decoder/decoder.hpp"
@@ -75,7 +75,9 @@ class WaitingBlocks {
         int iterations;
         int index;
 
-        auto operator<=>(const Block&) const = default;
+        bool operator<(const Block& other) const {
+            return std::tie(size, iterations, index) < std::tie(other.size, other.iterations, other.index);
+        }
         bool isLike(const Block& other) const { return size == other.size && iterations == other.iterations; }
     };
 
