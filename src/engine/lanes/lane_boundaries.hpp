@@ -59,28 +59,32 @@ inline Metrics<8> tailMetricsOf(const LaneGroup& group, std::size_t bundle, std:
     return tailMetrics<Lanes<8>>({{value(0), value(2), value(4)}, {value(1), value(3), value(5)}, {}});
 }
 
+/// The first word of an octet in a row of metrics.
+inline std::size_t metricWord(const LaneGroup& group, std::size_t metric, std::size_t octet,
+                              std::size_t bundle) {
+    return octetLanes * ((metric * group.octets + octet) * group.bundles + bundle);
+}
+
 /// The starts of the first passes: a block's first forward one is state 0, its last backward one comes from
 /// its tail, and of the others nothing is known.
 template <bool Normalised>
 inline void setStarts(const LaneGroup& group) {
     constexpr std::int16_t otherState = -32768 / 2;  // half of the smallest metric
     constexpr Lanes<8> unknown{};
-    const std::size_t octets = group.octets * group.bundles;
-    const std::size_t row = octetLanes * octets;
+    const std::size_t words = metricWord(group, states, 0, 0);
     for (std::size_t code = 0; code < 2; ++code) {
-        std::int16_t* const lastStarts = group.betaStart[code] + (group.windows - 1) * states * row;
-        std::memset(group.alphaStart[code], 0, states * row * sizeof(std::int16_t));
-        std::memset(group.betaStart[code], 0, group.windows * states * row * sizeof(std::int16_t));
+        std::int16_t* const alpha = group.alphaStart[code];
+        std::int16_t* const beta = group.betaStart[code];
+        std::int16_t* const lastBeta = beta + (group.windows - 1) * words;
+        std::memset(alpha, 0, words * sizeof *alpha);
+        std::memset(beta, 0, group.windows * words * sizeof *beta);
         for (std::size_t bundle = 0; bundle < group.bundles; ++bundle) {
-            std::int16_t* const first = group.alphaStart[code] + bundle * octetLanes;
-            for (std::size_t state = 1; state < states; ++state) {
-                choose(group.firstSegment, Lanes<8>::of(otherState), unknown).store(first + state * row);
-            }
-            std::int16_t* const last =
-                lastStarts + ((group.octets - 1) * group.bundles + bundle) * octetLanes;
             const Metrics<8> known = toBoundary<Normalised, 8>(tailMetricsOf(group, bundle, code));
             unrolled<states>([&](auto state) {
-                choose(group.lastSegment, known[state], unknown).store(last + state * row);
+                const Lanes<8> start = Lanes<8>::of(state == 0 ? 0 : otherState);
+                choose(group.firstSegment, start, unknown).store(alpha + metricWord(group, state, 0, bundle));
+                choose(group.lastSegment, known[state], unknown)
+                    .store(lastBeta + metricWord(group, state, group.octets - 1, bundle));
             });
         }
     }
@@ -88,18 +92,17 @@ inline void setStarts(const LaneGroup& group) {
 
 /// Start each segment where the one below it ended; a block's first one keeps its start.
 inline void handUp(const LaneGroup& group, std::int16_t* starts) {
-    const std::size_t row = octetLanes * group.octets * group.bundles;
+    const std::size_t last = group.octets - 1;
     for (std::size_t metric = 0; metric < states; ++metric) {
         for (std::size_t bundle = 0; bundle < group.bundles; ++bundle) {
-            const auto at = [&](std::size_t octet) {
-                return metric * row + octetLanes * (octet * group.bundles + bundle);
-            };
-            for (std::size_t octet = 1; octet < group.octets; ++octet) {
-                Lanes<8>::load(group.alphaState + at(octet - 1)).store(starts + at(octet));
+            for (std::size_t octet = 0; octet < last; ++octet) {
+                Lanes<8>::load(group.alphaState + metricWord(group, metric, octet, bundle))
+                    .store(starts + metricWord(group, metric, octet + 1, bundle));
             }
-            const Lanes<8> top = Lanes<8>::load(group.alphaState + at(group.octets - 1));
+            const Lanes<8> top = Lanes<8>::load(group.alphaState + metricWord(group, metric, last, bundle));
             const Lanes<8> moved{__builtin_shufflevector(top.v, top.v, 7, 0, 1, 2, 3, 4, 5, 6)};
-            choose(group.firstSegment, Lanes<8>::load(starts + at(0)), moved).store(starts + at(0));
+            std::int16_t* const first = starts + metricWord(group, metric, 0, bundle);
+            choose(group.firstSegment, Lanes<8>::load(first), moved).store(first);
         }
     }
 }
@@ -107,19 +110,17 @@ inline void handUp(const LaneGroup& group, std::int16_t* starts) {
 /// Start the last window of each segment where the first one of the segment above it ended; a block's last
 /// one keeps its start.
 inline void handDown(const LaneGroup& group, std::int16_t* starts) {
-    const std::size_t row = octetLanes * group.octets * group.bundles;
+    const std::size_t last = group.octets - 1;
     for (std::size_t metric = 0; metric < states; ++metric) {
         for (std::size_t bundle = 0; bundle < group.bundles; ++bundle) {
-            const auto at = [&](std::size_t octet) {
-                return metric * row + octetLanes * (octet * group.bundles + bundle);
-            };
-            const std::size_t last = group.octets - 1;
             for (std::size_t octet = 0; octet < last; ++octet) {
-                Lanes<8>::load(group.boundary + at(octet + 1)).store(starts + at(octet));
+                Lanes<8>::load(group.boundary + metricWord(group, metric, octet + 1, bundle))
+                    .store(starts + metricWord(group, metric, octet, bundle));
             }
-            const Lanes<8> low = Lanes<8>::load(group.boundary + at(0));
+            const Lanes<8> low = Lanes<8>::load(group.boundary + metricWord(group, metric, 0, bundle));
             const Lanes<8> moved{__builtin_shufflevector(low.v, low.v, 1, 2, 3, 4, 5, 6, 7, 0)};
-            choose(group.lastSegment, Lanes<8>::load(starts + at(last)), moved).store(starts + at(last));
+            std::int16_t* const end = starts + metricWord(group, metric, last, bundle);
+            choose(group.lastSegment, Lanes<8>::load(end), moved).store(end);
         }
     }
 }
