@@ -186,7 +186,6 @@ int vardel_ip_quarzel_bitacc_simulate_batch(vardel_ip_quarzel_state* state,
         return failed == all.end() ? 0 : *failed;
     } catch (...) {
         // Out of memory for the statuses themselves: no block was looked at.
-        quarzel::unhandledException();
-        return 99;
+        return quarzel::unhandledException();
     }
 }
