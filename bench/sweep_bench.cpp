@@ -10,8 +10,8 @@
 #include <vector>
 
 #include "bench/support.hpp"
-#include "lte/encoder.hpp"
-#include "lte/quantised_channel.hpp"
+#include "link/encoder.hpp"
+#include "link/quantised_channel.hpp"
 #include "sweep/block_simulator.hpp"
 
 namespace {
@@ -19,7 +19,7 @@ namespace {
 using namespace quarzel;
 
 constexpr int sweepIterations = 8;
-constexpr lte::Decibels ebN0 = {1'500'000};
+constexpr link::Decibels ebN0 = {1'500'000};
 
 double threadSeconds() {
     timespec time{};
@@ -75,14 +75,14 @@ void informationBits(benchmark::State& bench) {
     const auto K = static_cast<std::uint32_t>(bench.range(0));
     std::vector<std::uint8_t> bits(K);
     for (auto _ : bench) {
-        lte::RandomSource({1, K, ebN0, 1}).informationBits(3, bits.data());
+        link::RandomSource({1, K, ebN0, 1}).informationBits(3, bits.data());
         benchmark::DoNotOptimize(bits.data());
     }
     perBit(bench, K);
 }
 
 void encoder(benchmark::State& bench) {
-    const lte::Encoder encoder(static_cast<std::uint32_t>(bench.range(0)));
+    const link::Encoder encoder(static_cast<std::uint32_t>(bench.range(0)));
     std::vector<std::uint8_t> bits(encoder.blockSize(), 0x5a);
     std::vector<std::uint8_t> streams(3 * encoder.positions());
     for (auto _ : bench) {
@@ -94,11 +94,11 @@ void encoder(benchmark::State& bench) {
 
 void channel(benchmark::State& bench) {
     const auto K = static_cast<std::uint32_t>(bench.range(0));
-    const lte::QuantisedChannel channel({lte::Quantiser::Kind::llr, 8}, ebN0);
+    const link::QuantisedChannel channel({link::Quantiser::Kind::llr, 8}, ebN0);
     std::vector<std::uint8_t> streams(3 * (K + 4), 0x5a);
     std::vector<int> soft(streams.size());
     for (auto _ : bench) {
-        channel.transmit(lte::RandomSource({1, K, ebN0, 1}), streams.data(), 3, streams.size(), soft.data());
+        channel.transmit(link::RandomSource({1, K, ebN0, 1}), streams.data(), 3, streams.size(), soft.data());
         benchmark::DoNotOptimize(soft.data());
     }
     perBit(bench, K);

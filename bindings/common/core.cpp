@@ -4,7 +4,7 @@
 #include <algorithm>
 #include <vector>
 
-#include "lte/size_table.hpp"
+#include "link/size_table.hpp"
 
 namespace quarzel::bindings {
 
@@ -163,12 +163,12 @@ int algorithmOf(std::string_view name) {
 }
 
 std::uint32_t blockSizeOf(std::size_t positions) {
-    if (const LteParams* const row = lte::findPositions(positions)) {
+    if (const LteParams* const row = link::findPositions(positions)) {
         return row->K;
     }
     throw BindingError(Fault::value, "streams of " + std::to_string(positions) +
                                          " soft values fit no block size; the nearest that do: " +
-                                         lte::nearestPositionsText(positions));
+                                         link::nearestPositionsText(positions));
 }
 
 Outcome Core::open(const CoreSettings& settings) noexcept {

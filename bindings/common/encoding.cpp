@@ -4,21 +4,21 @@
 #include <algorithm>
 #include <string>
 
-#include "lte/encoder.hpp"
-#include "lte/size_table.hpp"
+#include "link/encoder.hpp"
+#include "link/size_table.hpp"
 
 namespace quarzel::bindings {
 
 Outcome encode(const std::uint8_t* bits, std::size_t K, std::size_t blocks, std::uint8_t* code) noexcept {
     return guarded([&](const Messages&) {
-        if (lte::findBlockSize(K) == nullptr) {
+        if (link::findBlockSize(K) == nullptr) {
             throw BindingError(Fault::value, "there is no block size of " + std::to_string(K) +
-                                                 " bits; the nearest: " + lte::nearestBlockSizesText(K));
+                                                 " bits; the nearest: " + link::nearestBlockSizesText(K));
         }
         if (std::any_of(bits, bits + K * blocks, [](std::uint8_t bit) { return bit > 1; })) {
             throw BindingError(Fault::value, "a bit must be 0 or 1; packed bits have to be unpacked first");
         }
-        const lte::Encoder encoder(static_cast<std::uint32_t>(K));
+        const link::Encoder encoder(static_cast<std::uint32_t>(K));
         for (std::size_t block = 0; block < blocks; ++block) {
             encoder.encode(bits + K * block, code + 3 * encoder.positions() * block);
         }

@@ -12,7 +12,7 @@
 
 #include "common/encoding.hpp"
 #include "dpi_core.hpp"
-#include "lte/size_table.hpp"
+#include "link/size_table.hpp"
 
 #define QUARZEL_DPI extern "C" __attribute__((visibility("default")))
 
@@ -226,7 +226,7 @@ QUARZEL_DPI int quarzel_dpi_encode(void* handle) {
     return withCore(handle, [](DpiCore& core) {
         std::vector<std::uint8_t> bits;
         bits.swap(core.information);
-        const std::size_t positions = bits.size() + quarzel::lte::tailPositions;
+        const std::size_t positions = bits.size() + quarzel::link::tailPositions;
         core.code.assign(3 * positions, 0);
         raise(core, encode(bits.data(), bits.size(), 1, core.code.data()));
         return static_cast<int>(positions);

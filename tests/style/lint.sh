@@ -8,6 +8,6 @@ options=()
 folders=(src)
 if [ "${3:-}" = --analyse ]; then
     options=(--checks='-*,clang-analyzer-*,-clang-analyzer-optin.*')
-    folders+=(tools/lte tools/sweep tools/quarzel)
+    folders+=(link sweep tools/quarzel)
 fi
 find "${folders[@]}" -name '*.cpp' | xargs -P "$(nproc)" -n 4 clang-tidy -p "$2" --quiet "${options[@]}"

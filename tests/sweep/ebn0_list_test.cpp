@@ -12,7 +12,7 @@ namespace {
 
 std::vector<std::int32_t> micro(const std::string& text) {
     std::vector<std::int32_t> values;
-    for (const lte::Decibels& value : tool::readEbN0List("--ebn0", text)) {
+    for (const link::Decibels& value : tool::readEbN0List("--ebn0", text)) {
         values.push_back(value.micro);
     }
     return values;

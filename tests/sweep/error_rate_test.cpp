@@ -16,7 +16,7 @@ constexpr double figureBlocks = 4000;
 
 struct Figure {
     int algorithm;
-    lte::Decibels ebN0;
+    link::Decibels ebN0;
     double bler;
 };
 
@@ -36,7 +36,7 @@ TEST(ErrorRates, LieNearIndependentFigures) {
         sweep::Configuration configuration;
         configuration.algorithms = {figure.algorithm};
         configuration.iterations = {8};
-        configuration.quantiser = {lte::Quantiser::Kind::llr, 4};  // 4 L = 8 y / sigma^2
+        configuration.quantiser = {link::Quantiser::Kind::llr, 4};  // 4 L = 8 y / sigma^2
         configuration.ebN0 = {figure.ebN0};
         configuration.maxBlocks = 320;
         configuration.maxBlockErrors = 0;

@@ -67,7 +67,7 @@ TEST(SameAnswer, IsTheStoredOne) {
     const std::string stored{std::istreambuf_iterator<char>(stream), {}};
     sweep::Configuration configuration = smallSweep();
     configuration.perIteration = true;
-    configuration.quantiser = {lte::Quantiser::Kind::llr, 8};
+    configuration.quantiser = {link::Quantiser::Kind::llr, 8};
     EXPECT_EQ(sweep::resultText(resultOf(configuration)), stored);
     const ToolRun run = runTool({"verify-result", QUARZEL_SWEEP_DATA "/small_sweep.json"});
     EXPECT_EQ(run.out,

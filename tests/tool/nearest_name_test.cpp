@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: MIT
-#include "nearest_name.hpp"
+#include "shell/nearest_name.hpp"
 
 #include <gtest/gtest.h>
 

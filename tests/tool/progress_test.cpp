@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: MIT
-#include "progress.hpp"
+#include "decode/progress.hpp"
 
 #include <gtest/gtest.h>
 

@@ -6,7 +6,7 @@
 #include <algorithm>
 #include <set>
 
-#include "core_layout.hpp"
+#include "decode/core_layout.hpp"
 
 namespace quarzel::test {
 

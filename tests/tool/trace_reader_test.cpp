@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: MIT
-#include "trace_reader.hpp"
+#include "trace/trace_reader.hpp"
 
 #include <gtest/gtest.h>
 

@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: MIT
-#include "trace_writer.hpp"
+#include "trace/trace_writer.hpp"
 
 #include <gtest/gtest.h>
 
@@ -8,7 +8,7 @@
 #include <sstream>
 
 #include "support/locale_guard.hpp"
-#include "trace_decoder.hpp"
+#include "trace/trace_decoder.hpp"
 
 namespace quarzel::test {
 

@@ -10,7 +10,7 @@
 
 #include "npy_data.hpp"
 #include "run_tool.hpp"
-#include "sha256.hpp"
+#include "sweep/sha256.hpp"
 #include "temporary_directory.hpp"
 #include "vectors/memory_image.hpp"
 
@@ -158,7 +158,7 @@ TEST_F(VectorsCommand, TellsSizeAndDigestOfEveryFile) {
         const std::string name = entry.at("name");
         ASSERT_EQ(files.count(name), 1U) << name;
         EXPECT_EQ(entry.at("bytes"), files[name].size());
-        EXPECT_EQ(entry.at("sha256"), tool::sha256(files[name]));
+        EXPECT_EQ(entry.at("sha256"), sweep::sha256(files[name]));
         files.erase(name);
     }
     EXPECT_TRUE(files.empty()) << files.begin()->first << " is not in the manifest";

@@ -9,15 +9,15 @@
 #include <string>
 #include <vector>
 
-#include "decode_command.hpp"
-#include "info_command.hpp"
-#include "nearest_name.hpp"
+#include "decode/decode_command.hpp"
+#include "decode/info_command.hpp"
 #include "plot/plot_command.hpp"
+#include "shell/nearest_name.hpp"
 #include "shell/shell_commands.hpp"
 #include "sweeps/merge_command.hpp"
 #include "sweeps/verify_result_command.hpp"
 #include "tool_error.hpp"
-#include "trace_diff_command.hpp"
+#include "trace/trace_diff_command.hpp"
 #include "vectors/compare_command.hpp"
 #include "vectors/vectors_command.hpp"
 

@@ -14,8 +14,8 @@
 
 #include "mpi_messages.hpp"
 #include "mpi_workers.hpp"
+#include "options/threads_option.hpp"
 #include "run_tool_main.hpp"
-#include "threads_option.hpp"
 
 namespace {
 

@@ -15,7 +15,7 @@
 
 #include "common/core.hpp"
 #include "common/encoding.hpp"
-#include "lte/size_table.hpp"
+#include "link/size_table.hpp"
 #include "mex_blocks.hpp"
 
 namespace {
@@ -116,7 +116,7 @@ void decode(mxArray* answer, const mxArray* const* arguments, std::vector<std::s
 void encode(mxArray* answer, const mxArray* bits) {
     const std::size_t K = mxGetM(bits);
     const std::size_t blocks = mxGetN(bits);
-    const std::array<mwSize, 3> shape = {static_cast<mwSize>(K + quarzel::lte::tailPositions), 3,
+    const std::array<mwSize, 3> shape = {static_cast<mwSize>(K + quarzel::link::tailPositions), 3,
                                          static_cast<mwSize>(blocks)};
     mxArray* const code = mxCreateNumericArray(3, shape.data(), mxUINT8_CLASS, mxREAL);
     mxSetField(answer, 0, "bits", code);

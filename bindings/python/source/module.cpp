@@ -13,7 +13,7 @@
 #include "decode_arrays.hpp"
 #include "decoder/segments.hpp"
 #include "interleaver/interleaver_3gpplte.hpp"
-#include "lte/size_table.hpp"
+#include "link/size_table.hpp"
 #include "raise.hpp"
 
 namespace py = pybind11;
@@ -33,7 +33,7 @@ std::unique_ptr<Core> makeCore(int units, int algorithm, int tagWidth) {
 Bytes encode(const Bytes& bits) {
     const auto blocks = bits.shape(0);
     const auto K = bits.shape(1);
-    Bytes code({blocks, py::ssize_t{3}, K + quarzel::lte::tailPositions});
+    Bytes code({blocks, py::ssize_t{3}, K + quarzel::link::tailPositions});
     quarzel::bindings::Outcome outcome;
     {
         const auto* const from = bits.data();
@@ -57,11 +57,11 @@ std::vector<std::uint32_t> blockSizes() {
 /// The row of K.
 /// @throws pybind11::value_error naming the nearest sizes when there is none
 const LteParams& rowOf(std::uint32_t K) {
-    if (const LteParams* const row = quarzel::lte::findBlockSize(K)) {
+    if (const LteParams* const row = quarzel::link::findBlockSize(K)) {
         return *row;
     }
     throw py::value_error("there is no block size of " + std::to_string(K) +
-                          " bits; the nearest: " + quarzel::lte::nearestBlockSizesText(K));
+                          " bits; the nearest: " + quarzel::link::nearestBlockSizesText(K));
 }
 
 Indices qpp(std::uint32_t size) {

@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: MIT
-#include "curve_labels.hpp"
+#include "plot/curve_labels.hpp"
 
 #include <fmt/format.h>
 

@@ -4,7 +4,7 @@
 #include <string>
 #include <vector>
 
-#include "sweep_curves.hpp"
+#include "plot/sweep_curves.hpp"
 
 namespace quarzel::tool {
 

@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: MIT
-#include "gnuplot.hpp"
+#include "plot/gnuplot.hpp"
 
 #include <fcntl.h>
 #include <fmt/format.h>

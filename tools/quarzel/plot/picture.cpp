@@ -1,8 +1,8 @@
 // SPDX-License-Identifier: MIT
 #include <fmt/format.h>
 
-#include "curve_labels.hpp"
-#include "plot_script.hpp"
+#include "plot/curve_labels.hpp"
+#include "plot/plot_script.hpp"
 #include "report_text.hpp"
 
 namespace quarzel::tool {

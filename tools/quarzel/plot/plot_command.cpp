@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: MIT
-#include "plot_command.hpp"
+#include "plot/plot_command.hpp"
 
 #include <fmt/format.h>
 
@@ -9,14 +9,14 @@
 #include <string>
 #include <vector>
 
-#include "choices.hpp"
-#include "core_options.hpp"
-#include "gnuplot.hpp"
-#include "list_option.hpp"
-#include "output_file.hpp"
-#include "plot_script.hpp"
+#include "files/output_file.hpp"
+#include "options/choices.hpp"
+#include "options/core_options.hpp"
+#include "options/list_option.hpp"
+#include "options/whole_number.hpp"
+#include "plot/gnuplot.hpp"
+#include "plot/plot_script.hpp"
 #include "tool_error.hpp"
-#include "whole_number.hpp"
 
 namespace quarzel::tool {
 

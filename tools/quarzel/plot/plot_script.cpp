@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: MIT
-#include "plot_script.hpp"
+#include "plot/plot_script.hpp"
 
 #include <fmt/format.h>
 

@@ -4,8 +4,8 @@
 #include <string>
 #include <vector>
 
-#include "reference_curve.hpp"
-#include "sweep_curves.hpp"
+#include "plot/reference_curve.hpp"
+#include "plot/sweep_curves.hpp"
 
 namespace quarzel::tool {
 

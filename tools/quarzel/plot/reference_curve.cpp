@@ -1,6 +1,6 @@
 // SPDX-License-Identifier: MIT
 #define CSV_IO_NO_THREAD  // the files are small
-#include "reference_curve.hpp"
+#include "plot/reference_curve.hpp"
 
 #include <fmt/format.h>
 #include <libfccp/csv.h>
@@ -9,7 +9,7 @@
 #include <cstring>
 #include <filesystem>
 
-#include "input_file.hpp"
+#include "files/input_file.hpp"
 #include "tool_error.hpp"
 
 namespace quarzel::tool {

@@ -1,11 +1,11 @@
 // SPDX-License-Identifier: MIT
-#include "sweep_curves.hpp"
+#include "plot/sweep_curves.hpp"
 
 #include <fmt/format.h>
 
 #include <iterator>
 
-#include "input_file.hpp"
+#include "files/input_file.hpp"
 #include "sweep/document.hpp"
 #include "sweep/error.hpp"
 #include "sweep/result.hpp"

@@ -3,7 +3,7 @@
 
 #include <string>
 
-#include "tool_description.hpp"
+#include "shell/tool_description.hpp"
 
 /// Scripts that complete the tool's command line in a shell.
 namespace quarzel::tool {

@@ -1,7 +1,7 @@
 // SPDX-License-Identifier: MIT
 #include <fmt/format.h>
 
-#include "completion.hpp"
+#include "shell/completion.hpp"
 
 namespace quarzel::tool {
 

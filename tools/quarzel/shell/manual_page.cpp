@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: MIT
-#include "manual_page.hpp"
+#include "shell/manual_page.hpp"
 
 #include <fmt/format.h>
 

@@ -3,7 +3,7 @@
 
 #include <string>
 
-#include "tool_description.hpp"
+#include "shell/tool_description.hpp"
 
 namespace quarzel::tool {
 

@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: MIT
-#include "shell_commands.hpp"
+#include "shell/shell_commands.hpp"
 
 #include <fmt/format.h>
 
@@ -8,9 +8,9 @@
 #include <string>
 #include <vector>
 
-#include "choices.hpp"
-#include "completion.hpp"
-#include "manual_page.hpp"
+#include "options/choices.hpp"
+#include "shell/completion.hpp"
+#include "shell/manual_page.hpp"
 #include "tool_error.hpp"
 
 namespace quarzel::tool {

@@ -1,9 +1,9 @@
 // SPDX-License-Identifier: MIT
-#include "tool_description.hpp"
+#include "shell/tool_description.hpp"
 
 #include <algorithm>
 
-#include "choices.hpp"
+#include "options/choices.hpp"
 #include "tool_error.hpp"
 
 namespace quarzel::tool {

@@ -1,12 +1,12 @@
 // SPDX-License-Identifier: MIT
-#include "checkpoint.hpp"
+#include "sweeps/checkpoint.hpp"
 
 #include <filesystem>
 #include <iostream>
 #include <utility>
 
-#include "output_file.hpp"
-#include "sweep_files.hpp"
+#include "files/output_file.hpp"
+#include "sweeps/sweep_files.hpp"
 
 namespace quarzel::tool {
 

@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: MIT
-#include "ebn0_list.hpp"
+#include "sweeps/ebn0_list.hpp"
 
 #include <fmt/format.h>
 
@@ -8,9 +8,9 @@
 #include <optional>
 #include <string_view>
 
-#include "text_items.hpp"
+#include "options/text_items.hpp"
+#include "options/whole_number.hpp"
 #include "tool_error.hpp"
-#include "whole_number.hpp"
 
 namespace quarzel::tool {
 
@@ -53,7 +53,7 @@ std::int64_t readDecibels(const std::string& option, std::string_view text) {
 }
 
 void appendRange(const std::string& option, std::string_view item, const std::vector<std::string_view>& parts,
-                 std::vector<lte::Decibels>& list) {
+                 std::vector<link::Decibels>& list) {
     const auto fail = [&](std::string_view why, std::string_view remedy) {
         return ToolError(ExitCode::usage, option, fmt::format("the range '{}' {}", item, why), remedy);
     };
@@ -80,8 +80,8 @@ void appendRange(const std::string& option, std::string_view item, const std::ve
 
 }  // namespace
 
-std::vector<lte::Decibels> readEbN0List(const std::string& option, const std::string& text) {
-    std::vector<lte::Decibels> list;
+std::vector<link::Decibels> readEbN0List(const std::string& option, const std::string& text) {
+    std::vector<link::Decibels> list;
     for (const std::string_view item : itemsOf(text, ',')) {
         const std::vector<std::string_view> parts = itemsOf(item, ':');
         if (parts.size() > 1) {

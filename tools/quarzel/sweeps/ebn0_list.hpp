@@ -4,7 +4,7 @@
 #include <string>
 #include <vector>
 
-#include "lte/decibels.hpp"
+#include "link/decibels.hpp"
 
 namespace quarzel::tool {
 
@@ -12,6 +12,6 @@ namespace quarzel::tool {
 /// FIRST, FIRST + STEP and so on up to LAST. Exact: 0:0.1:1 has 11 values.
 /// @return in ascending order, each once
 /// @throws ToolError when an item is none, or the range never ends or has very many values
-std::vector<lte::Decibels> readEbN0List(const std::string& option, const std::string& text);
+std::vector<link::Decibels> readEbN0List(const std::string& option, const std::string& text);
 
 }  // namespace quarzel::tool

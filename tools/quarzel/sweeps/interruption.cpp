@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: MIT
-#include "interruption.hpp"
+#include "sweeps/interruption.hpp"
 
 #include <atomic>
 #include <cstdint>

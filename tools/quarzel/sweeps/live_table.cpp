@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: MIT
-#include "live_table.hpp"
+#include "sweeps/live_table.hpp"
 
 #include <fmt/format.h>
 
@@ -7,7 +7,7 @@
 #include <cstdint>
 #include <optional>
 
-#include "sweep_table.hpp"
+#include "sweeps/sweep_table.hpp"
 
 namespace quarzel::tool {
 

@@ -1,15 +1,15 @@
 // SPDX-License-Identifier: MIT
-#include "merge_command.hpp"
+#include "sweeps/merge_command.hpp"
 
 #include <memory>
 #include <optional>
 #include <string>
 #include <vector>
 
-#include "output_file.hpp"
+#include "files/output_file.hpp"
 #include "sweep/part.hpp"
-#include "sweep_files.hpp"
-#include "sweep_table.hpp"
+#include "sweeps/sweep_files.hpp"
+#include "sweeps/sweep_table.hpp"
 #include "tool_error.hpp"
 
 namespace quarzel::tool {

@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: MIT
-#include "sweep_command.hpp"
+#include "sweeps/sweep_command.hpp"
 
 #include <fmt/format.h>
 #include <filesystem>
@@ -7,16 +7,16 @@
 #include <string>
 #include <utility>
 
-#include "checkpoint.hpp"
-#include "output_file.hpp"
+#include "files/output_file.hpp"
+#include "options/threads_option.hpp"
+#include "options/whole_number.hpp"
 #include "sweep/part.hpp"
-#include "sweep_files.hpp"
-#include "sweep_options.hpp"
-#include "sweep_table.hpp"
-#include "sweep_watch.hpp"
-#include "threads_option.hpp"
+#include "sweeps/checkpoint.hpp"
+#include "sweeps/sweep_files.hpp"
+#include "sweeps/sweep_options.hpp"
+#include "sweeps/sweep_table.hpp"
+#include "sweeps/sweep_watch.hpp"
 #include "tool_error.hpp"
-#include "whole_number.hpp"
 
 namespace quarzel::tool {
 

@@ -1,9 +1,9 @@
 // SPDX-License-Identifier: MIT
-#include "sweep_files.hpp"
+#include "sweeps/sweep_files.hpp"
 
 #include <iterator>
 
-#include "input_file.hpp"
+#include "files/input_file.hpp"
 
 namespace quarzel::tool {
 

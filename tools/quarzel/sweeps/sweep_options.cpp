@@ -1,19 +1,19 @@
 // SPDX-License-Identifier: MIT
-#include "sweep_options.hpp"
+#include "sweeps/sweep_options.hpp"
 
 #include <fmt/format.h>
 
 #include <string_view>
 
-#include "block_sizes.hpp"
-#include "choices.hpp"
-#include "core_options.hpp"
-#include "ebn0_list.hpp"
-#include "list_option.hpp"
-#include "quantiser_options.hpp"
+#include "options/block_sizes.hpp"
+#include "options/choices.hpp"
+#include "options/core_options.hpp"
+#include "options/list_option.hpp"
+#include "options/quantiser_options.hpp"
+#include "options/whole_number.hpp"
 #include "sweep/error.hpp"
+#include "sweeps/ebn0_list.hpp"
 #include "tool_error.hpp"
-#include "whole_number.hpp"
 
 namespace quarzel::tool {
 

@@ -17,7 +17,7 @@ struct SweepOptions {
     std::vector<int> algorithms = {1};
     std::vector<int> iterations = {6};
     std::string ebN0;
-    lte::Quantiser quantiser;
+    link::Quantiser quantiser;
     std::uint64_t maxBlocks = 10000;
     std::uint64_t maxBlockErrors = 100;
     std::uint64_t maxSeconds = 0;

@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: MIT
-#include "sweep_table.hpp"
+#include "sweeps/sweep_table.hpp"
 
 #include <fmt/format.h>
 
@@ -46,7 +46,7 @@ std::string curveText(const Curve& curve) {
                        curve.algorithm, curve.iterations, curve.iterations == 1 ? "" : "s");
 }
 
-std::string rowText(const PointState& point, lte::Decibels ebN0, const Curve& curve) {
+std::string rowText(const PointState& point, link::Decibels ebN0, const Curve& curve) {
     const Rates rates = sweep::ratesOf(point, curve.blockSize);
     return fmt::format("{:>7}{:>10}{:>11}{:>10}{:>10.2e}{:>10.2e}  {:.2e} {:.2e}", ebN0.value(), point.blocks,
                        point.last().bitErrors, point.last().blockErrors, rates.ber, rates.bler,
@@ -54,7 +54,7 @@ std::string rowText(const PointState& point, lte::Decibels ebN0, const Curve& cu
 }
 
 void printTable(std::ostream& stream, const sweep::Result& result) {
-    forEachPoint(result, [&](const Curve& curve, lte::Decibels ebN0, const PointState& point, bool isFirst) {
+    forEachPoint(result, [&](const Curve& curve, link::Decibels ebN0, const PointState& point, bool isFirst) {
         if (isFirst) {
             stream << curveText(curve) << '\n' << sweepHeadings << '\n';
         }
@@ -69,7 +69,7 @@ void printCsv(std::ostream& stream, const sweep::Result& result) {
     stream << "block_size,units,algorithm,iterations,ebn0_db,iteration,blocks,bits,bit_errors,block_errors,"
               "ber,bler,"
               "ber_low,ber_high,bler_low,bler_high,stopped_by\n";
-    forEachPoint(result, [&](const Curve& curve, lte::Decibels ebN0, const PointState& point, bool) {
+    forEachPoint(result, [&](const Curve& curve, link::Decibels ebN0, const PointState& point, bool) {
         const Rates rates = sweep::ratesOf(point, curve.blockSize);
         const std::uint64_t bits = point.blocks * curve.blockSize;
         for (std::size_t i = 0; i < point.counts.size(); ++i) {

@@ -15,7 +15,7 @@ std::string curveText(const sweep::Curve& curve);
 
 /// The headings of the columns, and a point below them.
 extern const char* const sweepHeadings;
-std::string rowText(const sweep::PointState& point, lte::Decibels ebN0, const sweep::Curve& curve);
+std::string rowText(const sweep::PointState& point, link::Decibels ebN0, const sweep::Curve& curve);
 
 void printTable(std::ostream& stream, const sweep::Result& result);
 

@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: MIT
-#include "sweep_watch.hpp"
+#include "sweeps/sweep_watch.hpp"
 
 #include <sys/ioctl.h>
 #include <unistd.h>

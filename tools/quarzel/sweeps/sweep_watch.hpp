@@ -1,10 +1,10 @@
 // SPDX-License-Identifier: MIT
 #pragma once
 
-#include "checkpoint.hpp"
-#include "interruption.hpp"
-#include "live_table.hpp"
 #include "sweep/run.hpp"
+#include "sweeps/checkpoint.hpp"
+#include "sweeps/interruption.hpp"
+#include "sweeps/live_table.hpp"
 
 namespace quarzel::tool {
 

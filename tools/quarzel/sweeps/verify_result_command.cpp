@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: MIT
-#include "verify_result_command.hpp"
+#include "sweeps/verify_result_command.hpp"
 
 #include <fmt/format.h>
 
@@ -7,11 +7,11 @@
 #include <string>
 #include <utility>
 
+#include "options/threads_option.hpp"
 #include "sweep/result.hpp"
-#include "sweep_files.hpp"
-#include "sweep_table.hpp"
-#include "sweep_watch.hpp"
-#include "threads_option.hpp"
+#include "sweeps/sweep_files.hpp"
+#include "sweeps/sweep_table.hpp"
+#include "sweeps/sweep_watch.hpp"
 
 namespace quarzel::tool {
 

@@ -4,7 +4,7 @@
 #include <CLI/CLI.hpp>
 #include <ostream>
 
-#include "sweep_command.hpp"
+#include "sweeps/sweep_command.hpp"
 #include "tool_error.hpp"
 
 namespace quarzel::tool {

@@ -1,12 +1,12 @@
 // SPDX-License-Identifier: MIT
-#include "compare_command.hpp"
+#include "vectors/compare_command.hpp"
 
 #include <memory>
 #include <string>
 
-#include "compare_report.hpp"
-#include "input_file.hpp"
-#include "npy_header.hpp"
+#include "captures/npy_header.hpp"
+#include "files/input_file.hpp"
+#include "vectors/compare_report.hpp"
 
 namespace quarzel::tool {
 

@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: MIT
-#include "compare_report.hpp"
+#include "vectors/compare_report.hpp"
 
 #include <fmt/format.h>
 

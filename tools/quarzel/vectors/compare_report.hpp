@@ -4,7 +4,7 @@
 #include <ostream>
 #include <string>
 
-#include "decision_comparison.hpp"
+#include "vectors/decision_comparison.hpp"
 
 namespace quarzel::tool {
 

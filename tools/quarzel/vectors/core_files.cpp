@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: MIT
-#include "core_files.hpp"
+#include "vectors/core_files.hpp"
 
 #include <fmt/format.h>
 
@@ -8,9 +8,9 @@
 #include <xtensor/xadapt.hpp>
 #include <xtensor/xnpy.hpp>
 
-#include "bits_file.hpp"
-#include "memory_names.hpp"
+#include "captures/bits_file.hpp"
 #include "report_text.hpp"
+#include "vectors/memory_names.hpp"
 
 namespace quarzel::tool {
 

@@ -3,9 +3,9 @@
 
 #include <vector>
 
-#include "manifest.hpp"
-#include "output_directory.hpp"
-#include "vector_blocks.hpp"
+#include "vectors/manifest.hpp"
+#include "vectors/output_directory.hpp"
+#include "vectors/vector_blocks.hpp"
 
 namespace quarzel::tool {
 

@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: MIT
-#include "decision_comparison.hpp"
+#include "vectors/decision_comparison.hpp"
 
 namespace quarzel::tool {
 

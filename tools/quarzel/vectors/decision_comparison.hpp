@@ -4,8 +4,8 @@
 #include <cstddef>
 #include <optional>
 
-#include "expected_decisions.hpp"
-#include "memory_image.hpp"
+#include "vectors/expected_decisions.hpp"
+#include "vectors/memory_image.hpp"
 
 namespace quarzel::tool {
 

@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: MIT
-#include "expected_decisions.hpp"
+#include "vectors/expected_decisions.hpp"
 
 #include <fmt/format.h>
 
@@ -8,16 +8,16 @@
 #include <iterator>
 #include <sstream>
 
-#include "bits_file.hpp"
-#include "block_sizes.hpp"
-#include "input_file.hpp"
-#include "manifest.hpp"
-#include "memory_image.hpp"
-#include "memory_names.hpp"
-#include "npy_header.hpp"
+#include "captures/bits_file.hpp"
+#include "captures/npy_header.hpp"
+#include "files/input_file.hpp"
+#include "options/block_sizes.hpp"
 #include "report_text.hpp"
-#include "sha256.hpp"
+#include "sweep/sha256.hpp"
 #include "tool_error.hpp"
+#include "vectors/manifest.hpp"
+#include "vectors/memory_image.hpp"
+#include "vectors/memory_names.hpp"
 
 namespace fs = std::filesystem;
 
@@ -48,7 +48,7 @@ std::string readUnaltered(const std::string& directory, const std::string& name,
     std::string bytes(std::istreambuf_iterator<char>(stream), {});
     const auto entry = std::find_if(content.files.begin(), content.files.end(),
                                     [&name](const VectorFile& candidate) { return candidate.name == name; });
-    if (entry == content.files.end() || entry->sha256 != sha256(bytes)) {
+    if (entry == content.files.end() || entry->sha256 != sweep::sha256(bytes)) {
         throw fileError(file, "is not the file that was made with this set: its SHA-256 differs",
                         "make the set again with 'quarzel vectors'");
     }
@@ -127,7 +127,7 @@ ExpectedDecisions readCore(const std::string& name) {
 ExpectedDecisions readPacked(std::istream& stream, const std::string& file) {
     const NpyHeader header = readNpyHeader(stream, file);
     if (header.shape.size() != 2 || header.shape[1] > lteParams.back().K / 8 ||
-        lte::findBlockSize(8 * header.shape[1]) == nullptr) {
+        link::findBlockSize(8 * header.shape[1]) == nullptr) {
         throw fileError(
             file, "has shape " + shapeText(header.shape),
             "expected bits have shape (blocks, K/8), 8 to a byte, as 'quarzel decode -o' makes them");

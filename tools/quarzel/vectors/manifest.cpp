@@ -1,12 +1,12 @@
 // SPDX-License-Identifier: MIT
-#include "manifest.hpp"
+#include "vectors/manifest.hpp"
 
 #include <fmt/format.h>
 
 #include <algorithm>
 #include <nlohmann/json.hpp>
 
-#include "input_file.hpp"
+#include "files/input_file.hpp"
 #include "tool_error.hpp"
 
 namespace quarzel::tool {

@@ -6,9 +6,9 @@
 #include <limits>
 #include <string_view>
 
-#include "memory_image.hpp"
-#include "npy_header.hpp"
+#include "captures/npy_header.hpp"
 #include "tool_error.hpp"
+#include "vectors/memory_image.hpp"
 
 namespace quarzel::tool {
 

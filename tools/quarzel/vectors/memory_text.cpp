@@ -4,8 +4,8 @@
 #include <limits>
 #include <string_view>
 
-#include "memory_image.hpp"
 #include "tool_error.hpp"
+#include "vectors/memory_image.hpp"
 
 namespace quarzel::tool {
 

@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: MIT
-#include "output_directory.hpp"
+#include "vectors/output_directory.hpp"
 
 #include <fcntl.h>
 #include <fmt/format.h>
@@ -10,8 +10,8 @@
 #include <filesystem>
 #include <set>
 
-#include "open_file.hpp"
-#include "sha256.hpp"
+#include "files/open_file.hpp"
+#include "sweep/sha256.hpp"
 
 namespace fs = std::filesystem;
 
@@ -103,7 +103,7 @@ VectorFile OutputDirectory::write(const std::string& file, std::string_view byte
     OpenFile output(path.string(), O_CREAT | O_EXCL, shown);
     output.write(bytes);
     output.close();
-    return {file, bytes.size(), sha256(bytes)};
+    return {file, bytes.size(), sweep::sha256(bytes)};
 }
 
 void OutputDirectory::finish() {

@@ -5,7 +5,7 @@
 #include <string_view>
 #include <vector>
 
-#include "manifest.hpp"
+#include "vectors/manifest.hpp"
 
 namespace quarzel::tool {
 

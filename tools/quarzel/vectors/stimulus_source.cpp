@@ -1,12 +1,12 @@
 // SPDX-License-Identifier: MIT
-#include "stimulus_source.hpp"
+#include "vectors/stimulus_source.hpp"
 
 #include <algorithm>
 #include <cstddef>
 #include <limits>
 
-#include "core_layout.hpp"
-#include "lte/encoder.hpp"
+#include "decode/core_layout.hpp"
+#include "link/encoder.hpp"
 
 namespace quarzel::tool {
 
@@ -26,20 +26,20 @@ std::vector<std::int8_t> softOf(const std::vector<std::uint8_t>& bits, std::int8
     return soft;
 }
 
-std::vector<std::uint8_t> codeWord(const lte::RandomSource& source) {
+std::vector<std::uint8_t> codeWord(const link::RandomSource& source) {
     std::vector<std::uint8_t> bits(source.blockSize());
     source.informationBits(0, bits.data());
-    const lte::Encoder encoder(source.blockSize());
+    const link::Encoder encoder(source.blockSize());
     std::vector<std::uint8_t> streams(3 * encoder.positions());
     encoder.encode(bits.data(), streams.data());
     return streams;
 }
 
-std::vector<std::uint8_t> randomBits(const lte::RandomSource& source, std::size_t count) {
-    constexpr std::size_t bitsPerGroup = 32 * lte::wordsPerGroup;
+std::vector<std::uint8_t> randomBits(const link::RandomSource& source, std::size_t count) {
+    constexpr std::size_t bitsPerGroup = 32 * link::wordsPerGroup;
     const std::size_t groups = (count + bitsPerGroup - 1) / bitsPerGroup;
-    std::vector<std::uint32_t> words(groups * lte::wordsPerGroup);
-    source.words(lte::Purpose::noise, 0, groups, words.data());
+    std::vector<std::uint32_t> words(groups * link::wordsPerGroup);
+    source.words(link::Purpose::noise, 0, groups, words.data());
     std::vector<std::uint8_t> bits(count);
     for (std::size_t i = 0; i < count; ++i) {
         bits[i] = words[i / 32] >> i % 32 & 1U;
@@ -47,7 +47,7 @@ std::vector<std::uint8_t> randomBits(const lte::RandomSource& source, std::size_
     return bits;
 }
 
-std::vector<std::int8_t> overChannel(const lte::QuantisedChannel& channel, const lte::RandomSource& source,
+std::vector<std::int8_t> overChannel(const link::QuantisedChannel& channel, const link::RandomSource& source,
                                      const std::vector<std::uint8_t>& codeBits) {
     std::vector<int> soft(codeBits.size());
     channel.transmit(source, codeBits.data(), 0, codeBits.size(), soft.data());
@@ -76,7 +76,7 @@ StimulusSource::StimulusSource(const VectorRequest& request)
 
 std::vector<std::int8_t> StimulusSource::make(const PlannedBlock& block, std::uint32_t units) const {
     const std::size_t positions = block.blockSize + 4;
-    const lte::RandomSource source(
+    const link::RandomSource source(
         {itsSeed, block.blockSize, itsEbN0,
          static_cast<std::uint64_t>(block.stimulus) << stimulusShift | block.number});
     const auto withNoiseIn = [&](const Range& range) {

@@ -4,8 +4,8 @@
 #include <cstdint>
 #include <vector>
 
-#include "lte/quantised_channel.hpp"
-#include "vector_plan.hpp"
+#include "link/quantised_channel.hpp"
+#include "vectors/vector_plan.hpp"
 
 namespace quarzel::tool {
 
@@ -23,8 +23,8 @@ class StimulusSource {
 
   private:
     std::uint64_t itsSeed;
-    lte::Decibels itsEbN0;
-    lte::QuantisedChannel itsChannel;
+    link::Decibels itsEbN0;
+    link::QuantisedChannel itsChannel;
 };
 
 }  // namespace quarzel::tool

@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: MIT
-#include "vector_blocks.hpp"
+#include "vectors/vector_blocks.hpp"
 
 #include <fmt/format.h>
 
@@ -7,7 +7,7 @@
 #include <future>
 #include <mutex>
 
-#include "core_model.hpp"
+#include "decode/core_model.hpp"
 #include "tool_error.hpp"
 
 namespace quarzel::tool {

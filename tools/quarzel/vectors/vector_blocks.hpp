@@ -6,7 +6,7 @@
 #include <functional>
 #include <vector>
 
-#include "stimulus_source.hpp"
+#include "vectors/stimulus_source.hpp"
 
 namespace quarzel::tool {
 

@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: MIT
-#include "vector_configuration.hpp"
+#include "vectors/vector_configuration.hpp"
 
 #include <fmt/format.h>
 
@@ -50,7 +50,7 @@ Json stimuliJson(const VectorRequest& request) {
 }
 
 bool isLlr(const VectorRequest& request) {
-    return request.quantiser.kind == lte::Quantiser::Kind::llr;
+    return request.quantiser.kind == link::Quantiser::Kind::llr;
 }
 
 /// The block sizes as the option takes them.

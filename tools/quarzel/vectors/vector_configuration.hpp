@@ -5,8 +5,8 @@
 #include <string>
 #include <vector>
 
-#include "manifest.hpp"
-#include "vector_plan.hpp"
+#include "vectors/manifest.hpp"
+#include "vectors/vector_plan.hpp"
 
 namespace quarzel::tool {
 

@@ -1,14 +1,14 @@
 // SPDX-License-Identifier: MIT
-#include "vector_coverage.hpp"
+#include "vectors/vector_coverage.hpp"
 
 #include <fmt/format.h>
 
 #include <limits>
 #include <nlohmann/json.hpp>
 
-#include "core_layout.hpp"
+#include "decode/core_layout.hpp"
 #include "interleaver/lte_params.hpp"
-#include "memory_names.hpp"
+#include "vectors/memory_names.hpp"
 
 namespace quarzel::tool {
 

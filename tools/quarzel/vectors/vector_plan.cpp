@@ -1,7 +1,7 @@
 // SPDX-License-Identifier: MIT
-#include "vector_plan.hpp"
+#include "vectors/vector_plan.hpp"
 
-#include "core_layout.hpp"
+#include "decode/core_layout.hpp"
 
 namespace quarzel::tool {
 

@@ -5,8 +5,8 @@
 #include <cstdint>
 #include <vector>
 
-#include "lte/channel_thresholds.hpp"
-#include "stimulus.hpp"
+#include "link/channel_thresholds.hpp"
+#include "vectors/stimulus.hpp"
 
 namespace quarzel::tool {
 
@@ -19,8 +19,8 @@ struct VectorRequest {
     std::vector<Stimulus> stimuli;
     std::size_t blocks = 0;  ///< of each stimulus
     bool cover = false;      ///< every block size once with each of its iterations in turn, and all stimuli
-    lte::Decibels ebN0;      ///< of the noise
-    lte::Quantiser quantiser = {lte::Quantiser::Kind::llr, 4};
+    link::Decibels ebN0;     ///< of the noise
+    link::Quantiser quantiser = {link::Quantiser::Kind::llr, 4};
     std::uint64_t seed = 1;
 };
 

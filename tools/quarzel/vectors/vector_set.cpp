@@ -1,14 +1,14 @@
 // SPDX-License-Identifier: MIT
-#include "vector_set.hpp"
+#include "vectors/vector_set.hpp"
 
 #include <fmt/format.h>
 
 #include <nlohmann/json.hpp>
 
-#include "core_files.hpp"
 #include "tool_error.hpp"
-#include "vector_configuration.hpp"
-#include "vector_coverage.hpp"
+#include "vectors/core_files.hpp"
+#include "vectors/vector_configuration.hpp"
+#include "vectors/vector_coverage.hpp"
 
 namespace quarzel::tool {
 

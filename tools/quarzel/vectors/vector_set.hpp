@@ -5,7 +5,7 @@
 #include <functional>
 #include <string>
 
-#include "vector_plan.hpp"
+#include "vectors/vector_plan.hpp"
 
 namespace quarzel::tool {
 

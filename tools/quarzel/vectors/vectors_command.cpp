@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: MIT
-#include "vectors_command.hpp"
+#include "vectors/vectors_command.hpp"
 
 #include <fmt/format.h>
 #include <unistd.h>
@@ -13,18 +13,18 @@
 #include <optional>
 #include <string>
 
-#include "block_sizes.hpp"
-#include "choices.hpp"
-#include "core_options.hpp"
-#include "list_option.hpp"
-#include "progress.hpp"
-#include "quantiser_options.hpp"
+#include "decode/progress.hpp"
+#include "options/block_sizes.hpp"
+#include "options/choices.hpp"
+#include "options/core_options.hpp"
+#include "options/list_option.hpp"
+#include "options/quantiser_options.hpp"
+#include "options/threads_option.hpp"
+#include "options/whole_number.hpp"
 #include "report_text.hpp"
 #include "sweeps/interruption.hpp"
-#include "threads_option.hpp"
 #include "tool_error.hpp"
-#include "vector_set.hpp"
-#include "whole_number.hpp"
+#include "vectors/vector_set.hpp"
 
 namespace quarzel::tool {
 

@@ -1,0 +1,6 @@
+// SPDX-License-Identifier: MIT
+#include "link/draw/draw_loops.hpp"
+
+namespace quarzel::link {
+extern const DrawFunctions avx512Draw = functions;
+}

@@ -1,0 +1,81 @@
+// SPDX-License-Identifier: MIT
+// The one text of the drawing loops, compiled for each instruction set. All in an unnamed namespace, so that
+// no function compiled for a new processor reaches an old one through the linker.
+#pragma once
+
+#include <Random123/philox.h>
+
+#include "link/draw/draw.hpp"
+
+namespace quarzel::link {
+
+namespace {
+
+/// Products in 64 bits, whose upper halves may hold anything on the way: the form that vectorises best.
+void drawWords(const PhiloxInput& input, std::size_t groups, std::uint32_t* __restrict words) {
+    constexpr std::uint32_t counters = wordsPerGroup / 4;
+    constexpr std::uint64_t low = 0xffffffff;
+    for (std::size_t group = 0; group < groups; ++group, words += wordsPerGroup) {
+        const std::uint32_t first = input.counter[0] + static_cast<std::uint32_t>(group) * counters;
+        for (std::uint32_t i = 0; i < counters; ++i) {
+            std::uint64_t a = first + i;
+            std::uint64_t b = input.counter[1];
+            std::uint64_t c = input.counter[2];
+            std::uint64_t d = input.counter[3];
+            std::uint32_t key0 = input.key[0];
+            std::uint32_t key1 = input.key[1];
+            for (unsigned round = 0; round < philox4x32_rounds; ++round) {
+                const std::uint64_t product0 = (a & low) * PHILOX_M4x32_0;
+                const std::uint64_t product1 = (c & low) * PHILOX_M4x32_1;
+                a = (product1 >> 32) ^ b ^ key0;
+                b = product1;
+                c = (product0 >> 32) ^ d ^ key1;
+                d = product0;
+                key0 += PHILOX_W32_0;
+                key1 += PHILOX_W32_1;
+            }
+            words[i] = static_cast<std::uint32_t>(a);
+            words[counters + i] = static_cast<std::uint32_t>(b);
+            words[2 * counters + i] = static_cast<std::uint32_t>(c);
+            words[3 * counters + i] = static_cast<std::uint32_t>(d);
+        }
+    }
+}
+
+/// The output for one 16-bit random number and a code bit.
+inline int outputOf(std::uint32_t random, std::uint32_t codeBit, const std::int32_t* cells) {
+    const std::int32_t cell = cells[random >> 4];
+    const auto low = static_cast<std::int32_t>(random & 15U);
+    const std::int32_t threshold = cell & cellLowMask;
+    const std::int32_t one = (cell >> cellValueShift) + (low > threshold ? 1 : 0);
+    const std::int32_t negate = static_cast<std::int32_t>(codeBit) - 1;
+    const std::int32_t value = (one ^ negate) - negate;
+    const bool isUndecided = (low == threshold) | ((cell & cellManyThresholds) != 0);
+    return isUndecided ? undecided : (value < 127 ? value : 127);
+}
+
+void lookUp(const std::uint32_t* __restrict words, const std::uint8_t* __restrict codeBits, unsigned lane,
+            const std::int32_t* __restrict cells, std::size_t times, int* __restrict soft,
+            std::uint8_t* __restrict isUndecided) {
+    constexpr std::size_t half = valuesPerLookUp / 2;
+    for (std::size_t time = 0; time < times; ++time) {
+        for (std::size_t i = 0; i < half; ++i) {
+            soft[i] = outputOf(words[i] & 0xffffU, codeBits[i] >> lane & 1U, cells);
+            isUndecided[i] = soft[i] == undecided ? 1 : 0;
+        }
+        for (std::size_t i = 0; i < half; ++i) {
+            soft[half + i] = outputOf(words[i] >> 16, codeBits[half + i] >> lane & 1U, cells);
+            isUndecided[half + i] = soft[half + i] == undecided ? 1 : 0;
+        }
+        words += half;
+        codeBits += valuesPerLookUp;
+        soft += valuesPerLookUp;
+        isUndecided += valuesPerLookUp;
+    }
+}
+
+constexpr DrawFunctions functions = {drawWords, lookUp};
+
+}  // namespace
+
+}  // namespace quarzel::link

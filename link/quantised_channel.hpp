@@ -1,0 +1,42 @@
+// SPDX-License-Identifier: MIT
+#pragma once
+
+#include <array>
+#include <cstddef>
+#include <cstdint>
+
+#include "link/channel_thresholds.hpp"
+#include "link/random_source.hpp"
+
+namespace quarzel::link {
+
+/// BPSK (bit 1 is sent as +1, bit 0 as -1) over additive white Gaussian noise, quantised to the 8-bit inputs
+/// of the core, as one discrete channel: its output is drawn from the exact distribution, to 2^-48, by a
+/// table look-up.
+///
+/// Thread rule: `transmit` may be called from several threads at once.
+class QuantisedChannel {
+  public:
+    QuantisedChannel(const Quantiser& quantiser, Decibels ebN0);
+
+    /// Send the code bits of a block.
+    /// @param source    the block's random numbers; they and code bit i alone decide value i
+    /// @param codeBits  a byte for each code bit, which is bit `lane` of it
+    /// @param count     code bits, at most 3 (6144 + 4)
+    /// @param soft      receives `count` soft values, -128 to 127; positive means bit 1
+    void transmit(const RandomSource& source, const std::uint8_t* codeBits, unsigned lane, std::size_t count,
+                  int* soft) const;
+
+    /// The probability of a soft value given the code bit, as `transmit` draws it.
+    double probability(int soft, bool codeBit) const;
+
+  private:
+    int outputOf(std::uint64_t random) const;
+    int softOf(std::uint64_t random, bool codeBit) const;
+    void makeCells();
+
+    ChannelThresholds itsThresholds;
+    std::array<std::int32_t, cellCount> itsCells{};
+};
+
+}  // namespace quarzel::link

@@ -1,0 +1,74 @@
+// SPDX-License-Identifier: MIT
+#include "link/random_source.hpp"
+
+#include <algorithm>
+#include <array>
+#include <cstring>
+
+namespace quarzel::link {
+
+namespace {
+
+// The first word of the counter: index in bits 0 to 15, purpose in 16 to 18, K in 19 to 31.
+constexpr unsigned purposeShift = 16;
+constexpr unsigned blockSizeShift = 19;
+
+/// For each byte the 8 bytes that hold its bits, the lowest first.
+using SpreadTable = std::array<std::array<std::uint8_t, 8>, 256>;
+
+constexpr SpreadTable makeSpreadTable() {
+    SpreadTable table{};
+    for (unsigned byte = 0; byte < table.size(); ++byte) {
+        for (unsigned bit = 0; bit < 8; ++bit) {
+            table[byte][bit] = byte >> bit & 1U;
+        }
+    }
+    return table;
+}
+
+constexpr SpreadTable spreadTable = makeSpreadTable();
+
+/// Set bit `lane` of each of `count` bytes, a multiple of 8, that is set in the words, lowest bit first.
+void spreadBits(const std::uint32_t* words, unsigned lane, std::size_t count, std::uint8_t* bytes) {
+    for (std::size_t at = 0; at < count; at += 8) {
+        // Shifts and ors of 8 bytes together, none of which reaches into another.
+        std::uint64_t eight = 0;
+        std::uint64_t sum = 0;
+        std::memcpy(&eight, spreadTable[words[at / 32] >> at % 32 & 0xffU].data(), 8);
+        std::memcpy(&sum, bytes + at, 8);
+        sum |= eight << lane;
+        std::memcpy(bytes + at, &sum, 8);
+    }
+}
+
+}  // namespace
+
+RandomSource::RandomSource(const BlockName& name)
+    : itsInput{{name.blockSize << blockSizeShift, static_cast<std::uint32_t>(name.block),
+                static_cast<std::uint32_t>(name.ebN0.micro), static_cast<std::uint32_t>(name.block >> 32)},
+               {static_cast<std::uint32_t>(name.seed), static_cast<std::uint32_t>(name.seed >> 32)}},
+      itsBlockSize(name.blockSize) {}
+
+PhiloxInput RandomSource::input(Purpose purpose, std::uint32_t index) const {
+    PhiloxInput input = itsInput;
+    input.counter[0] |= static_cast<std::uint32_t>(purpose) << purposeShift | index;
+    return input;
+}
+
+void RandomSource::words(Purpose purpose, std::uint32_t firstGroup, std::size_t groups,
+                         std::uint32_t* words) const {
+    drawFunctions().drawWords(input(purpose, firstGroup * static_cast<std::uint32_t>(wordsPerGroup / 4)),
+                              groups, words);
+}
+
+void RandomSource::informationBits(unsigned lane, std::uint8_t* bits) const {
+    constexpr std::uint32_t bitsPerGroup = 32 * wordsPerGroup;
+    std::array<std::uint32_t, wordsPerGroup> words;
+    for (std::uint32_t at = 0; at < itsBlockSize; at += bitsPerGroup) {
+        this->words(Purpose::informationBits, at / bitsPerGroup, 1, words.data());
+        const std::size_t count = std::min<std::size_t>(bitsPerGroup, itsBlockSize - at);
+        spreadBits(words.data(), lane, count, bits + at);
+    }
+}
+
+}  // namespace quarzel::link

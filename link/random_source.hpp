@@ -1,0 +1,56 @@
+// SPDX-License-Identifier: MIT
+#pragma once
+
+#include <cstddef>
+#include <cstdint>
+
+#include "link/decibels.hpp"
+#include "link/draw/draw.hpp"
+
+namespace quarzel::link {
+
+/// What names the random numbers of a code block. Equal names give equal numbers on every machine; different
+/// ones independent numbers. What is not in it, the configuration of the core and the quantiser, is compared
+/// on the same bits and the same noise.
+struct BlockName {
+    std::uint64_t seed;
+    std::uint32_t blockSize;  ///< K
+    Decibels ebN0;
+    std::uint64_t block;  ///< number of the block at its point, below 2^48
+};
+
+/// What random numbers are for. Numbers for different purposes are independent.
+enum class Purpose : std::uint32_t {
+    informationBits = 0,
+    noise = 1,
+    refinement = 2,  ///< further bits of noise where the first do not decide
+};
+
+/// The random numbers of one code block, from the counter-based generator Philox4x32-10. The key is the seed;
+/// the counter is made of the name, the purpose and the index, each in bits of its own.
+///
+/// Thread rule: all functions may be called from several threads at once.
+class RandomSource {
+  public:
+    explicit RandomSource(const BlockName& name);
+
+    std::uint32_t blockSize() const { return itsBlockSize; }
+
+    /// Draw random words, in groups of wordsPerGroup.
+    /// @param firstGroup  number of the first group, from 0
+    /// @param words       receives groups * wordsPerGroup words
+    void words(Purpose purpose, std::uint32_t firstGroup, std::size_t groups, std::uint32_t* words) const;
+
+    /// Draw the information bits.
+    /// @param lane  which bit, 0 to 7, of the bytes they go to: the bytes can hold 8 blocks side by side
+    /// @param bits  K bytes; the other bits of them are kept
+    void informationBits(unsigned lane, std::uint8_t* bits) const;
+
+  private:
+    PhiloxInput input(Purpose purpose, std::uint32_t index) const;
+
+    PhiloxInput itsInput;
+    std::uint32_t itsBlockSize;
+};
+
+}  // namespace quarzel::link

@@ -1,0 +1,176 @@
+// SPDX-License-Identifier: MIT
+#include "link/quantised_channel.hpp"
+
+#include <gtest/gtest.h>
+
+#include <algorithm>
+#include <array>
+#include <cmath>
+#include <random>
+#include <vector>
+
+#include "support/random.hpp"
+
+namespace {
+
+using namespace quarzel::link;
+
+using Counts = std::array<double, 256>;  ///< of the soft values -128 to 127
+
+struct Channel {
+    Quantiser quantiser;
+    Decibels ebN0;
+};
+
+/// From hardly any noise to much, from few outputs to clipping nearly everything.
+const std::vector<Channel> channels = {
+    {{Quantiser::Kind::llr, 4}, {600000}},
+    {{Quantiser::Kind::amplitude, 8}, {0}},
+    {{Quantiser::Kind::amplitude, 0.4}, {0}},
+    {{Quantiser::Kind::amplitude, 127}, {1000000}},
+    {{Quantiser::Kind::amplitude, 5000}, {-3000000}},
+    {{Quantiser::Kind::llr, 16}, {10000000}},
+};
+
+constexpr std::uint32_t K = 6144;
+constexpr std::size_t codeBits = 3 * (K + 4);
+
+Counts drawn(const Channel& channel, bool codeBit, std::uint64_t seed, std::size_t blocks) {
+    const QuantisedChannel quantised(channel.quantiser, channel.ebN0);
+    const std::vector<std::uint8_t> bits(codeBits, codeBit ? 1 : 0);
+    std::vector<int> soft(codeBits);
+    Counts counts{};
+    for (std::size_t block = 0; block < blocks; ++block) {
+        quantised.transmit(RandomSource({seed, K, channel.ebN0, block}), bits.data(), 0, codeBits,
+                           soft.data());
+        for (const int value : soft) {
+            counts.at(static_cast<std::size_t>(value + 128)) += 1;
+        }
+    }
+    return counts;
+}
+
+/// How far two sets of counts, or counts and expectations, are apart: chi-square, normalised to a mean of 0
+/// and a deviation of 1 (Wilson and Hilferty). Values that are expected less than 20 times are taken
+/// together.
+double deviation(const Counts& observed, const Counts& expected, double varianceOfDifference) {
+    double chiSquare = 0;
+    double cells = 0;
+    double restObserved = 0;
+    double restExpected = 0;
+    const auto add = [&](double o, double e) {
+        chiSquare += (o - e) * (o - e) / (e * varianceOfDifference);
+        cells += 1;
+    };
+    for (std::size_t i = 0; i < observed.size(); ++i) {
+        restObserved += observed[i];
+        restExpected += expected[i];
+        if (restExpected >= 20) {
+            add(restObserved, restExpected);
+            restObserved = restExpected = 0;
+        }
+    }
+    if (restExpected >= 1) {
+        add(restObserved, restExpected);
+    }
+    const double freedom = std::max(cells - 1, 1.0);
+    const double spread = 2 / (9 * freedom);
+    return (std::cbrt(chiSquare / freedom) - (1 - spread)) / std::sqrt(spread);
+}
+
+TEST(QuantisedChannel, DrawsTheExactDistribution) {
+    const std::uint64_t seed = quarzel::test::seededRandom()();
+    constexpr std::size_t blocks = 40;
+    for (const Channel& channel : channels) {
+        for (const bool codeBit : {false, true}) {
+            const QuantisedChannel quantised(channel.quantiser, channel.ebN0);
+            Counts expected{};
+            double total = 0;
+            for (int soft = -128; soft <= 127; ++soft) {
+                const double probability = quantised.probability(soft, codeBit);
+                total += probability;
+                expected.at(static_cast<std::size_t>(soft + 128)) = probability * codeBits * blocks;
+            }
+            EXPECT_NEAR(total, 1, 1e-14);
+            EXPECT_LT(deviation(drawn(channel, codeBit, seed, blocks), expected, 1), 5)
+                << channel.quantiser.scale << ' ' << codeBit;
+        }
+    }
+}
+
+// The road that the channel replaces: a Gaussian number, the quantiser in floating point.
+TEST(QuantisedChannel, DrawsWhatAGaussianSourceAndARoundingQuantiserGive) {
+    std::mt19937 random = quarzel::test::seededRandom();
+    constexpr std::size_t blocks = 20;
+    for (const Channel& channel : channels) {
+        const double variance = 1.5 * std::pow(10, -channel.ebN0.value() / 10);
+        const double units =
+            channel.quantiser.scale * (channel.quantiser.kind == Quantiser::Kind::llr ? 2 / variance : 1.0);
+        std::normal_distribution<double> received(-1, std::sqrt(variance));
+        Counts plain{};
+        for (std::size_t i = 0; i < blocks * codeBits; ++i) {
+            const double soft = std::clamp(std::round(units * received(random)), -128.0, 127.0);
+            plain.at(static_cast<std::size_t>(soft + 128)) += 1;
+        }
+        EXPECT_LT(deviation(drawn(channel, false, random(), blocks), plain, 2), 5) << channel.quantiser.scale;
+    }
+}
+
+// The outputs of a 16-bit random number, one threshold after another, must not depend on how cells are cut.
+TEST(QuantisedChannel, GivesTheSameOutputsWithEveryInstructionSet) {
+    std::mt19937 random = quarzel::test::seededRandom();
+    std::vector<std::int32_t> cells(cellCount);
+    for (std::int32_t& cell : cells) {
+        const auto value = static_cast<std::int32_t>(random() % 257) - 128;
+        const auto place = static_cast<std::int32_t>(random() % 17);
+        cell = value * 256 + (place == 16 ? cellNoThreshold : place) +
+               (random() % 50 == 0 ? cellManyThresholds : 0);
+    }
+    constexpr std::size_t times = 64;
+    std::vector<std::uint32_t> words(times * valuesPerLookUp / 2);
+    std::vector<std::uint8_t> bits(times * valuesPerLookUp);
+    std::generate(words.begin(), words.end(), [&] { return static_cast<std::uint32_t>(random()); });
+    std::generate(bits.begin(), bits.end(), [&] { return static_cast<std::uint8_t>(random()); });
+    std::vector<std::vector<int>> outputs;
+    for (std::size_t i = 0; i < supportedDrawFunctions().size; ++i) {
+        std::vector<int> soft(bits.size());
+        std::vector<std::uint8_t> isUndecided(soft.size());
+        supportedDrawFunctions().first[i]->lookUp(words.data(), bits.data(), 3, cells.data(), times,
+                                                  soft.data(), isUndecided.data());
+        for (std::size_t at = 0; at < soft.size(); ++at) {
+            EXPECT_EQ(isUndecided[at], soft[at] == undecided ? 1 : 0);
+        }
+        outputs.push_back(std::move(soft));
+    }
+    for (const std::vector<int>& soft : outputs) {
+        EXPECT_EQ(soft, outputs.back());
+    }
+}
+
+TEST(QuantisedChannel, GivesAValueThatDependsOnItsOwnBitAlone) {
+    const Channel& channel = channels[0];
+    const QuantisedChannel quantised(channel.quantiser, channel.ebN0);
+    const RandomSource source({7, K, channel.ebN0, 3});
+    std::vector<std::uint8_t> bits(codeBits);
+    std::vector<int> whole(codeBits);
+    std::mt19937 random = quarzel::test::seededRandom();
+    std::generate(bits.begin(), bits.end(), [&] { return static_cast<std::uint8_t>(random()); });
+    quantised.transmit(source, bits.data(), 6, codeBits, whole.data());
+    for (const std::size_t count : {1U, 31U, 32U, 132U, 1025U}) {
+        std::vector<int> part(count + 1, 4711);
+        quantised.transmit(source, bits.data(), 6, count, part.data());
+        EXPECT_TRUE(std::equal(part.begin(), part.end() - 1, whole.begin()));
+        EXPECT_EQ(part.back(), 4711) << "nothing beyond may be written";
+    }
+    std::vector<std::uint8_t> others(codeBits);
+    std::transform(bits.begin(), bits.end(), others.begin(),
+                   [](std::uint8_t bit) { return static_cast<std::uint8_t>(bit ^ 0x40U); });
+    std::vector<int> opposite(codeBits);
+    quantised.transmit(source, others.data(), 6, codeBits, opposite.data());
+    for (std::size_t i = 0; i < codeBits; ++i) {
+        // -128 and 127 stand for more than one value before clipping.
+        ASSERT_EQ(std::clamp(-whole[i], -127, 127), std::max(opposite[i], -127)) << i;
+    }
+}
+
+}  // namespace

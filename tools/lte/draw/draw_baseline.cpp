@@ -1,6 +1,0 @@
-// SPDX-License-Identifier: MIT
-#include "draw_loops.hpp"
-
-namespace quarzel::lte {
-extern const DrawFunctions baselineDraw = functions;
-}

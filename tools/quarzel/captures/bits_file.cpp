@@ -1,0 +1,74 @@
+// SPDX-License-Identifier: MIT
+#include "captures/bits_file.hpp"
+
+#include <fmt/format.h>
+
+#include <array>
+#include <bit>
+#include <xtensor/xadapt.hpp>
+#include <xtensor/xnpy.hpp>
+
+#include "captures/npy_header.hpp"
+#include "files/input_file.hpp"
+#include "files/output_file.hpp"
+#include "tool_error.hpp"
+
+namespace quarzel::tool {
+
+void PackedBits::set(std::size_t block, const unsigned char* bits) {
+    for (std::size_t i = 0; i < bytesPerBlock; ++i, bits += 8) {
+        unsigned byte = 0;
+        for (std::size_t bit = 0; bit < 8; ++bit) {
+            byte = byte << 1 | bits[bit];
+        }
+        bytes[block * bytesPerBlock + i] = static_cast<std::uint8_t>(byte);
+    }
+}
+
+PackedBits readBits(const std::string& file, std::size_t blocks, std::size_t bytesPerBlock) {
+    std::ifstream stream = openInput(file);
+    const NpyHeader header = readNpyHeader(stream, file);
+    if (header.type != "|u1") {
+        throw fileError(file, fmt::format("holds values of type '{}'", header.type),
+                        "save bits as uint8 with numpy.packbits(bits, axis=1)");
+    }
+    requireCOrder(header, file);
+    const std::vector<std::uint64_t> shape = {blocks, bytesPerBlock};
+    if (header.shape != shape) {
+        throw fileError(
+            file, "has shape " + shapeText(header.shape),
+            fmt::format("for this capture it must be {}, that is (blocks, K/8)", shapeText(shape)));
+    }
+    PackedBits bits(blocks, 8 * bytesPerBlock);
+    if (!stream.read(reinterpret_cast<char*>(bits.bytes.data()),
+                     static_cast<std::streamsize>(bits.bytes.size()))) {
+        throw fileError(file, "ends within its array", "copy it again, it was cut short");
+    }
+    requireEnd(stream, file);
+    return bits;
+}
+
+std::string npyOf(const PackedBits& bits) {
+    const std::array<std::size_t, 2> shape = {bits.blocks(), bits.bytesPerBlock};
+    return xt::dump_npy(xt::adapt(bits.bytes, shape));
+}
+
+void writeBits(const std::string& file, const PackedBits& bits) {
+    writeOutput(file, npyOf(bits));
+}
+
+BitErrors countErrors(const PackedBits& decided, const PackedBits& sent) {
+    BitErrors errors;
+    for (std::size_t block = 0; block < sent.blocks(); ++block) {
+        std::size_t bits = 0;
+        for (std::size_t i = block * sent.bytesPerBlock; i < (block + 1) * sent.bytesPerBlock; ++i) {
+            bits += static_cast<std::size_t>(
+                std::popcount(static_cast<std::uint8_t>(decided.bytes[i] ^ sent.bytes[i])));
+        }
+        errors.bits += bits;
+        errors.blocks += bits > 0 ? 1 : 0;
+    }
+    return errors;
+}
+
+}  // namespace quarzel::tool

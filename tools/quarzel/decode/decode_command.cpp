@@ -1,0 +1,193 @@
+// SPDX-License-Identifier: MIT
+#include "decode/decode_command.hpp"
+
+#include <fmt/format.h>
+#include <unistd.h>
+
+#include <chrono>
+#include <iostream>
+#include <memory>
+#include <optional>
+#include <string>
+
+#include "captures/bits_file.hpp"
+#include "captures/capture_file.hpp"
+#include "decode/core_model.hpp"
+#include "decode/decode_report.hpp"
+#include "decode/decode_together.hpp"
+#include "decode/progress.hpp"
+#include "files/output_file.hpp"
+#include "options/core_options.hpp"
+#include "options/threads_option.hpp"
+#include "tool_error.hpp"
+#include "trace/trace_file.hpp"
+#include "trace/trace_options.hpp"
+
+namespace quarzel::tool {
+
+namespace {
+
+struct DecodeOptions {
+    std::string capture;
+    std::optional<std::string> reference;
+    std::optional<std::string> output;
+    CoreOptions core;
+    TraceOptions trace;
+    unsigned threads = allCores();
+    bool json = false;
+};
+
+constexpr const char* description = "Decode the code blocks of a capture";
+
+constexpr const char* footer = R"(Soft values:
+  Integers in units of 1/8: 8 stands for 1.0. The sign is the bit: POSITIVE
+  MEANS BIT 1, negative means bit 0. A log-likelihood ratio ln(P(1)/P(0)) times
+  8 fits. The core takes -128 to 127; it saturates what lies outside, with a
+  warning at the first such value.
+
+Files:
+  CAPTURE  npy (numpy.save) of int8, int16 or int32, shape (blocks, 3, K + 4).
+           Axis 1 is the systematic stream, the parity of the first and the
+           parity of the second constituent code. The last 4 positions hold the
+           12 tail values in the order of 3GPP TS 36.212, section 5.1.3.2.2.
+           'quarzel info' tells the valid K.
+           Or text: CSV with the header systematic,parity1,parity2, one position
+           a line, an empty line between blocks.
+  BITS     npy of uint8, shape (blocks, K/8): 8 bits to a byte, the first bit
+           highest, as numpy.packbits(bits, axis=1) makes them.
+  OUT      the same. It is written whole or not at all.
+  FILE     every value of every trellis step of the passes traced, as text for
+           'quarzel trace-diff' or as rows of block, pass, step, signal, state,
+           raw and real value. It is written whole or not at all, too.
+
+Examples:
+  quarzel decode capture.npy --units 8 --reference sent.npy -o decided.npy
+  quarzel decode capture.npy --units 8 --trace 12 --trace-block 5
+
+  The first decodes capture.npy as a core with 8 processing units does, compares
+  the decisions with the bits that were sent and keeps them in decided.npy. Bit
+  errors are a result, not a failure: the exit code is 0. The second prints the
+  trace of 12 passes, which are 6 iterations, of the fifth block.
+)";
+
+/// Throw when the file could not be written, or writing it would replace a file that is read.
+/// @param option  the option that names the file
+void checkOutput(const char* option, const std::string& file, const DecodeOptions& options) {
+    if (file.empty()) {
+        throw ToolError(ExitCode::usage, option, "the name of the file is empty", "give one");
+    }
+    if (isSameFile(file, options.capture) || (options.reference && isSameFile(file, *options.reference))) {
+        throw ToolError(ExitCode::usage, option, fmt::format("{} is also read", file), "give another name");
+    }
+    probeOutput(file);
+}
+
+void checkOutputs(const DecodeOptions& options) {
+    if (options.output) {
+        checkOutput("-o", *options.output, options);
+    }
+    const TraceOptions& trace = options.trace;
+    if (!trace.passes) {
+        return;
+    }
+    if (trace.isToStandardOutput()) {
+        if (options.json) {
+            throw ToolError(ExitCode::usage, "--json", "the trace goes to standard output",
+                            "name a file for it with --trace-file");
+        }
+        return;
+    }
+    checkOutput("--trace-file", trace.file, options);
+    if (options.output && isSameFile(*options.output, trace.file)) {
+        throw ToolError(ExitCode::usage, "--trace-file",
+                        fmt::format("{} is also the output of -o", trace.file), "give another name");
+    }
+}
+
+/// The trace that the user wants, or null.
+std::unique_ptr<TraceFile> openTrace(const Capture& capture, const DecodeOptions& options,
+                                     std::ostream& results) {
+    const TraceOptions& trace = options.trace;
+    if (!trace.passes) {
+        return nullptr;
+    }
+    if (trace.block > capture.blocks.size()) {
+        throw ToolError(ExitCode::usage, "--trace-block",
+                        fmt::format("{} has no block {}", options.capture, trace.block),
+                        fmt::format("give a number from 1 to {}", capture.blocks.size()));
+    }
+    return std::make_unique<TraceFile>(trace, results);
+}
+
+/// Decode one block after the other and trace what the user wants traced.
+PackedBits decodeTraced(const Capture& capture, const DecodeOptions& options, TraceFile& trace,
+                        Progress& progress) {
+    CoreModel core(options.core.units, options.core.algorithm, &trace.writer());
+    PackedBits decisions(capture.blocks.size(), capture.blockSize);
+    std::vector<unsigned char> bits(capture.blockSize);
+    for (std::size_t block = 0; block < capture.blocks.size(); ++block) {
+        if (block + 1 == options.trace.block) {
+            core.trace(*options.trace.passes);
+        }
+        if (const auto failed = core.decode({&capture.blocks[block], 1}, options.core.iterations, bits)) {
+            throw decodingError(capture, block, failed->status);
+        }
+        trace.check();
+        decisions.set(block, bits.data());
+        progress.update(block + 1);
+    }
+    trace.finish();
+    return decisions;
+}
+
+PackedBits decodeBlocks(const Capture& capture, const DecodeOptions& options, TraceFile* trace) {
+    Progress progress(std::cerr, ::isatty(STDERR_FILENO) != 0, capture.blocks.size());
+    return trace != nullptr ? decodeTraced(capture, options, *trace, progress)
+                            : decodeTogether(capture, options.core, options.threads, progress);
+}
+
+void decode(const DecodeOptions& options, std::ostream& results) {
+    checkOutputs(options);
+    const Capture capture = readCapture(options.capture);
+    std::optional<PackedBits> reference;
+    if (options.reference) {
+        reference = readBits(*options.reference, capture.blocks.size(), capture.blockSize / 8);
+    }
+    const std::unique_ptr<TraceFile> trace = openTrace(capture, options, results);
+
+    const auto start = std::chrono::steady_clock::now();
+    const PackedBits decisions = decodeBlocks(capture, options, trace.get());
+    const std::chrono::duration<double> duration = std::chrono::steady_clock::now() - start;
+
+    if (options.output) {
+        writeBits(*options.output, decisions);
+    }
+    DecodeReport report{options.capture,       capture.blockSize, options.core,
+                        capture.blocks.size(), duration.count(),  {}};
+    if (reference) {
+        report.errors = countErrors(decisions, *reference);
+    }
+    // Standard output that holds a trace holds nothing else.
+    const bool isTraceInResults = trace != nullptr && options.trace.isToStandardOutput();
+    (options.json ? printJson : printText)(isTraceInResults ? std::cerr : results, report);
+}
+
+}  // namespace
+
+void addDecodeCommand(CLI::App& app, std::ostream& results) {
+    auto options = std::make_shared<DecodeOptions>();
+    CLI::App* command = app.add_subcommand("decode", description)->group("Commands");
+    command->footer(std::string(footer) + '\n' + exitCodesHelp);
+    command->add_option("CAPTURE", options->capture, "Soft values to decode")->required()->type_name("");
+    addCoreOptions(*command, options->core);
+    command->add_option("--reference", options->reference, "Count errors against the bits in this file")
+        ->type_name("BITS");
+    command->add_option("-o,--output", options->output, "Write the decided bits to this file")
+        ->type_name("OUT");
+    addThreadsOption(*command, options->threads);
+    addTraceOptions(*command, options->trace);
+    command->add_flag("--json", options->json, "Print one JSON object instead of text");
+    command->callback([options, &results] { decode(*options, results); });
+}
+
+}  // namespace quarzel::tool

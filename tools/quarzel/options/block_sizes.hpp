@@ -1,0 +1,32 @@
+// SPDX-License-Identifier: MIT
+#pragma once
+
+#include <cstdint>
+#include <string>
+#include <vector>
+
+#include "link/size_table.hpp"
+
+namespace quarzel::tool {
+
+/// The row of a block size that the user gave.
+/// @param subject  the argument or option that he gave it with
+/// @throws ToolError naming the nearest valid ones when LTE has no such size
+const LteParams& blockSizeRow(std::uint64_t K, const std::string& subject);
+
+/// The block size K whose blocks have this many positions, K + 4, in each stream.
+/// @param where  the file, and the line when it is known, for the error message
+/// @throws ToolError naming the nearest valid numbers when no K fits
+std::uint32_t blockSizeOf(std::uint64_t positions, const std::string& where);
+
+/// Equally spaced block sizes.
+struct BlockSizeRange {
+    std::uint32_t first;
+    std::uint32_t last;
+    std::uint32_t step;
+};
+
+/// The valid block sizes as ranges, in ascending order.
+std::vector<BlockSizeRange> blockSizeRanges();
+
+}  // namespace quarzel::tool
