@@ -8,10 +8,20 @@
 #include "fixed/string_utilities.hpp"
 #include "fixed/text_output.hpp"
 
+namespace {
+
+/// Read the next line. A stream that has none is left at its end, but has not failed.
+/// @return whether there was one
+bool readLine(std::istream& stream, std::string& line) {
+    return stream.good() && stream.peek() != std::istream::traits_type::eof() && std::getline(stream, line);
+}
+
+}  // namespace
+
 bool parse(std::istream& stream, std::map<std::string, std::string>& parameters, bool addKeys) {
     bool allGood = true;
     std::size_t lineNumber = 0;
-    for (std::string line; std::getline(stream, line);) {
+    for (std::string line; readLine(stream, line);) {
         ++lineNumber;
         line.resize(std::min({line.find("//"), line.find('#'), line.size()}));
         if (line.find('=') == std::string::npos) {
@@ -32,6 +42,7 @@ bool parse(std::istream& stream, std::map<std::string, std::string>& parameters,
 
 bool parse(const std::string& fileName, std::map<std::string, std::string>& parameters, bool addKeys) {
     std::ifstream file(fileName);
+    file.peek();  // A directory opens as a file does and fails when it is read.
     if (!file) {
         quarzel::errorLine("ERROR:Could not open input file '" + fileName + "'");
         return false;

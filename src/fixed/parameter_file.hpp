@@ -14,7 +14,9 @@
 /// either may be empty. A line without "=" is skipped. Of several lines with the same key the last one
 /// counts.
 ///
-/// @param stream      lines ended by line feeds, read to the end of the stream; the last one may lack its own
+/// @param stream      lines ended by line feeds, read to the end of the stream; the last one may lack its
+///                    own. The stream is then at its end and has not failed. One that has failed before is
+///                    neither read nor changed
 /// @param parameters  the map. A value that is there already is replaced
 /// @param addKeys     whether keys that the map lacks are added to it. If not, each line with such a key is
 ///                    an error, and the lines after it are read all the same
@@ -27,7 +29,7 @@ bool parse(std::istream& stream, std::map<std::string, std::string>& parameters,
 /// Read parameter lines from a file; see above.
 ///
 /// @param fileName  the name of the file
-/// @return          as above; also false when the file cannot be opened, after
+/// @return          as above; also false when the file cannot be opened or is a directory, after
 ///
 ///   ERROR:Could not open input file 'fileName'
 bool parse(const std::string& fileName, std::map<std::string, std::string>& parameters, bool addKeys);

@@ -70,7 +70,8 @@ std::uint32_t wholeSeconds(double seconds) {
 }  // namespace
 
 std::string toSIString(long double value, unsigned precision) {
-    return (value < 0 ? "-" : "") + magnitudeText(std::fabs(value), precision);
+    const bool negative = std::signbit(value) && !std::isnan(value);
+    return (negative ? "-" : "") + magnitudeText(std::fabs(value), precision);
 }
 
 std::string toSIString(double value, unsigned precision) {

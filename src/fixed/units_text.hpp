@@ -1,14 +1,14 @@
 // SPDX-License-Identifier: MIT
 #pragma once
 
+#include <concepts>
 #include <cstdint>
 #include <string>
 
 #pragma GCC visibility push(default)  // the shared library offers these functions
 
 /// Numbers and durations as text with a unit. No locale is asked: the decimal point is a point and digits are
-/// never grouped. A plain `int` converts equally well to several of the types below, so give a literal its
-/// type: `toSIString(1500.0, 2)`, `timeToString(90U)`.
+/// never grouped. `toSIString` and `timeToString` take integers of any type, by the templates at the end.
 
 /// A number with an SI prefix: 1500 with precision 2 is "1.50 k".
 ///
@@ -22,7 +22,7 @@
 /// The last range is written unscaled. The limits are those of type double. Infinity is "inf P" and what is
 /// no number "nan p".
 ///
-/// @param value      the number; a "-" stands before the text of a negative one
+/// @param value      the number; a "-" stands before the text of a negative one, -0.0 included
 /// @param precision  digits after the point. Above 16445, the decimals that the smallest long double has, it
 ///                   counts as that
 std::string toSIString(long double value, unsigned precision);
@@ -57,3 +57,15 @@ std::string timeToString(long seconds);
 std::uint32_t stringToTime(const std::string& text);
 
 #pragma GCC visibility pop
+
+/// A number with an SI prefix, from an integer of any other type.
+template <std::integral Integer>
+std::string toSIString(Integer value, unsigned precision) {
+    return toSIString(static_cast<long double>(value), precision);
+}
+
+/// A duration from an integer of any other type, kept to its low 32 bits.
+template <std::integral Integer>
+std::string timeToString(Integer seconds) {
+    return timeToString(static_cast<std::uint32_t>(seconds));
+}

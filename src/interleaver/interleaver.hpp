@@ -18,7 +18,8 @@ class TInterleaver {
     static std::vector<std::string> getNames();
 
     /// Compute the permutation of block size K: entry i is the natural-order position that is read at
-    /// interleaved position i.
+    /// interleaved position i. Room for K entries is reserved first, also for a K that is then refused: ask
+    /// `valid` about one that may be huge.
     /// @return false, with `out` empty, when the family has no such K
     virtual bool calcInterleaver(std::vector<std::uint32_t>& out, unsigned K) const = 0;
 

@@ -28,11 +28,11 @@ TInterleaver3GPPLTE* TInterleaver3GPPLTE::create(const std::string& properties) 
 
 bool TInterleaver3GPPLTE::calcInterleaver(std::vector<std::uint32_t>& out, unsigned K) const {
     out.clear();
+    out.reserve(K);
     const LteParams* params = findParams(K);
     if (params == nullptr) {
         return false;
     }
-    out.reserve(K);
     // Steps of the polynomial, as the hardware's address generator adds them up: nothing exceeds 2K, while
     // the product f2 i^2 of a large block would not fit 32 bits.
     const std::uint32_t increment = (2 * params->f2) % K;

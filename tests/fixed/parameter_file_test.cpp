@@ -158,10 +158,30 @@ TEST(ParameterFile, ReadsNothingFromAStreamAtItsEnd) {
     std::istringstream stream("a");
     stream.get();
     stream.peek();
-    ASSERT_TRUE(stream.eof());
+    ASSERT_EQ(stream.rdstate(), std::ios::eofbit);
     Parameters parameters;
     EXPECT_TRUE(parse(stream, parameters, false));
     EXPECT_THAT(parameters, IsEmpty());
+    EXPECT_EQ(stream.rdstate(), std::ios::eofbit);
+}
+
+TEST(ParameterFile, LeavesItsStreamAtItsEndAndNotFailed) {
+    for (const std::string text : {"", "\n", "\n\n", "a = 1", "a = 1\n", "a = 1\nb", "a = 1\n\n", "# c"}) {
+        std::istringstream stream(text);
+        stream.exceptions(std::ios::failbit | std::ios::badbit);
+        Parameters parameters;
+        EXPECT_TRUE(parse(stream, parameters, true)) << text;
+        EXPECT_EQ(stream.rdstate(), std::ios::eofbit) << text;
+    }
+}
+
+TEST(ParameterFile, ReadsNothingFromAStreamThatHasFailed) {
+    std::istringstream stream("a = 1\n");
+    stream.setstate(std::ios::failbit);
+    Parameters parameters;
+    EXPECT_TRUE(parse(stream, parameters, true));
+    EXPECT_THAT(parameters, IsEmpty());
+    EXPECT_EQ(stream.rdstate(), std::ios::failbit);
 }
 
 TEST(ParameterFile, BeginsWhereTheStreamStands) {
@@ -187,14 +207,35 @@ TEST(ParameterFile, IsReadByItsName) {
     EXPECT_EQ(parameters, (Parameters{{"a", "1"}, {"b", "3"}, {"foo", "2"}}));
 }
 
-TEST(ParameterFile, IsReportedIfItCannotBeOpened) {
+TEST(ParameterFile, MayBeEmpty) {
+    const TemporaryFile file("");
+    Parameters parameters = {{"a", "old"}};
+    bool good = false;
+    const Output output = capture([&] { good = parse(file.path(), parameters, false); });
+    EXPECT_TRUE(good);
+    EXPECT_EQ(output.out + output.err, "");
+    EXPECT_EQ(parameters, (Parameters{{"a", "old"}}));
+}
+
+/// Expect that a name cannot be opened.
+void expectNoFile(const std::string& name) {
     Parameters parameters = {{"a", "old"}};
     bool good = true;
-    const Output output = capture([&] { good = parse("no such folder/no such file", parameters, true); });
+    const Output output = capture([&] { good = parse(name, parameters, true); });
     EXPECT_FALSE(good);
     EXPECT_EQ(output.out, "");
-    EXPECT_EQ(output.err, "ERROR:Could not open input file 'no such folder/no such file'\n");
+    EXPECT_EQ(output.err, "ERROR:Could not open input file '" + name + "'\n");
     EXPECT_EQ(parameters, (Parameters{{"a", "old"}}));
+}
+
+TEST(ParameterFile, IsReportedIfItCannotBeOpened) {
+    expectNoFile("no such folder/no such file");
+    expectNoFile("");
+}
+
+TEST(ParameterFile, IsReportedIfItIsADirectory) {
+    expectNoFile(testing::TempDir());
+    expectNoFile(".");
 }
 
 }  // namespace

@@ -43,10 +43,14 @@ TEST(SiText, ScalesByThePrefixAndKeepsThePrecision) {
     EXPECT_EQ(toSIString(2.0e-14, 2), "0.02 p");
 }
 
-TEST(SiText, WritesZeroWithoutPrefixOrSign) {
+TEST(SiText, WritesZeroWithoutPrefix) {
     EXPECT_EQ(toSIString(0.0, 3), "0.000 ");
-    EXPECT_EQ(toSIString(-0.0, 3), "0.000 ");
     EXPECT_EQ(toSIString(0U, 0), "0 ");
+}
+
+TEST(SiText, KeepsTheSignOfANegativeZero) {
+    EXPECT_EQ(toSIString(-0.0, 3), "-0.000 ");
+    EXPECT_EQ(toSIString(-0.0L, 0), "-0 ");
 }
 
 struct Limit {
@@ -103,8 +107,21 @@ TEST(SiText, WritesIntegers) {
     EXPECT_EQ(toSIString(std::numeric_limits<std::uint64_t>::max(), 3), "18446.744 P");
 }
 
+TEST(SiText, WritesIntegersOfEveryType) {
+    EXPECT_EQ(toSIString(1500, 2), "1.50 k");
+    EXPECT_EQ(toSIString(0, 0), "0 ");
+    EXPECT_EQ(toSIString(short{-501}, 3), "-0.501 k");
+    EXPECT_EQ(toSIString(std::numeric_limits<int>::min(), 9), "-2.147483648 G");
+    EXPECT_EQ(toSIString(-500L, 0), "-500 ");
+    EXPECT_EQ(toSIString(501UL, 3), "0.501 k");
+    EXPECT_EQ(toSIString(-1500LL, 1), "-1.5 k");
+    EXPECT_EQ(toSIString(std::numeric_limits<unsigned long long>::max(), 3), "18446.744 P");
+}
+
 TEST(SiText, KeepsAllDigitsOfA64BitInteger) {
     EXPECT_EQ(toSIString(std::uint64_t{9007199254740993}, 15), "9.007199254740993 P");
+    EXPECT_EQ(toSIString(9007199254740993ULL, 15), "9.007199254740993 P");
+    EXPECT_EQ(toSIString(-9007199254740993LL, 15), "-9.007199254740993 P");
 }
 
 TEST(SiText, WritesInfinityAndWhatIsNoNumber) {
@@ -193,6 +210,15 @@ TEST(TimeText, KeepsTheLow32BitsOfAWiderInteger) {
     EXPECT_EQ(timeToString(-4294967295L), "1s");
     EXPECT_EQ(timeToString(-1L), "16570.1days");
     EXPECT_EQ(timeToString(std::numeric_limits<long>::min()), "0s");
+}
+
+TEST(TimeText, KeepsTheLow32BitsOfAnIntegerOfAnyType) {
+    EXPECT_EQ(timeToString(90), "1.5min");
+    EXPECT_EQ(timeToString(-1), "16570.1days");
+    EXPECT_EQ(timeToString(4294967295UL), "16570.1days");
+    EXPECT_EQ(timeToString(4294967296ULL + 60), "1min");
+    EXPECT_EQ(timeToString(std::numeric_limits<unsigned long long>::max()), "16570.1days");
+    EXPECT_EQ(timeToString(-4294967295LL), "1s");
 }
 
 TEST(TimeText, DoesNotDependOnTheGlobalLocale) {

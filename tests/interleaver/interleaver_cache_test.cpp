@@ -75,7 +75,7 @@ TEST(InterleaverCache, WritesTheInverseToItsOwnTableAndOnlySizesAForeignOne) {
 }
 
 TEST(InterleaverCache, IsEmptyAfterARefusedBlockSize) {
-    for (const unsigned K : {0U, 32U, 44U, 6152U, 0xFFFFFFFFU}) {
+    for (const unsigned K : {0U, 32U, 44U, 6152U, 65576U}) {
         const std::unique_ptr<TInterleaver> interleaver(TInterleaver3GPPLTE::create(""));
         interleaver->calcDeinterleaver(interleaver->itsInversePermutation, 40);
         ASSERT_EQ(interleaver->itsInversePermutation.size(), 40U);

@@ -89,10 +89,16 @@ TEST_F(LtePermutation, IsKnownForTheBlockSizesOfLteAlone) {
 TEST_F(LtePermutation, IsRefusedForSizesOfAnyMagnitude) {
     for (const std::uint32_t K : {0U, 8U, 32U, 39U, 44U, 520U, 6145U, 6152U, 65576U, 0x80000000U, 0x80000028U,
                                   0xFFFFFFF8U, 0xFFFFFFFFU}) {
-        Permutation permutation = {1, 2, 3};
         EXPECT_FALSE(interleaver->valid(K)) << K;
+    }
+}
+
+TEST_F(LtePermutation, ReservesRoomForASizeBeforeItIsRefused) {
+    for (const std::uint32_t K : {8U, 32U, 39U, 44U, 520U, 6145U, 6152U, 65576U}) {
+        Permutation permutation = {1, 2, 3};
         EXPECT_FALSE(interleaver->calcInterleaver(permutation, K)) << K;
         EXPECT_THAT(permutation, IsEmpty()) << K;
+        EXPECT_GE(permutation.capacity(), K) << K;
     }
 }
 
