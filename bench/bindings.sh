@@ -1,6 +1,6 @@
 #!/usr/bin/env bash
 # SPDX-License-Identifier: MIT
-# The batch decode of the bindings beside the C batch call, in turns: bindings.sh [PYTHON]. Needs build/release.
+# The batch decode of the bindings beside the C array call, in turns: bindings.sh [PYTHON]. Needs build/release.
 set -euo pipefail
 cd "$(dirname "$0")/.."
 build=build/release

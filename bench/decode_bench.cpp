@@ -7,9 +7,9 @@
 
 #include "bench/support.hpp"
 #include "decoder/decoder_3gpu.hpp"
-#include "decoder/lane_decode.hpp"
-#include "engine/lanes/lanes.hpp"
 #include "interface/state.hpp"
+#include "lanes/lane_decode.hpp"
+#include "lanes/lanes.hpp"
 #include "support/count_allocations.hpp"
 
 namespace {

@@ -9,8 +9,8 @@
 
 #include "bench/lane_kernels.hpp"
 #include "bench/support.hpp"
-#include "decoder/lane_decode.hpp"
 #include "interleaver/interleaver.hpp"
+#include "lanes/lane_decode.hpp"
 
 namespace quarzel::bench {
 
@@ -41,7 +41,7 @@ class LaidOut {
             const auto& in = itsBlocks.inputs[i];
             blocks.push_back({{in.rsc1_sys, in.rsc1_par, in.rsc2_par}, itsBlocks.outputs[i].dout});
         }
-        itsDecoder.decode(K, iterations, 1, std::span(blocks).first(width / lanes::octetLanes));
+        itsDecoder.decode(K, iterations, 1, std::span(blocks).first(width / lanes::sliceLanes));
         itsGroup = kept;
     }
 
@@ -76,7 +76,7 @@ void measure(benchmark::State& bench, const LaneKernels& kernels, Kernel kernel)
         benchmark::ClobberMemory();
     }
     const auto rows =
-        static_cast<double>(group.steps * group.octets) * static_cast<double>(bench.iterations());
+        static_cast<double>(group.steps * group.slices) * static_cast<double>(bench.iterations());
     bench.counters["row"] =
         benchmark::Counter(rows, benchmark::Counter::kIsRate | benchmark::Counter::kInvert);
     bench.counters["bit"] = benchmark::Counter(rows * static_cast<double>(kernels.width),

@@ -2,7 +2,7 @@
 // Compiled once for each instruction set, with QUARZEL_KERNELS its name and QUARZEL_KERNELS_LANES its lanes.
 #include "bench/lane_kernels.hpp"
 
-#include "engine/lanes/lane_loops.hpp"
+#include "lanes/lane_loops.hpp"
 
 namespace quarzel::bench {
 
@@ -17,7 +17,7 @@ void forEachWindow(const LaneGroup& group, Visit visit) {
     std::size_t bottom = 0;
     for (std::size_t w = 0; w < group.windows; ++w) {
         const typename Decoder::Window window{bottom, group.windowLength[w], w == 0, w + 1 == group.windows};
-        for (std::size_t column = 0; column < group.octets; ++column) {
+        for (std::size_t column = 0; column < group.slices; ++column) {
             visit(window, column);
         }
         bottom += window.length;

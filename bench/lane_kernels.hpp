@@ -3,7 +3,7 @@
 
 #include <cstddef>
 
-#include "engine/lanes/lane_group.hpp"
+#include "lanes/lane_group.hpp"
 
 namespace quarzel::bench {
 

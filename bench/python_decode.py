@@ -1,9 +1,8 @@
 # SPDX-License-Identifier: MIT
-"""Python's batch decode beside the C batch call: python_decode.py LIBRARY [BLOCKS [K]]
+"""Python's batch decode beside the C array call: python_decode.py LIBRARY [BLOCKS [K]]
 
-LIBRARY is the shared library, whose batch call takes ready-made ints; the package is found on PYTHONPATH. Both
-decode the same noisy blocks with 2 units, algorithm type 1 and 6 iterations, in turns; the best time of each
-counts.
+LIBRARY is the shared library; the package is found on PYTHONPATH. Both decode the same array of noisy int8 blocks
+with 2 units, algorithm type 1 and 6 iterations, in turns; the best time of each counts. Then one block is traced.
 """
 
 import ctypes
@@ -20,18 +19,22 @@ ROUNDS = 7
 
 class Inputs(ctypes.Structure):
     _fields_ = [(name, ctypes.c_void_p) for name in ("rsc1_sys", "rsc1_par", "rsc2_par")] + [
+        ("block_stride", ctypes.c_ssize_t),
+        ("position_stride", ctypes.c_ssize_t),
+        ("value_type", ctypes.c_int),
         ("din_size", ctypes.c_int),
+        ("count", ctypes.c_int),
         ("iterations", ctypes.c_int),
-        ("tag", ctypes.c_uint),
+        ("tags", ctypes.c_void_p),
     ]
 
 
 class Outputs(ctypes.Structure):
     _fields_ = [
         ("dout", ctypes.c_void_p),
-        ("dout_alloc_size", ctypes.c_int),
-        ("dout_size", ctypes.c_int),
-        ("tag", ctypes.c_uint),
+        ("block_stride", ctypes.c_ssize_t),
+        ("iteration_stride", ctypes.c_ssize_t),
+        ("tags", ctypes.c_void_p),
     ]
 
 
@@ -40,7 +43,7 @@ class Generics(ctypes.Structure):
 
 
 class CModel:
-    """The C batch call on ints, with everything made ready before the clock runs."""
+    """The C array call, with everything made ready before the clock runs."""
 
     def __init__(self, path, soft):
         self.library = ctypes.CDLL(path)
@@ -50,18 +53,14 @@ class CModel:
         self.library.vardel_ip_quarzel_get_default_generics(ctypes.byref(generics))
         self.state = ctypes.c_void_p(self.library.vardel_ip_quarzel_create_state(generics))
         blocks, _, positions = soft.shape
-        self.ints = soft.astype(np.int32)
         self.bits = np.zeros((blocks, positions - 4), dtype=np.uint8)
-        self.inputs = (Inputs * blocks)()
-        self.outputs = (Outputs * blocks)()
-        for block in range(blocks):
-            streams = (self.ints[block, stream].ctypes.data for stream in range(3))
-            self.inputs[block] = Inputs(*streams, positions, ITERATIONS, 0)
-            self.outputs[block] = Outputs(self.bits[block].ctypes.data, positions - 4, 0, 0)
+        streams = (soft[:, stream].ctypes.data for stream in range(3))
+        self.inputs = Inputs(*streams, 3 * positions, 1, soft.itemsize, positions, blocks, ITERATIONS, None)
+        self.outputs = Outputs(self.bits.ctypes.data, positions - 4, 0, None)
 
     def decode(self):
-        status = self.library.vardel_ip_quarzel_bitacc_simulate_batch(
-            self.state, self.outputs, self.inputs, len(self.inputs), None
+        status = self.library.vardel_ip_quarzel_bitacc_simulate_array(
+            self.state, ctypes.byref(self.outputs), ctypes.byref(self.inputs), None
         )
         if status != 0:
             sys.exit(f"the C interface returned {status}")
@@ -87,8 +86,10 @@ def main():
     python, c = (min(column) for column in zip(*times))
     megabits = blocks * K * 1e-6
     print(f"{blocks} blocks of K = {K}, {ITERATIONS} iterations, best of {ROUNDS}")
-    print(f"C batch call  {megabits / c:8.1f} Mbit/s")
+    print(f"C array call  {megabits / c:8.1f} Mbit/s")
     print(f"Python        {megabits / python:8.1f} Mbit/s  {100 * c / python:.1f} % of C")
+    trace = min(seconds(lambda: decoder.trace(soft[0], iterations=ITERATIONS)) for _ in range(ROUNDS))
+    print(f"Python trace  {1e3 * trace:8.1f} ms for a block of K = {K}, {2 * ITERATIONS} passes")
 
 
 if __name__ == "__main__":

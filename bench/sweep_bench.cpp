@@ -1,17 +1,20 @@
 // SPDX-License-Identifier: MIT
 // A sweep next to the decoder alone, in turns, so that what else the machine does strikes both: "share" is
-// the decoder's time over the sweep's, 1 when bits, encoder, noise and counting cost nothing. And those by
-// themselves, in nanoseconds for an information bit.
+// the decoder's time over the sweep's, 1 when bits, encoder, noise and counting cost nothing. A sweep that
+// counts errors after every iteration next to one that does not: "cost" is the ratio of their times. And the
+// parts of a sweep by themselves, in nanoseconds for an information bit.
 #include <benchmark/benchmark.h>
 
 #include <algorithm>
 #include <ctime>
 #include <numeric>
+#include <span>
 #include <vector>
 
 #include "bench/support.hpp"
 #include "link/encoder.hpp"
 #include "link/quantised_channel.hpp"
+#include "quarzel/core.hpp"
 #include "sweep/block_simulator.hpp"
 
 namespace {
@@ -27,11 +30,11 @@ double threadSeconds() {
     return static_cast<double>(time.tv_sec) + static_cast<double>(time.tv_nsec) * 1e-9;
 }
 
-/// Groups of blocks as a sweep hands them out.
-std::vector<std::uint64_t> groupsOf(std::uint64_t K) {
-    std::vector<std::uint64_t> groups(std::max<std::uint64_t>(32768 / (8 * K), 1));
-    std::iota(groups.begin(), groups.end(), 0);
-    return groups;
+/// Octets of blocks as a sweep hands them out.
+std::vector<std::uint64_t> octetsOf(std::uint64_t K) {
+    std::vector<std::uint64_t> octets(std::max<std::uint64_t>(32768 / (8 * K), 1));
+    std::iota(octets.begin(), octets.end(), 0);
+    return octets;
 }
 
 void sweepAndDecoder(benchmark::State& bench) {
@@ -40,22 +43,20 @@ void sweepAndDecoder(benchmark::State& bench) {
     sweep::BlockSimulator simulator(configuration, channels);
     const sweep::Curve curve{static_cast<std::uint32_t>(bench.range(0)), static_cast<int>(bench.range(1)),
                              static_cast<int>(bench.range(2)), sweepIterations};
-    const std::vector<std::uint64_t> groups = groupsOf(curve.blockSize);
+    const std::vector<std::uint64_t> octets = octetsOf(curve.blockSize);
 
-    const bench::State core = bench::makeState(curve.units, curve.algorithm);
-    bench::Blocks blocks(curve.blockSize, groups.size() * 8);
-    for (vardel_ip_quarzel_inputs& inputs : blocks.inputs) {
-        inputs.iterations = sweepIterations;
-    }
+    Core core(CoreSettings{curve.units, curve.algorithm});
+    bench::Blocks blocks(curve.blockSize, octets.size() * 8);
+    const std::vector<std::int8_t> soft(blocks.soft.begin(), blocks.soft.end());
     double sweepSeconds = 0;
     double decoderSeconds = 0;
-    simulator.simulate(curve, ebN0, groups);
+    simulator.simulate(curve, ebN0, octets);
     for (auto _ : bench) {
         const double start = threadSeconds();
-        benchmark::DoNotOptimize(simulator.simulate(curve, ebN0, groups));
+        benchmark::DoNotOptimize(simulator.simulate(curve, ebN0, octets));
         const double middle = threadSeconds();
-        vardel_ip_quarzel_bitacc_simulate_batch(core.get(), blocks.outputs.data(), blocks.inputs.data(),
-                                                static_cast<int>(blocks.inputs.size()), nullptr);
+        core.decode(softBlocks(std::span(soft), curve.blockSize + tailPositions), sweepIterations,
+                    blocks.bits);
         sweepSeconds += middle - start;
         decoderSeconds += threadSeconds() - middle;
     }
@@ -63,6 +64,32 @@ void sweepAndDecoder(benchmark::State& bench) {
     bench.counters["share"] = decoderSeconds / sweepSeconds;
     bench.counters["sweep ns/bit"] = sweepSeconds / bits * 1e9;
     bench.counters["decoder ns/bit"] = decoderSeconds / bits * 1e9;
+}
+
+void everyIteration(benchmark::State& bench) {
+    const sweep::Configuration onlyLast;
+    sweep::Configuration every;
+    every.perIteration = true;
+    sweep::Channels channels(onlyLast.quantiser);
+    sweep::BlockSimulator simulatorOfLast(onlyLast, channels);
+    sweep::BlockSimulator simulatorOfEvery(every, channels);
+    const sweep::Curve curve{static_cast<std::uint32_t>(bench.range(0)), 8, 1,
+                             static_cast<int>(bench.range(1))};
+    const std::vector<std::uint64_t> octets = octetsOf(curve.blockSize);
+    const auto secondsOf = [&](sweep::BlockSimulator& simulator) {
+        const double start = threadSeconds();
+        benchmark::DoNotOptimize(simulator.simulate(curve, ebN0, octets));
+        return threadSeconds() - start;
+    };
+    double secondsOfLast = 0;
+    double secondsOfEvery = 0;
+    for (auto _ : bench) {
+        secondsOfLast += secondsOf(simulatorOfLast);
+        secondsOfEvery += secondsOf(simulatorOfEvery);
+        secondsOfEvery += secondsOf(simulatorOfEvery);  // the second finds the caches warm
+        secondsOfLast += secondsOf(simulatorOfLast);
+    }
+    bench.counters["cost"] = secondsOfEvery / secondsOfLast;
 }
 
 /// Report the time for an information bit.
@@ -96,7 +123,7 @@ void channel(benchmark::State& bench) {
     const auto K = static_cast<std::uint32_t>(bench.range(0));
     const link::QuantisedChannel channel({link::Quantiser::Kind::llr, 8}, ebN0);
     std::vector<std::uint8_t> streams(3 * (K + 4), 0x5a);
-    std::vector<int> soft(streams.size());
+    std::vector<std::int8_t> soft(streams.size());
     for (auto _ : bench) {
         channel.transmit(link::RandomSource({1, K, ebN0, 1}), streams.data(), 3, streams.size(), soft.data());
         benchmark::DoNotOptimize(soft.data());
@@ -107,6 +134,10 @@ void channel(benchmark::State& bench) {
 BENCHMARK(sweepAndDecoder)
     ->ArgNames({"K", "units", "algorithm"})
     ->ArgsProduct({{40, 1024, 6144}, {2, 8}, {0, 1, 2}})
+    ->Unit(benchmark::kMicrosecond);
+BENCHMARK(everyIteration)
+    ->ArgNames({"K", "iterations"})
+    ->ArgsProduct({{40, 1024, 6144}, {1, 6, 15}})
     ->Unit(benchmark::kMicrosecond);
 BENCHMARK(informationBits)->Arg(40)->Arg(1024)->Arg(6144);
 BENCHMARK(encoder)->Arg(40)->Arg(1024)->Arg(6144);

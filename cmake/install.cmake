@@ -5,13 +5,11 @@ include(CMakePackageConfigHelpers)
 set(package_dir ${CMAKE_INSTALL_LIBDIR}/cmake/vardel_ip_quarzel)
 install(TARGETS vardel_ip_quarzel vardel_ip_quarzel_static EXPORT vardel_ip_quarzel)
 install(FILES ${PROJECT_SOURCE_DIR}/include/vardel_ip_quarzel.h TYPE INCLUDE)
+install(DIRECTORY ${PROJECT_SOURCE_DIR}/include/quarzel TYPE INCLUDE)
 foreach(folder fixed interleaver engine decoder)
   install(DIRECTORY ${PROJECT_SOURCE_DIR}/src/${folder} DESTINATION ${CMAKE_INSTALL_INCLUDEDIR}/quarzel
           FILES_MATCHING PATTERN "*.hpp")
 endforeach()
-# What a state is made of, for programs that put a component of their own into one.
-install(FILES ${PROJECT_SOURCE_DIR}/src/interface/state.hpp
-        DESTINATION ${CMAKE_INSTALL_INCLUDEDIR}/quarzel/interface)
 install(EXPORT vardel_ip_quarzel NAMESPACE vardel_ip_quarzel:: DESTINATION ${package_dir}
         FILE vardel_ip_quarzel-targets.cmake)
 

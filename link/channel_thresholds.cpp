@@ -25,7 +25,7 @@ class Number {
     mpfr_t itsValue;
 };
 
-/// Frees at its end the constants that the library keeps for each thread: threads come and go.
+/// Frees the constants that the library keeps for a thread when the function ends: threads come and go.
 class FreedCache {
   public:
     FreedCache() = default;
@@ -75,7 +75,7 @@ ChannelThresholds channelThresholds(const Quantiser& quantiser, Decibels ebN0) {
         mpfr_ui_sub(x.get(), 1, x.get(), MPFR_RNDN);
         mpfr_div(x.get(), x.get(), deviationRoot2.get(), MPFR_RNDN);
         if (mpfr_cmpabs(x.get(), farAway.get()) > 0) {
-            // What the function differs from 0 and 2 by is far below half a unit, and takes long to compute.
+            // Here the function is 0 or 2 to far less than half a unit, and would take long to compute.
             thresholds[i] = mpfr_sgn(x.get()) > 0 ? 0 : std::uint64_t{1} << channelBits;
             continue;
         }

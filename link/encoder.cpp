@@ -52,22 +52,19 @@ class ConstituentEncoders {
     std::uint32_t itsDelay3 = 0;
 };
 
-const LteParams& paramsOf(std::uint32_t blockSize) {
-    if (const LteParams* const row = findBlockSize(blockSize)) {
-        return *row;
+BlockSize checkedSize(std::uint32_t K) {
+    if (const auto size = findBlockSize(K)) {
+        return *size;
     }
-    throw std::invalid_argument("LTE has no code block of " + std::to_string(blockSize) +
-                                " bits; the nearest sizes: " + nearestBlockSizesText(blockSize));
+    throw std::invalid_argument("LTE has no code block of " + std::to_string(K) +
+                                " bits; the nearest sizes: " + nearestBlockSizesText(K));
 }
 
 }  // namespace
 
 Encoder::Encoder(std::uint32_t blockSize) {
-    const LteParams& params = paramsOf(blockSize);
-    itsPermutation.reserve(blockSize);
-    for (std::uint64_t i = 0; i < blockSize; ++i) {
-        itsPermutation.push_back(static_cast<std::uint16_t>((params.f1 * i + params.f2 * i * i) % blockSize));
-    }
+    const std::vector<unsigned> table = permutation(checkedSize(blockSize).K);
+    itsPermutation.assign(table.begin(), table.end());
 }
 
 void Encoder::encode(const std::uint8_t* bits, std::uint8_t* streams) const {

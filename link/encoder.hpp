@@ -22,7 +22,7 @@ class Encoder {
     /// K + 4, the positions of each of the three streams.
     std::size_t positions() const { return blockSize() + 4; }
 
-    /// Encode a block, or 8 blocks side by side: bit i of every byte belongs to block i.
+    /// Encode a block, or 8 blocks together: bit i of every byte belongs to block i.
     /// @param bits     K information bits, each a byte of 0 or 1; or those of 8 blocks
     /// @param streams  receives 3 (K + 4) code bits of the same form: systematic, parity of the first and
     ///                 parity of the second constituent code. The last 4 positions of each are the tail bits
@@ -30,7 +30,8 @@ class Encoder {
     void encode(const std::uint8_t* bits, std::uint8_t* streams) const;
 
   private:
-    std::vector<std::uint16_t> itsPermutation;  ///< which information bit the second code takes at each step
+    std::vector<std::uint16_t>
+        itsPermutation;  ///< the information bit that the second code takes at each step
 };
 
 }  // namespace quarzel::link

@@ -12,7 +12,7 @@ constexpr unsigned refinementBits = 32;
 constexpr std::size_t groupsAtOnce = 8;
 constexpr std::size_t valuesAtOnce = groupsAtOnce * wordsPerGroup * 2;
 
-/// The further random bits of a block, for one undecided value after the other.
+/// The further random bits of a block, for one undecided value after another.
 class Refinement {
   public:
     explicit Refinement(const RandomSource& source) : itsSource(source) {}
@@ -47,8 +47,8 @@ QuantisedChannel::QuantisedChannel(const Quantiser& quantiser, Decibels ebN0)
     makeCells();
 }
 
-/// A threshold lies inside the 2^32 random numbers that share their upper 16 bits, or at the start of them,
-/// and then the 16 bits decide.
+/// The upper 16 bits of a random number decide its output unless a threshold lies inside the 2^32 numbers
+/// that share them.
 void QuantisedChannel::makeCells() {
     for (std::size_t cell = 0; cell < cellCount; ++cell) {
         const auto startOf = [cell](std::uint64_t low) {
@@ -58,8 +58,8 @@ void QuantisedChannel::makeCells() {
         const int last = outputOf(startOf(16) - 1);
         std::int32_t place = cellNoThreshold;
         if (last == first + 1) {
-            // Where it rises; a threshold at the very start of a number's range makes no difference to taking
-            // the range for undecided, but for time.
+            // The place where it rises. A threshold at the very start of a range leaves nothing undecided in
+            // it; to take it for undecided costs time but gives the same outputs.
             for (std::int32_t low = 0; low < 16; ++low) {
                 if (outputOf(startOf(static_cast<std::uint64_t>(low) + 1) - 1) == last) {
                     place = low;
@@ -78,17 +78,18 @@ int QuantisedChannel::outputOf(std::uint64_t random) const {
     return lowestOutput + static_cast<int>(above - itsThresholds.begin());
 }
 
-int QuantisedChannel::softOf(std::uint64_t random, bool codeBit) const {
-    return codeBit ? std::min(outputOf(random), 127) : std::min(-outputOf(random), 127);
+std::int8_t QuantisedChannel::softOf(std::uint64_t random, bool codeBit) const {
+    const int output = outputOf(random);
+    return static_cast<std::int8_t>(std::min(codeBit ? output : -output, 127));
 }
 
 void QuantisedChannel::transmit(const RandomSource& source, const std::uint8_t* codeBits, unsigned lane,
-                                std::size_t count, int* soft) const {
+                                std::size_t count, std::int8_t* soft) const {
     const DrawFunctions& draw = drawFunctions();
     std::array<std::uint32_t, groupsAtOnce * wordsPerGroup> words;
     std::array<std::uint8_t, valuesAtOnce> isUndecided;
     std::array<std::uint8_t, valuesPerLookUp> lastBits{};
-    std::array<int, valuesPerLookUp> lastSoft;
+    std::array<std::int8_t, valuesPerLookUp> lastSoft;
     Refinement refinement(source);
     for (std::size_t start = 0; start < count; start += valuesAtOnce) {
         const std::size_t size = std::min(valuesAtOnce, count - start);

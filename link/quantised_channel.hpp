@@ -20,19 +20,19 @@ class QuantisedChannel {
     QuantisedChannel(const Quantiser& quantiser, Decibels ebN0);
 
     /// Send the code bits of a block.
-    /// @param source    the block's random numbers; they and code bit i alone decide value i
-    /// @param codeBits  a byte for each code bit, which is bit `lane` of it
+    /// @param source    the block's random numbers; value i depends on them and on code bit i alone
+    /// @param codeBits  a byte for each code bit, which is bit `lane` of the byte
     /// @param count     code bits, at most 3 (6144 + 4)
-    /// @param soft      receives `count` soft values, -128 to 127; positive means bit 1
+    /// @param soft      receives `count` soft values; positive means bit 1
     void transmit(const RandomSource& source, const std::uint8_t* codeBits, unsigned lane, std::size_t count,
-                  int* soft) const;
+                  std::int8_t* soft) const;
 
     /// The probability of a soft value given the code bit, as `transmit` draws it.
     double probability(int soft, bool codeBit) const;
 
   private:
     int outputOf(std::uint64_t random) const;
-    int softOf(std::uint64_t random, bool codeBit) const;
+    std::int8_t softOf(std::uint64_t random, bool codeBit) const;
     void makeCells();
 
     ChannelThresholds itsThresholds;

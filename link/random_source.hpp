@@ -9,9 +9,9 @@
 
 namespace quarzel::link {
 
-/// What names the random numbers of a code block. Equal names give equal numbers on every machine; different
-/// ones independent numbers. What is not in it, the configuration of the core and the quantiser, is compared
-/// on the same bits and the same noise.
+/// The name of the random numbers of a code block. Equal names give equal numbers on every machine, different
+/// names independent ones. The core and the quantiser are not part of it, so they are compared on the same
+/// bits and the same noise.
 struct BlockName {
     std::uint64_t seed;
     std::uint32_t blockSize;  ///< K
@@ -19,11 +19,11 @@ struct BlockName {
     std::uint64_t block;  ///< number of the block at its point, below 2^48
 };
 
-/// What random numbers are for. Numbers for different purposes are independent.
+/// The purpose of random numbers. Numbers for different purposes are independent.
 enum class Purpose : std::uint32_t {
     informationBits = 0,
     noise = 1,
-    refinement = 2,  ///< further bits of noise where the first do not decide
+    refinement = 2,  ///< further bits of noise where the first ones do not decide
 };
 
 /// The random numbers of one code block, from the counter-based generator Philox4x32-10. The key is the seed;
@@ -42,8 +42,8 @@ class RandomSource {
     void words(Purpose purpose, std::uint32_t firstGroup, std::size_t groups, std::uint32_t* words) const;
 
     /// Draw the information bits.
-    /// @param lane  which bit, 0 to 7, of the bytes they go to: the bytes can hold 8 blocks side by side
-    /// @param bits  K bytes; the other bits of them are kept
+    /// @param lane  which bit, 0 to 7, of each byte they go to: bytes can hold the bits of 8 blocks
+    /// @param bits  K bytes, whose other bits are kept
     void informationBits(unsigned lane, std::uint8_t* bits) const;
 
   private:

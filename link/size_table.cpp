@@ -7,12 +7,6 @@ namespace quarzel::link {
 
 namespace {
 
-/// The first row whose block size is K or more.
-auto atLeast(std::uint64_t K) {
-    return std::lower_bound(lteParams.begin(), lteParams.end(), K,
-                            [](const LteParams& row, std::uint64_t size) { return row.K < size; });
-}
-
 /// K of a block with this many positions; 0, which is no block size, when there is not even a tail.
 std::uint64_t sizeAt(std::uint64_t positions) {
     return positions < tailPositions ? 0 : positions - tailPositions;
@@ -29,22 +23,19 @@ std::string joinNearest(std::uint64_t K, ToText toText) {
 
 }  // namespace
 
-const LteParams* findBlockSize(std::uint64_t K) {
-    const auto row = atLeast(K);
-    return row != lteParams.end() && row->K == K ? &*row : nullptr;
-}
-
-const LteParams* findPositions(std::uint64_t positions) {
+std::optional<BlockSize> findPositions(std::uint64_t positions) {
     return findBlockSize(sizeAt(positions));
 }
 
 std::vector<std::uint32_t> nearestBlockSizes(std::uint64_t K) {
-    const auto above = atLeast(K);
+    const std::vector<BlockSize> all = blockSizes();
+    const auto above =
+        std::find_if(all.begin(), all.end(), [K](const BlockSize& size) { return size.K >= K; });
     std::vector<std::uint32_t> sizes;
-    if (above != lteParams.begin()) {
+    if (above != all.begin()) {
         sizes.push_back((above - 1)->K);
     }
-    if (above != lteParams.end()) {
+    if (above != all.end()) {
         sizes.push_back(above->K);
     }
     return sizes;

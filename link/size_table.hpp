@@ -2,22 +2,17 @@
 #pragma once
 
 #include <cstdint>
+#include <optional>
 #include <string>
 #include <vector>
 
-#include "interleaver/lte_params.hpp"
+#include "quarzel/code.hpp"
 
-/// Look-ups in the table of block sizes, and what a user is told who has none of them.
+/// Look-ups among the block sizes, and what a user is told who gives none of them.
 namespace quarzel::link {
 
-/// Positions of each stream after its K information bits: the tail.
-inline constexpr std::uint32_t tailPositions = 4;
-
-/// The row of the parameter table for a block size, or null when LTE has no such size.
-const LteParams* findBlockSize(std::uint64_t K);
-
-/// The row for blocks with this many positions, K + 4, in each stream, or null.
-const LteParams* findPositions(std::uint64_t positions);
+/// The size of blocks with this many positions, K + 4, in each stream; none when there is no such size.
+std::optional<BlockSize> findPositions(std::uint64_t positions);
 
 /// The valid block sizes next to one that is not valid, in ascending order: one on each side, or only one
 /// when K lies outside the table.

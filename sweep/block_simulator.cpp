@@ -3,22 +3,22 @@
 
 #include <algorithm>
 #include <cstring>
-#include <stdexcept>
+#include <span>
 
 namespace quarzel::sweep {
 
 namespace {
 
-/// How many of `count` decisions, bytes of 0 or 1, are not bit `lane` of their byte. 8 at a time; K is a
-/// multiple of 8.
+/// How many of `count` decisions, bytes of 0 or 1, differ from bit `lane` of the byte that was sent. Takes 8
+/// at a time; every K is a multiple of 8.
 std::uint32_t differences(const std::uint8_t* bits, unsigned lane, const unsigned char* decisions,
                           std::size_t count) {
     constexpr std::uint64_t ones = 0x0101010101010101;
     constexpr std::uint64_t evenBytes = 0x00ff00ff00ff00ff;
-    constexpr std::size_t mostAtOnce = std::size_t{255} * 8;  // sums that a byte can hold
+    constexpr std::size_t maxAtOnce = std::size_t{255} * 8;  // sums that a byte can hold
     std::uint64_t total = 0;
-    for (std::size_t start = 0; start < count; start += mostAtOnce) {
-        const std::size_t end = std::min(start + mostAtOnce, count);
+    for (std::size_t start = 0; start < count; start += maxAtOnce) {
+        const std::size_t end = std::min(start + maxAtOnce, count);
         std::uint64_t sums = 0;
         for (std::size_t i = start; i < end; i += 8) {
             std::uint64_t sent = 0;
@@ -44,38 +44,27 @@ std::shared_ptr<const link::QuantisedChannel> Channels::at(link::Decibels ebN0) 
     return channel;
 }
 
-vardel_ip_quarzel_state* BlockSimulator::coreOf(const Curve& curve) {
-    Core& core = itsCores[{curve.units, curve.algorithm}];
-    if (core == nullptr) {
-        vardel_ip_quarzel_generics generics;
-        vardel_ip_quarzel_get_default_generics(&generics);
-        generics.C_NUM_PU = curve.units;
-        generics.C_ALGORITHM_TYPE = curve.algorithm;
-        core.reset(vardel_ip_quarzel_create_state(generics));
-        if (core == nullptr) {
-            throw std::runtime_error("no model of the core could be made");
-        }
-    }
-    return core.get();
+Core& BlockSimulator::coreOf(const Curve& curve) {
+    return itsCores.try_emplace({curve.units, curve.algorithm}, CoreSettings{curve.units, curve.algorithm})
+        .first->second;
 }
 
 const link::Encoder& BlockSimulator::encoderOf(std::uint32_t blockSize) {
     return itsEncoders.try_emplace(blockSize, blockSize).first->second;
 }
 
-void BlockSimulator::send(const Curve& curve, link::Decibels ebN0, const std::vector<std::uint64_t>& groups) {
+void BlockSimulator::send(const Curve& curve, link::Decibels ebN0, const std::vector<std::uint64_t>& octets) {
     const link::Encoder& encoder = encoderOf(curve.blockSize);
     const auto channel = itsChannels.at(ebN0);
     const std::size_t codeBits = 3 * encoder.positions();
-    const std::size_t most = groups.size() * blocksPerGroup;
-    itsBits.assign(groups.size() * curve.blockSize, 0);
+    itsBits.assign(octets.size() * curve.blockSize, 0);
     itsCodeBits.resize(codeBits);
-    itsSoft.resize(most * codeBits);
+    itsSoft.resize(octets.size() * blocksPerOctet * codeBits);
     itsBlocks.clear();
-    for (std::size_t i = 0; i < groups.size(); ++i) {
-        const std::uint64_t first = groups[i] * blocksPerGroup;
+    for (std::size_t i = 0; i < octets.size(); ++i) {
+        const std::uint64_t first = octets[i] * blocksPerOctet;
         const auto lanes =
-            static_cast<unsigned>(std::min(blocksPerGroup, itsConfiguration.maxBlocks - first));
+            static_cast<unsigned>(std::min(blocksPerOctet, itsConfiguration.maxBlocks - first));
         std::uint8_t* const bits = itsBits.data() + i * curve.blockSize;
         const auto sourceOf = [&](unsigned lane) {
             return link::RandomSource({itsConfiguration.seed, curve.blockSize, ebN0, first + lane});
@@ -85,60 +74,51 @@ void BlockSimulator::send(const Curve& curve, link::Decibels ebN0, const std::ve
         }
         encoder.encode(bits, itsCodeBits.data());
         for (unsigned lane = 0; lane < lanes; ++lane) {
-            int* const soft = itsSoft.data() + itsBlocks.size() * codeBits;
-            channel->transmit(sourceOf(lane), itsCodeBits.data(), lane, codeBits, soft);
+            channel->transmit(sourceOf(lane), itsCodeBits.data(), lane, codeBits,
+                              itsSoft.data() + itsBlocks.size() * codeBits);
             itsBlocks.push_back(first + lane);
         }
     }
+    itsSoft.resize(itsBlocks.size() * codeBits);
 }
 
-void BlockSimulator::decode(const Curve& curve, int iterations) {
-    const std::size_t K = curve.blockSize;
-    const std::size_t positions = K + 4;
-    itsDecisions.resize(itsBlocks.size() * K);
-    itsInputs.clear();
-    itsOutputs.clear();
-    for (std::size_t i = 0; i < itsBlocks.size(); ++i) {
-        const int* const soft = itsSoft.data() + i * 3 * positions;
-        itsInputs.push_back(
-            {soft, soft + positions, soft + 2 * positions, static_cast<int>(positions), iterations, 0});
-        itsOutputs.push_back({itsDecisions.data() + i * K, static_cast<int>(K), 0, 0});
-    }
-    if (vardel_ip_quarzel_bitacc_simulate_batch(coreOf(curve), itsOutputs.data(), itsInputs.data(),
-                                                static_cast<int>(itsBlocks.size()), nullptr) != 0) {
-        throw std::runtime_error("the decoder refused a block of " + std::to_string(K) + " bits");
-    }
-}
-
-/// Count the bit errors of the blocks into a column of their rows.
-void BlockSimulator::count(std::uint32_t blockSize, std::size_t counts, std::size_t column) {
-    for (std::size_t i = 0; i < itsBlocks.size(); ++i) {
-        // Only the last group can be short, so block i stands in group i / 8.
-        const std::uint8_t* const bits = itsBits.data() + i / blocksPerGroup * blockSize;
-        const unsigned char* const decisions = itsDecisions.data() + i * blockSize;
-        const auto lane = static_cast<unsigned>(i % blocksPerGroup);
-        itsErrors[i * counts + column] = differences(bits, lane, decisions, blockSize);
-    }
-}
-
-ErrorList BlockSimulator::simulate(const Curve& curve, link::Decibels ebN0,
-                                   const std::vector<std::uint64_t>& groups) {
-    send(curve, ebN0, groups);
+void BlockSimulator::decode(const Curve& curve) {
     const std::size_t counts = itsConfiguration.countsOf(curve);
-    itsErrors.resize(itsBlocks.size() * counts);
-    for (std::size_t column = 0; column < counts; ++column) {
-        // A run of fewer iterations gives what the core has after them.
-        decode(curve, curve.iterations - static_cast<int>(counts - 1 - column));
-        count(curve.blockSize, counts, column);
+    itsDecisions.resize(itsBlocks.size() * counts * curve.blockSize);
+    const std::size_t positions = curve.blockSize + tailPositions;
+    const auto soft = softBlocks(std::span<const std::int8_t>(itsSoft), positions);
+    if (itsConfiguration.perIteration) {
+        coreOf(curve).decodeEveryIteration(soft, curve.iterations, itsDecisions);
+    } else {
+        coreOf(curve).decode(soft, curve.iterations, itsDecisions);
     }
+}
+
+/// The blocks with bit errors after any of the iterations that are counted.
+ErrorList BlockSimulator::count(const Curve& curve) const {
+    const std::size_t K = curve.blockSize;
+    std::vector<std::uint32_t> row(itsConfiguration.countsOf(curve));
+    const unsigned char* decisions = itsDecisions.data();
     ErrorList list;
     for (std::size_t i = 0; i < itsBlocks.size(); ++i) {
-        const std::uint32_t* const row = itsErrors.data() + i * counts;
-        if (std::any_of(row, row + counts, [](std::uint32_t errors) { return errors != 0; })) {
-            list.append(itsBlocks[i], row, counts);
+        // Only the last octet can be short, so block i is in octet i / 8.
+        const std::uint8_t* const bits = itsBits.data() + i / blocksPerOctet * K;
+        for (std::uint32_t& errors : row) {
+            errors = differences(bits, static_cast<unsigned>(i % blocksPerOctet), decisions, K);
+            decisions += K;
+        }
+        if (std::any_of(row.begin(), row.end(), [](std::uint32_t errors) { return errors != 0; })) {
+            list.append(itsBlocks[i], row.data(), row.size());
         }
     }
     return list;
+}
+
+ErrorList BlockSimulator::simulate(const Curve& curve, link::Decibels ebN0,
+                                   const std::vector<std::uint64_t>& octets) {
+    send(curve, ebN0, octets);
+    decode(curve);
+    return count(curve);
 }
 
 }  // namespace quarzel::sweep

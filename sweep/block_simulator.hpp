@@ -11,15 +11,15 @@
 
 #include "link/encoder.hpp"
 #include "link/quantised_channel.hpp"
+#include "quarzel/core.hpp"
 #include "sweep/configuration.hpp"
 #include "sweep/point_state.hpp"
-#include "vardel_ip_quarzel.h"
 
 namespace quarzel::sweep {
 
-/// The channels of a sweep, made when they are needed.
+/// The channels of a sweep, each made when it is first needed.
 ///
-/// Thread rule: for several threads at once.
+/// Thread rule: `at` may be called from several threads at once.
 class Channels {
   public:
     explicit Channels(const link::Quantiser& quantiser) : itsQuantiser(quantiser) {}
@@ -32,7 +32,7 @@ class Channels {
     std::map<link::Decibels, std::shared_ptr<const link::QuantisedChannel>> itsChannels;
 };
 
-/// Sends blocks through encoder, channel and core and counts the errors.
+/// Sends blocks through encoder, channel and core, and counts the errors.
 ///
 /// Thread rule: one thread at a time; each thread has a simulator of its own.
 class BlockSimulator {
@@ -41,36 +41,29 @@ class BlockSimulator {
     BlockSimulator(const Configuration& configuration, Channels& channels)
         : itsConfiguration(configuration), itsChannels(channels) {}
 
-    /// Simulate groups of blocks of a point.
-    /// @param groups   numbers of the groups, ascending
-    /// @return         the blocks in error
-    /// @throws std::runtime_error when the library refuses; it has said why
-    ErrorList simulate(const Curve& curve, link::Decibels ebN0, const std::vector<std::uint64_t>& groups);
+    /// Simulate octets of blocks of a point.
+    /// @param octets  their numbers, ascending
+    /// @return        the blocks in error
+    /// @throws quarzel::Error when the library refuses
+    ErrorList simulate(const Curve& curve, link::Decibels ebN0, const std::vector<std::uint64_t>& octets);
 
   private:
-    struct DestroyState {
-        void operator()(vardel_ip_quarzel_state* state) const { vardel_ip_quarzel_destroy_state(state); }
-    };
-    using Core = std::unique_ptr<vardel_ip_quarzel_state, DestroyState>;
-
-    vardel_ip_quarzel_state* coreOf(const Curve& curve);
+    Core& coreOf(const Curve& curve);
     const link::Encoder& encoderOf(std::uint32_t blockSize);
-    void send(const Curve& curve, link::Decibels ebN0, const std::vector<std::uint64_t>& groups);
-    void decode(const Curve& curve, int iterations);
-    void count(std::uint32_t blockSize, std::size_t counts, std::size_t column);
+    void send(const Curve& curve, link::Decibels ebN0, const std::vector<std::uint64_t>& octets);
+    void decode(const Curve& curve);
+    ErrorList count(const Curve& curve) const;
 
     const Configuration& itsConfiguration;
     Channels& itsChannels;
     std::map<std::pair<int, int>, Core> itsCores;  ///< by units and algorithm
     std::map<std::uint32_t, link::Encoder> itsEncoders;
-    std::vector<std::uint64_t> itsBlocks;  ///< numbers of the blocks at work
-    std::vector<std::uint8_t> itsBits;     ///< information bits, K bytes a group, a bit a block
+    std::vector<std::uint64_t> itsBlocks;  ///< numbers of the blocks that are being simulated
+    std::vector<std::uint8_t>
+        itsBits;  ///< information bits: K bytes an octet, a bit of each byte for each block
     std::vector<std::uint8_t> itsCodeBits;
-    std::vector<int> itsSoft;
-    std::vector<unsigned char> itsDecisions;
-    std::vector<vardel_ip_quarzel_inputs> itsInputs;
-    std::vector<vardel_ip_quarzel_outputs> itsOutputs;
-    std::vector<std::uint32_t> itsErrors;  ///< bit errors, a row for each block
+    std::vector<std::int8_t> itsSoft;         ///< three streams a block
+    std::vector<unsigned char> itsDecisions;  ///< of each block K for each iteration that is counted
 };
 
 }  // namespace quarzel::sweep

@@ -5,21 +5,17 @@
 #include <cmath>
 #include <string>
 
-#include "interleaver/lte_params.hpp"
+#include "quarzel/code.hpp"
 #include "sweep/error.hpp"
 
 namespace quarzel::sweep {
 
 namespace {
 
-constexpr std::size_t mostPoints = 10000;
-constexpr std::uint64_t mostBlocks = std::uint64_t{1} << 40;
+constexpr std::size_t maxPoints = 10000;
+constexpr std::uint64_t highestMaxBlocks = std::uint64_t{1} << 40;
 constexpr link::Decibels lowestEbN0 = {-20'000'000};
 constexpr link::Decibels highestEbN0 = {40'000'000};
-
-bool isBlockSize(std::uint32_t K) {
-    return std::any_of(lteParams.begin(), lteParams.end(), [K](const LteParams& row) { return row.K == K; });
-}
 
 template <class T, class IsValid>
 void checkEach(const std::vector<T>& list, const std::string& name, const std::string& wanted,
@@ -55,7 +51,8 @@ std::size_t Configuration::points() const {
 }
 
 void Configuration::check() const {
-    checkEach(blockSizes, "block size", "one of the 188 sizes of LTE, 40 to 6144", isBlockSize);
+    checkEach(blockSizes, "block size", "one of the 188 sizes of LTE, 40 to 6144",
+              [](std::uint32_t K) { return findBlockSize(K).has_value(); });
     checkEach(units, "units", "2, 4 or 8", [](int n) { return n == 2 || n == 4 || n == 8; });
     checkEach(algorithms, "algorithm", "0, 1 or 2", [](int n) { return n >= 0 && n <= 2; });
     checkEach(iterations, "iterations", "a number from 1 to 15", [](int n) { return n >= 1 && n <= 15; });
@@ -69,12 +66,12 @@ void Configuration::check() const {
     if (!(quantiser.scale > 0) || !(quantiser.scale <= link::Quantiser::highestScale)) {
         throw Error("the scale of the quantiser is not a number above 0 and up to 1000000", "give one");
     }
-    if (maxBlocks == 0 || maxBlocks > mostBlocks) {
+    if (maxBlocks == 0 || maxBlocks > highestMaxBlocks) {
         throw Error("the number of blocks is not from 1 to 2^40", "give one that is");
     }
-    if (points() > mostPoints) {
+    if (points() > maxPoints) {
         throw Error(
-            "there are " + std::to_string(points()) + " points, more than " + std::to_string(mostPoints),
+            "there are " + std::to_string(points()) + " points, more than " + std::to_string(maxPoints),
             "make a range shorter or its step larger");
     }
 }

@@ -18,7 +18,7 @@ struct Curve {
     int iterations;           ///< 1 to 15
 };
 
-/// What decides the result of a sweep; nothing else does. Every combination of block size, units, algorithm
+/// All that the result of a sweep depends on. Every combination of block size, units, algorithm
 /// and iterations makes a curve, every Eb/N0 a point of it.
 struct Configuration {
     std::vector<std::uint32_t> blockSizes = {1024};
@@ -28,9 +28,9 @@ struct Configuration {
     std::vector<link::Decibels> ebN0;  ///< of an information bit; the code rate is taken as 1/3
     link::Quantiser quantiser = {link::Quantiser::Kind::llr, 4};
     std::uint64_t seed = 1;
-    std::uint64_t maxBlocks = 10000;     ///< a point ends after so many blocks
-    std::uint64_t maxBlockErrors = 100;  ///< or with this block error; 0: however many there are
-    std::uint64_t maxSeconds = 0;        ///< or after this time; 0: however long it takes
+    std::uint64_t maxBlocks = 10000;     ///< a point ends after this many blocks
+    std::uint64_t maxBlockErrors = 100;  ///< or at this many block errors; 0: no limit
+    std::uint64_t maxSeconds = 0;        ///< or after this time; 0: no limit
     bool perIteration = false;           ///< count errors after every iteration
 
     /// The curves in their order: block sizes outermost, iterations innermost.
@@ -39,8 +39,8 @@ struct Configuration {
     /// Points of all curves. Point p is Eb/N0 number p % ebN0.size() of curve p / ebN0.size().
     std::size_t points() const;
 
-    /// Numbers of iterations after which errors are counted: all up to the last with perIteration, or only
-    /// that.
+    /// How many times the errors of a block are counted: after every iteration with perIteration, else after
+    /// the last one.
     std::size_t countsOf(const Curve& curve) const {
         return perIteration ? static_cast<std::size_t>(curve.iterations) : 1;
     }
@@ -51,8 +51,8 @@ struct Configuration {
     bool operator==(const Configuration&) const = default;
 };
 
-/// The part of the blocks of every point that one run decodes: of the groups of 8 blocks those whose number
-/// leaves the remainder `index` modulo `count`.
+/// The part of every point that one run decodes: the octets of blocks whose number leaves the remainder
+/// `index` modulo `count`.
 struct Shard {
     std::uint64_t index = 0;
     std::uint64_t count = 1;

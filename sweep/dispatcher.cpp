@@ -10,8 +10,8 @@ namespace quarzel::sweep {
 
 namespace {
 
-/// Information bits of a task: enough to fill the lanes of the decoder many times over, few enough to stay in
-/// the second-level cache and to waste little where a point ends.
+/// Information bits of a task: enough to fill the lanes of the decoder many times over, but few enough to
+/// stay in the second-level cache and to waste little where a point ends.
 constexpr std::uint64_t bitsPerTask = 32768;
 
 const Configuration& checked(const Configuration& configuration) {
@@ -21,10 +21,10 @@ const Configuration& checked(const Configuration& configuration) {
 
 }  // namespace
 
-std::vector<std::uint64_t> groupNumbers(const Task& task, const Shard& shard) {
-    std::vector<std::uint64_t> numbers(task.groups);
-    for (std::uint64_t i = 0; i < task.groups; ++i) {
-        numbers[i] = (task.firstGroup + i) * shard.count + shard.index;
+std::vector<std::uint64_t> octetNumbers(const Task& task, const Shard& shard) {
+    std::vector<std::uint64_t> numbers(task.octets);
+    for (std::uint64_t i = 0; i < task.octets; ++i) {
+        numbers[i] = (task.firstOctet + i) * shard.count + shard.index;
     }
     return numbers;
 }
@@ -37,14 +37,14 @@ Dispatcher::Dispatcher(Plan plan) : itsPlan(std::move(plan)), itsCurves(checked(
         const std::uint64_t end = itsPlan.timedOut.empty() ? 0 : itsPlan.timedOut[p];
         PointProgress progress(configuration(), shard(), end != 0 ? end : configuration().maxBlocks,
                                start[p]);
-        const std::uint64_t nextGroup = progress.groupsDone();
-        itsPoints.push_back({std::move(progress), nextGroup, std::nullopt});
+        const std::uint64_t nextOctet = progress.octetsDone();
+        itsPoints.push_back({std::move(progress), nextOctet, std::nullopt});
     }
 }
 
-std::uint64_t Dispatcher::usualGroups(std::size_t point) const {
+std::uint64_t Dispatcher::usualOctets(std::size_t point) const {
     const std::uint64_t K = itsCurves[point / configuration().ebN0.size()].blockSize;
-    return std::max<std::uint64_t>(bitsPerTask / (K * blocksPerGroup), 1);
+    return std::max<std::uint64_t>(bitsPerTask / (K * blocksPerOctet), 1);
 }
 
 std::optional<Task> Dispatcher::next(unsigned size) {
@@ -54,16 +54,16 @@ std::optional<Task> Dispatcher::next(unsigned size) {
     }
     for (; itsFirstWithWork < itsPoints.size(); ++itsFirstWithWork) {
         Point& point = itsPoints[itsFirstWithWork];
-        if (point.progress.hasStopped() || point.nextGroup == point.progress.groups()) {
+        if (point.progress.hasStopped() || point.nextOctet == point.progress.octets()) {
             continue;
         }
         if (!point.since) {
             point.since = Clock::now();
         }
-        const std::uint64_t groups =
-            std::min(usualGroups(itsFirstWithWork) * size, point.progress.groups() - point.nextGroup);
-        const Task task{itsFirstWithWork, point.nextGroup, groups};
-        point.nextGroup += groups;
+        const std::uint64_t octets =
+            std::min(usualOctets(itsFirstWithWork) * size, point.progress.octets() - point.nextOctet);
+        const Task task{itsFirstWithWork, point.nextOctet, octets};
+        point.nextOctet += octets;
         return task;
     }
     return std::nullopt;
@@ -75,7 +75,7 @@ void Dispatcher::complete(const Task& task, ErrorList errors) {
     if (point.progress.hasStopped()) {
         return;  // it ended before these blocks
     }
-    point.progress.complete(task.firstGroup, task.groups, std::move(errors));
+    point.progress.complete(task.firstOctet, task.octets, std::move(errors));
     const bool isRepetition = !itsPlan.timedOut.empty();
     if (isRepetition && itsPlan.timedOut[task.point] != 0 &&
         point.progress.state().stoppedBy == StopReason::blocks) {

@@ -13,27 +13,27 @@
 
 namespace quarzel::sweep {
 
-/// Some blocks of a point, for one worker.
+/// Some octets of blocks of a point, for one worker.
 struct Task {
     std::uint64_t point;
-    std::uint64_t firstGroup;  ///< of the shard's groups
-    std::uint64_t groups;
+    std::uint64_t firstOctet;  ///< counted among those of the shard
+    std::uint64_t octets;
 };
 
-/// The numbers of the groups of a task among all of the point.
-std::vector<std::uint64_t> groupNumbers(const Task& task, const Shard& shard);
+/// The octets of a task, by their numbers in the point.
+std::vector<std::uint64_t> octetNumbers(const Task& task, const Shard& shard);
 
-/// What there is to do.
+/// A sweep that is to be run.
 struct Plan {
     Configuration configuration;
     Shard shard = {};
-    std::vector<PointState> start = {};        ///< where each point goes on; empty: all at the beginning
-    std::vector<std::uint64_t> timedOut = {};  ///< if a finished sweep is run again: for each point the block
-                                               ///< at which time ended it, or 0
+    std::vector<PointState> start = {};        ///< where each point goes on; empty: all from the beginning
+    std::vector<std::uint64_t> timedOut = {};  ///< to run a finished sweep again: for each point the blocks
+                                               ///< after which time ended it, or 0
 };
 
-/// Hands out the work of a sweep and takes in what comes of it. Tasks are handed out in the order of points
-/// and blocks, and may come back in any.
+/// Hands out the tasks of a sweep and collects the blocks in error. Tasks are handed out in the order of
+/// points and blocks, and may be completed in any order.
 ///
 /// Thread rule: all functions may be called from several threads at once.
 class Dispatcher {
@@ -50,47 +50,47 @@ class Dispatcher {
     const std::vector<Curve>& curves() const { return itsCurves; }
 
     /// The next task.
-    /// @param size  how many times the usual number of blocks
+    /// @param size  of the task, as a multiple of the usual one
     /// @return      none when all are handed out or `stop` was called
     std::optional<Task> next(unsigned size = 1);
 
-    /// Take in what came of a task.
+    /// Take in the blocks in error of a task.
     void complete(const Task& task, ErrorList errors);
 
     /// Hand out no more tasks.
     void stop();
 
-    /// Hand out no more tasks, because one failed with this exception.
+    /// Hand out no more tasks: one has failed with this exception.
     void fail(std::exception_ptr exception);
 
-    /// Throw what a task has failed with, if one has.
+    /// Throw the exception with which a task has failed, if one has.
     void rethrow() const;
 
     /// Whether every point has ended.
     bool hasFinished() const;
 
-    /// How far every point is.
+    /// The state of every point.
     std::vector<PointState> states() const;
 
-    /// How far one point is, without its list of errors.
+    /// The state of one point, without its list of errors.
     PointState stateOf(std::size_t point) const;
 
-    /// The first point that has not ended, or their number.
+    /// The first point that has not ended; the number of points when all have.
     std::size_t firstUnfinished() const;
 
   private:
     struct Point {
         PointProgress progress;
-        std::uint64_t nextGroup;
-        std::optional<Clock::time_point> since;  ///< when it was begun in this run
+        std::uint64_t nextOctet;
+        std::optional<Clock::time_point> since;  ///< when this run began it
     };
 
-    std::uint64_t usualGroups(std::size_t point) const;
+    std::uint64_t usualOctets(std::size_t point) const;
     double secondsOf(const Point& point) const;
 
     const Plan itsPlan;
     const std::vector<Curve> itsCurves;
-    mutable std::mutex itsMutex;  ///< of what follows
+    mutable std::mutex itsMutex;  ///< guards what follows
     std::vector<Point> itsPoints;
     std::size_t itsFirstWithWork = 0;
     bool itsStopped = false;

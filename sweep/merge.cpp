@@ -16,15 +16,16 @@ std::string shardText(const Shard& shard) {
 
 /// "1/8, 3/8 and 10 more".
 std::string listText(const std::vector<std::uint64_t>& missing, std::uint64_t count) {
-    constexpr std::size_t most = 20;
+    constexpr std::size_t maxListed = 20;
     std::string text;
-    for (std::size_t i = 0; i < std::min(missing.size(), most); ++i) {
+    for (std::size_t i = 0; i < std::min(missing.size(), maxListed); ++i) {
         text += (i == 0 ? "" : ", ") + shardText({missing[i], count});
     }
-    return missing.size() > most ? text + " and " + std::to_string(missing.size() - most) + " more" : text;
+    return missing.size() > maxListed ? text + " and " + std::to_string(missing.size() - maxListed) + " more"
+                                      : text;
 }
 
-/// Refuse what is not exactly all shards of one sweep, complete.
+/// @throws Error unless these are all the shards of one sweep, each once and complete
 void requireWholeSet(const std::vector<NamedPart>& parts) {
     if (parts.empty()) {
         throw Error("there is no part", "give all shards of a sweep");
@@ -64,7 +65,7 @@ void requireWholeSet(const std::vector<NamedPart>& parts) {
     }
 }
 
-/// Join a point. A shard goes on until it alone has seen enough block errors or is out of blocks, so every
+/// Join a point. A shard goes on until it alone has seen enough block errors or has no more blocks, so every
 /// shard reaches the block where the point ends.
 PointState mergePoint(const std::vector<NamedPart>& parts, std::size_t index,
                       const Configuration& configuration) {

@@ -29,7 +29,7 @@ ErrorList errorsFrom(const Json& json, std::size_t counts) {
     ErrorList errors;
     for (const Json& row : json) {
         if (row.size() != counts + 1) {
-            throw Error("a block in error has not its " + std::to_string(counts) + " numbers", "");
+            throw Error("a block in error does not have " + std::to_string(counts) + " counts", "");
         }
         errors.blocks.push_back(row.at(0).get<std::uint64_t>());
         for (std::size_t column = 0; column < counts; ++column) {
@@ -63,7 +63,7 @@ PointState pointFrom(const Json& json, std::size_t counts, bool isWhole) {
     PointState point(counts);
     json.at("blocks").get_to(point.blocks);
     if (json.at("errors").size() != counts) {
-        throw Error("a point has not its " + std::to_string(counts) + " counts", "");
+        throw Error("a point does not have " + std::to_string(counts) + " counts", "");
     }
     for (std::size_t i = 0; i < counts; ++i) {
         const Json& count = json.at("errors").at(i);

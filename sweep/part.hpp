@@ -11,7 +11,7 @@
 
 namespace quarzel::sweep {
 
-/// A part of a sweep: what an interrupted run leaves to go on from, or what a shard hands to the merge.
+/// A part of a sweep: the checkpoint of an interrupted run, or a shard for the merge.
 struct Part {
     Configuration configuration;
     Shard shard;
@@ -20,17 +20,18 @@ struct Part {
     bool isComplete() const;
 };
 
-/// A part of which nothing is done.
+/// A part that has not begun.
 Part freshPart(const Configuration& configuration, const Shard& shard);
 
 /// The file of a part.
 std::string partText(const Part& part);
 
 /// Read the file of a part.
-/// @throws Error when it is not a whole, unaltered part of this version
+/// @throws Error when it is not a whole, unaltered part in this version of the format
 Part readPart(std::string_view text);
 
-/// Throw an Error that names the first difference unless a part belongs to a run.
+/// Check that a part belongs to a run.
+/// @throws Error that names the first difference when it does not
 void requireSameRun(const Part& part, const Configuration& configuration, const Shard& shard);
 
 /// The first thing in which two configurations differ, "seed 7 instead of 8"; empty when there is none.

@@ -6,27 +6,27 @@
 
 namespace quarzel::sweep {
 
-PointProgress::PointProgress(const Configuration& configuration, const Shard& shard, std::uint64_t mostBlocks,
+PointProgress::PointProgress(const Configuration& configuration, const Shard& shard, std::uint64_t maxBlocks,
                              PointState state)
-    : itsMostBlockErrors(configuration.maxBlockErrors),
+    : itsMaxBlockErrors(configuration.maxBlockErrors),
       itsShard(shard),
-      itsMostBlocks(mostBlocks),
-      itsGroupsDone((state.blocks + blocksPerGroup - 1) / blocksPerGroup),
+      itsMaxBlocks(maxBlocks),
+      itsOctetsDone((state.blocks + blocksPerOctet - 1) / blocksPerOctet),
       itsState(std::move(state)) {
-    const std::uint64_t all = (mostBlocks + blocksPerGroup - 1) / blocksPerGroup;
-    itsGroups = all > shard.index ? (all - shard.index - 1) / shard.count + 1 : 0;
-    if (itsGroups == 0 && !hasStopped()) {
+    const std::uint64_t all = (maxBlocks + blocksPerOctet - 1) / blocksPerOctet;
+    itsOctets = all > shard.index ? (all - shard.index - 1) / shard.count + 1 : 0;
+    if (itsOctets == 0 && !hasStopped()) {
         stop(StopReason::blocks);
     }
 }
 
-/// Blocks in the first groups of the shard. Only the last group of a point can be short.
-std::uint64_t PointProgress::blocksIn(std::uint64_t groups) const {
-    if (groups == 0) {
+/// Blocks in the first `octets` octets of the shard. Only the last octet of a point can be short.
+std::uint64_t PointProgress::blocksIn(std::uint64_t octets) const {
+    if (octets == 0) {
         return 0;
     }
-    const std::uint64_t last = groupNumber(groups - 1) * blocksPerGroup;
-    return (groups - 1) * blocksPerGroup + std::min(blocksPerGroup, itsMostBlocks - last);
+    const std::uint64_t last = octetNumber(octets - 1) * blocksPerOctet;
+    return (octets - 1) * blocksPerOctet + std::min(blocksPerOctet, itsMaxBlocks - last);
 }
 
 PointState PointProgress::summary() const {
@@ -38,9 +38,9 @@ PointState PointProgress::summary() const {
     return summary;
 }
 
-void PointProgress::complete(std::uint64_t firstGroup, std::uint64_t groups, ErrorList errors) {
-    itsWaiting.emplace(firstGroup, Piece{groups, std::move(errors)});
-    while (!hasStopped() && !itsWaiting.empty() && itsWaiting.begin()->first == itsGroupsDone) {
+void PointProgress::complete(std::uint64_t firstOctet, std::uint64_t octets, ErrorList errors) {
+    itsWaiting.emplace(firstOctet, Piece{octets, std::move(errors)});
+    while (!hasStopped() && !itsWaiting.empty() && itsWaiting.begin()->first == itsOctetsDone) {
         add(itsWaiting.begin()->second);
         itsWaiting.erase(itsWaiting.begin());
     }
@@ -58,16 +58,16 @@ void PointProgress::add(const Piece& piece) {
         if (!itsShard.isWhole()) {
             itsState.errors.append(block, row, counts);
         }
-        if (row[counts - 1] != 0 && itsState.last().blockErrors == itsMostBlockErrors) {
-            const std::uint64_t group = block / blocksPerGroup / itsShard.count;
-            itsState.blocks = blocksIn(group) + block % blocksPerGroup + 1;
+        if (row[counts - 1] != 0 && itsState.last().blockErrors == itsMaxBlockErrors) {
+            const std::uint64_t octet = block / blocksPerOctet / itsShard.count;
+            itsState.blocks = blocksIn(octet) + block % blocksPerOctet + 1;
             stop(StopReason::blockErrors);
             return;
         }
     }
-    itsGroupsDone += piece.groups;
-    itsState.blocks = blocksIn(itsGroupsDone);
-    if (itsGroupsDone == itsGroups) {
+    itsOctetsDone += piece.octets;
+    itsState.blocks = blocksIn(itsOctetsDone);
+    if (itsOctetsDone == itsOctets) {
         stop(StopReason::blocks);
     }
 }

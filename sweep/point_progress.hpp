@@ -9,23 +9,23 @@
 
 namespace quarzel::sweep {
 
-/// Puts the blocks of a point in their order as they come in, and finds where the point ends: the stop rule
-/// looks at blocks in their order, so it is the same block whoever simulated it and whenever.
+/// Puts the blocks of a point in order as they come in, and finds where the point ends. The stop rule looks
+/// at blocks in order, so a point ends at the same block whoever simulates it and whenever.
 class PointProgress {
   public:
-    /// @param mostBlocks  blocks of the point in all shards
-    /// @param state       where to go on
-    PointProgress(const Configuration& configuration, const Shard& shard, std::uint64_t mostBlocks,
+    /// @param maxBlocks  blocks of the point in all shards
+    /// @param state      where to go on
+    PointProgress(const Configuration& configuration, const Shard& shard, std::uint64_t maxBlocks,
                   PointState state);
 
-    /// Groups of the shard, in all.
-    std::uint64_t groups() const { return itsGroups; }
+    /// Octets in the shard.
+    std::uint64_t octets() const { return itsOctets; }
 
-    /// The first group of the shard that is not done.
-    std::uint64_t groupsDone() const { return itsGroupsDone; }
+    /// The first octet of the shard that is not done.
+    std::uint64_t octetsDone() const { return itsOctetsDone; }
 
-    /// Take in the blocks in error of some groups, which need not be next.
-    void complete(std::uint64_t firstGroup, std::uint64_t groups, ErrorList errors);
+    /// Take in the blocks in error of some octets, which may be ahead of the next ones.
+    void complete(std::uint64_t firstOctet, std::uint64_t octets, ErrorList errors);
 
     /// End the point where it is.
     void stop(StopReason reason) { itsState.stoppedBy = reason; }
@@ -40,21 +40,21 @@ class PointProgress {
 
   private:
     struct Piece {
-        std::uint64_t groups;
+        std::uint64_t octets;
         ErrorList errors;
     };
 
     void add(const Piece& piece);
-    std::uint64_t groupNumber(std::uint64_t group) const { return group * itsShard.count + itsShard.index; }
-    std::uint64_t blocksIn(std::uint64_t groups) const;
+    std::uint64_t octetNumber(std::uint64_t octet) const { return octet * itsShard.count + itsShard.index; }
+    std::uint64_t blocksIn(std::uint64_t octets) const;
 
-    std::uint64_t itsMostBlockErrors;
+    std::uint64_t itsMaxBlockErrors;
     Shard itsShard;
-    std::uint64_t itsMostBlocks;
-    std::uint64_t itsGroups;
-    std::uint64_t itsGroupsDone;
+    std::uint64_t itsMaxBlocks;
+    std::uint64_t itsOctets;
+    std::uint64_t itsOctetsDone;
     PointState itsState;
-    std::map<std::uint64_t, Piece> itsWaiting;  ///< by first group: not next yet
+    std::map<std::uint64_t, Piece> itsWaiting;  ///< by first octet: ahead of the next ones
 };
 
 }  // namespace quarzel::sweep

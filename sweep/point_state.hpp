@@ -9,20 +9,20 @@
 
 namespace quarzel::sweep {
 
-/// Blocks that are simulated side by side, numbers 8 g to 8 g + 7 of a point.
-constexpr std::uint64_t blocksPerGroup = 8;
+/// An octet of blocks: numbers 8 n to 8 n + 7 of a point. Each byte that is encoded holds a bit of each.
+constexpr std::uint64_t blocksPerOctet = 8;
 
 /// Why a point has ended.
 enum class StopReason { blockErrors, blocks, time };
 
-/// As the files spell it.
+/// As files spell it.
 std::string_view nameOf(StopReason reason);
 std::optional<StopReason> stopReasonOf(std::string_view name);
 
-/// Blocks in error, in ascending order, with their bit errors after each iteration that is counted.
+/// Blocks in error, in ascending order, with their bit errors after each iteration at which they are counted.
 struct ErrorList {
     std::vector<std::uint64_t> blocks;     ///< numbers of the blocks
-    std::vector<std::uint32_t> bitErrors;  ///< for each block as many as there are counts; not all 0
+    std::vector<std::uint32_t> bitErrors;  ///< for each block one for each count; not all are 0
 
     std::size_t size() const { return blocks.size(); }
     const std::uint32_t* row(std::size_t i, std::size_t counts) const {
@@ -39,15 +39,15 @@ struct ErrorCount {
     std::uint64_t blockErrors = 0;
 };
 
-/// How far a point has come: what is known of its first blocks.
+/// How far a point has come, and the errors of its blocks so far.
 struct PointState {
-    std::uint64_t blocks = 0;        ///< done, without a gap; of a shard those that are its own
-    std::vector<ErrorCount> counts;  ///< after each iteration that is counted
+    std::uint64_t blocks = 0;        ///< done, without a gap; in a shard only its own
+    std::vector<ErrorCount> counts;  ///< after each iteration at which errors are counted
     std::uint64_t bitErrorSquares =
         0;  ///< sum over the blocks of the squared bit errors after the last iteration
-    std::optional<StopReason> stoppedBy;  ///< none: it goes on
+    std::optional<StopReason> stoppedBy;  ///< none: it has not ended
     double seconds = 0;                   ///< time spent on it
-    ErrorList errors;                     ///< only for shards: where the errors are
+    ErrorList errors;                     ///< only in shards: where the errors are
 
     explicit PointState(std::size_t countsPerBlock = 1) : counts(countsPerBlock) {}
 

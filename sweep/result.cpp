@@ -68,7 +68,7 @@ std::string pointText(const Configuration& configuration, std::size_t number, co
 
 std::string resultText(const Result& result) {
     const Configuration& configuration = result.configuration;
-    Json document = newDocument(resultFormat);
+    Json document = newDocument(resultFormat, result.quarzel);
     document["configuration"] = toJson(configuration);
     document["curves"] = Json::array();
     std::size_t next = 0;
@@ -89,7 +89,7 @@ std::string resultText(const Result& result) {
 Result readResult(std::string_view text) {
     const Json document = readDocument(text, resultFormat, resultIndent);
     try {
-        Result result{configurationFrom(document.at("configuration")), {}};
+        Result result{configurationFrom(document.at("configuration")), {}, document.at("quarzel")};
         for (const Json& curve : document.at("curves")) {
             for (const Json& point : curve.at("points")) {
                 result.points.push_back(pointFrom(point));

@@ -11,11 +11,11 @@ class Observer {
   public:
     virtual ~Observer() = default;
 
-    /// Called some times a second. To end the sweep early, call the dispatcher's `stop`.
+    /// Called several times a second. To end the sweep early, call the dispatcher's `stop`.
     virtual void tick(Dispatcher&) {}
 };
 
-/// Those who do the work of a dispatcher.
+/// Whatever does the tasks of a dispatcher.
 class Workers {
   public:
     virtual ~Workers() = default;

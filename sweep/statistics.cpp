@@ -8,7 +8,8 @@ namespace quarzel::sweep {
 
 namespace {
 
-constexpr double deviations = 1.959963984540054;  // that a normal distribution keeps to in 95 % of all cases
+constexpr double deviations =
+    1.959963984540054;  // within which a normal distribution lies in 95 % of all cases
 
 Interval wilsonInterval(double errors, double trials) {
     constexpr double square = deviations * deviations;

@@ -18,8 +18,8 @@ struct Interval {
 struct Rates {
     double ber;
     double bler;
-    Interval berInterval;   ///< from the spread of the bit errors of blocks, in which errors cluster; without
-                            ///< an error up to the end of blerInterval
+    Interval berInterval;  ///< from the spread of the bit errors over blocks, since errors cluster in blocks;
+                           ///< without an error it ends where blerInterval does
     Interval blerInterval;  ///< of E. B. Wilson (1927)
 };
 

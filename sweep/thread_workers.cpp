@@ -1,11 +1,10 @@
 // SPDX-License-Identifier: MIT
 #include <chrono>
-#include <condition_variable>
-#include <mutex>
-#include <system_error>
-#include <thread>
-#include <vector>
+#include <cstddef>
+#include <exception>
+#include <future>
 
+#include "link/parallel.hpp"
 #include "sweep/block_simulator.hpp"
 #include "sweep/run.hpp"
 
@@ -24,63 +23,25 @@ void work(Dispatcher& dispatcher, Channels& channels) {
             dispatcher.complete(
                 *task, simulator.simulate(dispatcher.curves()[task->point / configuration.ebN0.size()],
                                           configuration.ebN0[task->point % configuration.ebN0.size()],
-                                          groupNumbers(*task, dispatcher.shard())));
+                                          octetNumbers(*task, dispatcher.shard())));
         }
     } catch (...) {
         dispatcher.fail(std::current_exception());
     }
 }
 
-/// How many threads are still at work.
-class Count {
-  public:
-    void add() {
-        const std::lock_guard lock(itsMutex);
-        ++itsNumber;
-    }
-    void subtract() {
-        const std::lock_guard lock(itsMutex);
-        --itsNumber;
-        itsChanged.notify_all();
-    }
-    /// Wait for a while. @return whether none is left
-    bool isNoneAfter(std::chrono::milliseconds time) {
-        std::unique_lock lock(itsMutex);
-        return itsChanged.wait_for(lock, time, [this] { return itsNumber == 0; });
-    }
-
-  private:
-    std::mutex itsMutex;
-    std::condition_variable itsChanged;
-    unsigned itsNumber = 0;
-};
-
 }  // namespace
 
 void ThreadWorkers::run(Dispatcher& dispatcher, Observer& observer) {
     Channels channels(dispatcher.configuration().quantiser);
-    Count atWork;
-    std::vector<std::jthread> threads;
+    const auto workers = std::async(std::launch::async, [&] {
+        link::forEachOnThreads(itsThreads, itsThreads,
+                               [&] { return [&](std::size_t) { work(dispatcher, channels); }; });
+    });
     try {
-        for (unsigned i = 0; i < itsThreads; ++i) {
-            atWork.add();
-            threads.emplace_back([&] {
-                work(dispatcher, channels);
-                atWork.subtract();
-            });
-        }
-    } catch (const std::system_error&) {
-        // The system gives no more threads. Those that there are do the work.
-        atWork.subtract();
-        if (threads.empty()) {
-            throw;
-        }
-    }
-    try {
-        while (!atWork.isNoneAfter(tickPeriod)) {
+        while (workers.wait_for(tickPeriod) != std::future_status::ready) {
             observer.tick(dispatcher);
         }
-        threads.clear();
         observer.tick(dispatcher);
     } catch (...) {
         dispatcher.stop();

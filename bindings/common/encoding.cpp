@@ -10,8 +10,8 @@
 namespace quarzel::bindings {
 
 Outcome encode(const std::uint8_t* bits, std::size_t K, std::size_t blocks, std::uint8_t* code) noexcept {
-    return guarded([&](const Messages&) {
-        if (link::findBlockSize(K) == nullptr) {
+    return guarded([&] {
+        if (!findBlockSize(K)) {
             throw BindingError(Fault::value, "there is no block size of " + std::to_string(K) +
                                                  " bits; the nearest: " + link::nearestBlockSizesText(K));
         }

@@ -6,22 +6,22 @@
 #include <string>
 #include <vector>
 
-#include "message_sink.hpp"
+#include "quarzel/core.hpp"
 
 /// What every binding shares. A call of a binding does its work inside `guarded` and turns the outcome into
 /// what its host knows: an exception, an error, a status.
 namespace quarzel::bindings {
 
-/// Why a call did nothing.
+/// Why a call failed.
 enum class Fault {
     none,
     type,         ///< an argument is of a wrong type
     value,        ///< an argument has a wrong value or shape
     closed,       ///< the core was closed before
     busy,         ///< another thread is using the core
-    interrupted,  ///< the user asked for an end
+    interrupted,  ///< the user asked to stop
     memory,       ///< there is not enough memory
-    model,        ///< the model refused what was thought to be right
+    model,        ///< the model refused what passed the checks of the binding
 };
 
 /// A fault on its way to `guarded`.
@@ -39,8 +39,9 @@ class BindingError : public std::runtime_error {
 /// How a call ended.
 struct Outcome {
     Fault fault = Fault::none;
-    std::string text;                   ///< what is wrong and what to do; empty when all went well
+    std::string text;                   ///< what is wrong and what to do; empty when nothing is
     std::vector<std::string> warnings;  ///< of the model, for the host's own channel
+    std::string trace;                  ///< the text of the passes that were traced
 
     bool done() const noexcept { return fault == Fault::none; }
 
@@ -51,20 +52,18 @@ struct Outcome {
     }
 };
 
-/// Do some work. Whatever it throws, and whatever the model says meanwhile, ends up in the outcome.
+/// Do some work and note in the outcome what it throws.
 template <class Work>
-Outcome guarded(Work&& work) noexcept {
-    Outcome outcome;
-    Messages messages;
-    const MessageSink sink(messages);
+void guard(Outcome& outcome, Work&& work) noexcept {
+    constexpr int outOfMemory = 99;
     try {
         try {
-            work(messages);
-            if (messages.incomplete) {
-                throw std::bad_alloc();
-            }
+            work();
         } catch (const BindingError& error) {
             outcome.fault = error.fault();
+            outcome.text = error.what();
+        } catch (const Error& error) {
+            outcome.fault = error.status() == outOfMemory ? Fault::memory : Fault::model;
             outcome.text = error.what();
         } catch (const std::bad_alloc&) {
             throw;
@@ -73,12 +72,18 @@ Outcome guarded(Work&& work) noexcept {
             outcome.text = error.what();
         } catch (...) {
             outcome.fault = Fault::model;
-            outcome.text = "something unknown went wrong";
+            outcome.text = "an unknown exception was thrown";
         }
     } catch (...) {
         outcome.fault = Fault::memory;
     }
-    outcome.warnings.swap(messages.warnings);
+}
+
+/// The outcome of some work.
+template <class Work>
+Outcome guarded(Work&& work) noexcept {
+    Outcome outcome;
+    guard(outcome, work);
     return outcome;
 }
 

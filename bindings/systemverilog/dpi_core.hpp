@@ -7,13 +7,13 @@
 #include <string>
 #include <vector>
 
-#include "common/core.hpp"
+#include "common/host_core.hpp"
 
 namespace quarzel::dpi {
 
 /// A model as a simulation uses it, with what the simulation pushes into it and has not popped yet.
 struct DpiCore {
-    bindings::Core core;
+    bindings::HostCore core;
     std::vector<std::int32_t> soft[3];      ///< pushed values of the next block
     std::vector<std::uint8_t> bits;         ///< decisions of the last block
     std::size_t popped = 0;                 ///< how many of them have been popped

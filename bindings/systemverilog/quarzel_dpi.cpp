@@ -12,7 +12,6 @@
 
 #include "common/encoding.hpp"
 #include "dpi_core.hpp"
-#include "link/size_table.hpp"
 
 #define QUARZEL_DPI extern "C" __attribute__((visibility("default")))
 
@@ -35,7 +34,7 @@ int withCore(void* handle, Work work) noexcept {
             return failed;
         }
         int result = failed;
-        core->take(guarded([&](const Messages&) { result = work(*core); }));
+        core->take(guarded([&] { result = work(*core); }));
         return core->error.empty() ? result : failed;
     } catch (...) {
         return failed;
@@ -60,22 +59,27 @@ void writeFile(const std::string& name, const std::string& text) {
 
 /// Decode a block into core.bits, traced when that was asked for.
 /// @return K
-int decode(DpiCore& core, SoftBlock block, int iterations, unsigned tag) {
-    const std::uint32_t K = blockSizeOf(block.positions);
+template <quarzel::SoftValue Value>
+int decode(DpiCore& core, std::array<const Value*, 3> streams, std::size_t positions, int iterations,
+           unsigned tag) {
+    const std::uint32_t K = blockSizeOf(positions);
     core.bits.assign(K, 0);
     core.popped = 0;
-    block.bits = core.bits.data();
-    block.tag = tag;
-    if (core.tracePasses == 0) {
-        raise(core, core.core.decode({&block, 1}, iterations));
-    } else {
-        std::string text;
-        const unsigned passes = std::exchange(core.tracePasses, 0);
-        raise(core, core.core.trace(block, iterations, passes, text));
-        writeFile(core.traceFile, text);
+    const quarzel::SoftBlocks<Value> block{streams[0], streams[1], streams[2], 1, positions, 0};
+    const DecodeJob job{block, iterations, core.bits, {&tag, 1}};
+    const unsigned passes = std::exchange(core.tracePasses, 0);
+    Outcome outcome = passes == 0 ? core.core.decode(job) : core.core.traceText(job, passes);
+    const std::string trace = std::move(outcome.trace);
+    raise(core, std::move(outcome));
+    if (passes != 0) {
+        writeFile(core.traceFile, trace);
     }
-    core.tag = block.tag;
+    core.tag = tag;
     return static_cast<int>(K);
+}
+
+const std::int8_t* bytes(const void* values) {
+    return static_cast<const std::int8_t*>(values);
 }
 
 /// Elements of an open array, which must have one dimension and lie as in C.
@@ -136,8 +140,8 @@ QUARZEL_DPI int quarzel_dpi_decode_fixed(void* handle, int positions, const char
                                          unsigned tag, svBit* bits) {
     return withCore(handle, [&](DpiCore& core) {
         const auto size = static_cast<std::size_t>(std::max(positions, 0));
-        const int K =
-            decode(core, {{systematic, parity1, parity2}, SoftType::int8, size, nullptr}, iterations, tag);
+        const std::array streams = {bytes(systematic), bytes(parity1), bytes(parity2)};
+        const int K = decode(core, streams, size, iterations, tag);
         std::copy(core.bits.begin(), core.bits.end(), bits);
         return K;
     });
@@ -155,12 +159,9 @@ QUARZEL_DPI int quarzel_dpi_decode_open(void* handle, svOpenArrayHandle systemat
         if (sizeOf(bits, "bits") < K) {
             throw BindingError(Fault::value, "bits has no room for " + std::to_string(K) + " decisions");
         }
-        decode(core,
-               {{svGetArrayPtr(systematic), svGetArrayPtr(parity1), svGetArrayPtr(parity2)},
-                SoftType::int8,
-                positions,
-                nullptr},
-               iterations, tag);
+        const std::array streams = {bytes(svGetArrayPtr(systematic)), bytes(svGetArrayPtr(parity1)),
+                                    bytes(svGetArrayPtr(parity2))};
+        decode(core, streams, positions, iterations, tag);
         std::copy(core.bits.begin(), core.bits.end(), static_cast<svBit*>(svGetArrayPtr(bits)));
         return static_cast<int>(K);
     });
@@ -182,10 +183,8 @@ QUARZEL_DPI int quarzel_dpi_run(void* handle, int iterations, unsigned tag) {
         for (std::size_t stream = 0; stream < soft.size(); ++stream) {
             soft[stream].swap(core.soft[stream]);
         }
-        return decode(
-            core,
-            {{soft[0].data(), soft[1].data(), soft[2].data()}, SoftType::int32, soft[0].size(), nullptr},
-            iterations, tag);
+        const std::array<const std::int32_t*, 3> streams = {soft[0].data(), soft[1].data(), soft[2].data()};
+        return decode(core, streams, soft[0].size(), iterations, tag);
     });
 }
 
@@ -226,7 +225,7 @@ QUARZEL_DPI int quarzel_dpi_encode(void* handle) {
     return withCore(handle, [](DpiCore& core) {
         std::vector<std::uint8_t> bits;
         bits.swap(core.information);
-        const std::size_t positions = bits.size() + quarzel::link::tailPositions;
+        const std::size_t positions = bits.size() + quarzel::tailPositions;
         core.code.assign(3 * positions, 0);
         raise(core, encode(bits.data(), bits.size(), 1, core.code.data()));
         return static_cast<int>(positions);

@@ -25,18 +25,18 @@ package quarzel_pkg;
   // The next warning of the model; empty when there is none.
   import "DPI-C" function string quarzel_dpi_next_warning(input chandle handle);
 
-  // Road 1: arrays of a fixed size, of which the first `positions` are used. K, or -1.
+  // Arrays of a fixed size, of which the first `positions` are used. K, or -1.
   import "DPI-C" function int quarzel_dpi_decode_fixed(
       input chandle handle, input int positions, input quarzel_stream_t systematic,
       input quarzel_stream_t parity1, input quarzel_stream_t parity2, input int iterations,
       input int unsigned tag, output quarzel_bits_t bits);
 
-  // Road 2: open arrays, which carry their sizes. K, or -1. bits needs room for K decisions.
+  // Open arrays, which carry their sizes. K, or -1. bits needs room for K decisions.
   import "DPI-C" function int quarzel_dpi_decode_open(
       input chandle handle, input byte systematic[], input byte parity1[], input byte parity2[],
       input int iterations, input int unsigned tag, output bit bits[]);
 
-  // Road 3, which every simulator takes: push K + 4 positions, run (K, or -1), pop K bits (-1 when none is left).
+  // Scalars, which every simulator can pass: push K + 4 positions, run (K, or -1), pop K bits (-1 when none is left).
   import "DPI-C" function void quarzel_dpi_push(
       input chandle handle, input int systematic, input int parity1, input int parity2);
   import "DPI-C" function int quarzel_dpi_run(input chandle handle, input int iterations, input int unsigned tag);
@@ -130,7 +130,7 @@ package quarzel_pkg;
       end
     endfunction
 
-    // Free the model. What is asked of it afterwards is refused.
+    // Free the model. Later calls are refused.
     function void close();
       void'(quarzel_dpi_close(handle));
     endfunction

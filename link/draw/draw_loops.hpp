@@ -1,6 +1,6 @@
 // SPDX-License-Identifier: MIT
-// The one text of the drawing loops, compiled for each instruction set. All in an unnamed namespace, so that
-// no function compiled for a new processor reaches an old one through the linker.
+// The drawing loops, compiled for each instruction set. Everything is in an unnamed namespace, so that the
+// linker never lets an old processor run a function that was compiled for a new one.
 #pragma once
 
 #include <Random123/philox.h>
@@ -43,29 +43,29 @@ void drawWords(const PhiloxInput& input, std::size_t groups, std::uint32_t* __re
 }
 
 /// The output for one 16-bit random number and a code bit.
-inline int outputOf(std::uint32_t random, std::uint32_t codeBit, const std::int32_t* cells) {
+inline void lookUpOne(std::uint32_t random, std::uint32_t codeBit, const std::int32_t* cells,
+                      std::int8_t& soft, std::uint8_t& isUndecided) {
     const std::int32_t cell = cells[random >> 4];
     const auto low = static_cast<std::int32_t>(random & 15U);
     const std::int32_t threshold = cell & cellLowMask;
     const std::int32_t one = (cell >> cellValueShift) + (low > threshold ? 1 : 0);
     const std::int32_t negate = static_cast<std::int32_t>(codeBit) - 1;
     const std::int32_t value = (one ^ negate) - negate;
-    const bool isUndecided = (low == threshold) | ((cell & cellManyThresholds) != 0);
-    return isUndecided ? undecided : (value < 127 ? value : 127);
+    soft = static_cast<std::int8_t>(value < 127 ? value : 127);
+    isUndecided = static_cast<std::uint8_t>((low == threshold) | ((cell & cellManyThresholds) != 0));
 }
 
 void lookUp(const std::uint32_t* __restrict words, const std::uint8_t* __restrict codeBits, unsigned lane,
-            const std::int32_t* __restrict cells, std::size_t times, int* __restrict soft,
+            const std::int32_t* __restrict cells, std::size_t times, std::int8_t* __restrict soft,
             std::uint8_t* __restrict isUndecided) {
     constexpr std::size_t half = valuesPerLookUp / 2;
     for (std::size_t time = 0; time < times; ++time) {
         for (std::size_t i = 0; i < half; ++i) {
-            soft[i] = outputOf(words[i] & 0xffffU, codeBits[i] >> lane & 1U, cells);
-            isUndecided[i] = soft[i] == undecided ? 1 : 0;
+            lookUpOne(words[i] & 0xffffU, codeBits[i] >> lane & 1U, cells, soft[i], isUndecided[i]);
         }
         for (std::size_t i = 0; i < half; ++i) {
-            soft[half + i] = outputOf(words[i] >> 16, codeBits[half + i] >> lane & 1U, cells);
-            isUndecided[half + i] = soft[half + i] == undecided ? 1 : 0;
+            lookUpOne(words[i] >> 16, codeBits[half + i] >> lane & 1U, cells, soft[half + i],
+                      isUndecided[half + i]);
         }
         words += half;
         codeBits += valuesPerLookUp;

@@ -2,12 +2,10 @@
 #include "decoder/decoder.hpp"
 
 #include <algorithm>
-#include <iostream>
 
 #include "decoder/decoder_3gpu.hpp"
 #include "decoder/error_count.hpp"
 #include "fixed/properties.hpp"
-#include "fixed/text_output.hpp"
 
 TDecoder::TDecoder() = default;
 TDecoder::~TDecoder() = default;
@@ -17,7 +15,7 @@ TDecoder* TDecoder::create(const std::string& properties) {
     if (type == "3GPPPU") {
         return TDecoder3GPU::create(false, rest);
     }
-    quarzel::errorLine("ERROR:TDecoder:Unrecognised type:" + type);
+    quarzel::standardStreams.error({"ERROR:TDecoder:Unrecognised type:", type});
     return nullptr;
 }
 
@@ -32,6 +30,7 @@ void TDecoder::growMetricStore(unsigned blockSize) {
     if (size > itsMetricBufferSize) {
         itsMetricBuffer.reset();
         itsMetricBufferSize = 0;
+        itsAlpha = itsBeta = itsGamma = nullptr;
         itsMetricBuffer = std::make_unique<unsigned char[]>(size);
         itsMetricBufferSize = static_cast<std::uint32_t>(size);
         void* first = itsMetricBuffer.get();
@@ -43,6 +42,7 @@ void TDecoder::growMetricStore(unsigned blockSize) {
 }
 
 bool TDecoder::allocate(unsigned blockSize) {
+    itsBlockSize = 0;  // until there is memory for all of the block
     growMetricStore(blockSize);
     itsIntrinsic.assign(blockSize, 0);
     itsLLR.assign(blockSize, 0);
@@ -65,15 +65,6 @@ bool TDecoder::decode(const std::vector<short>& soft, const std::vector<unsigned
     return true;
 }
 
-bool TDecoder::takesLanes(unsigned /*K*/) {
-    return false;
-}
-
-bool TDecoder::decodeLanes(unsigned /*K*/, unsigned /*iterations*/,
-                           std::span<const quarzel::LaneBlock> /*blocks*/) {
-    return false;
-}
-
 void TDecoder::dump(std::ostream& /*stream*/) {}
 
 void TDecoder::dumpFull(std::ostream& /*stream*/, unsigned /*siso*/) {}
@@ -82,10 +73,10 @@ bool TDecoder::checkDump(unsigned siso) {
     if (itsDumpCount == 0) {
         return true;
     }
-    dumpFull(std::cout, siso);
+    itsMessages.traceText([&](std::ostream& stream) { dumpFull(stream, siso); });
     --itsDumpCount;
     if (itsDumpCount == 0 && itsDumpStop) {
-        quarzel::writeText(std::cerr, "STOP:Dump complete\n");
+        itsMessages.error({"STOP:Dump complete"});
         return false;
     }
     return true;

@@ -9,13 +9,10 @@
 #include <vector>
 
 #include "engine/t8.hpp"
+#include "fixed/messages.hpp"
 
 class TCalculationEngine;
 class TInterleaver;
-
-namespace quarzel {
-struct LaneBlock;
-}
 
 /// A turbo decoder: the work storage of a block, the counters and the trace settings, and two ways to decode.
 ///
@@ -74,46 +71,39 @@ class TDecoder {
     /// @return false when decoding is to stop because the last requested dump has been written
     bool checkDump(unsigned siso);
 
-    /// Take the fast road where it can be taken, by the best instruction set of this machine. Off until
-    /// called: the fast road leaves the work storage as it is, so it is for callers who want decisions alone.
-    /// The base has none.
-    virtual void enableLanes() {}
-
-    /// Decode literally from now on.
-    virtual void disableLanes() {}
-
-    /// Whether `decodeLanes` may be called for blocks of K information bits: the fast road is on, and nothing
-    /// could tell it from a literal decode.
-    virtual bool takesLanes(unsigned K);
-
-    /// Decode blocks of one size, for which `takesLanes` has just held, by the fast road.
-    /// @param iterations  at least 1
-    /// @return whether a soft value was saturated
-    virtual bool decodeLanes(unsigned K, unsigned iterations, std::span<const quarzel::LaneBlock> blocks);
-
     /// Hand the decoder its interleaver and engine. They are not owned and must outlive it.
     void connect(TInterleaver* interleaver, TCalculationEngine* engine) {
         itsInterleaver = interleaver;
         itsEngine = engine;
     }
 
+    TInterleaver* interleaver() const { return itsInterleaver; }
+    TCalculationEngine* engine() const { return itsEngine; }
+
+    /// Where the decoder's lines and traces go: the standard streams until set.
+    void setMessages(const quarzel::Messages& messages) { itsMessages = messages; }
+    const quarzel::Messages& messages() const { return itsMessages; }
+
     /// Factor for the extrinsic values: 1.0 until set.
     void setExtrinsicScale(double scale) { itsExtrinsicScale = scale; }
 
-    /// Trace the next `count` passes to the standard output stream, and with `stop` end decoding after the
-    /// last.
+    /// Trace the next `count` passes, and with `stop` end decoding after the last.
     void setDump(unsigned count, bool stop = false) {
         itsDumpCount = count;
         itsDumpStop = stop;
     }
+    std::uint32_t dumpCount() const { return itsDumpCount; }
+    bool dumpStop() const { return itsDumpStop; }
 
     /// Trace level of the parallel decoder: from 1 its thread count, from 2 its segments, above 8 every
     /// recursion.
     void setVerbosity(unsigned verbosity) { itsVerbosity = verbosity; }
+    std::uint32_t verbosity() const { return itsVerbosity; }
 
     /// A-priori extrinsic values of the information bits for the first pass of the next block, one per
     /// trellis step, the termination steps included. Empty means none. They are used once.
     void setExtrinsicIn(std::vector<short> extrinsic) { itsExtrinsicIn = std::move(extrinsic); }
+    const std::vector<short>& extrinsicIn() const { return itsExtrinsicIn; }
 
     /// @name The work storage as the last pass left it, one entry per trellis step
     /// @{
@@ -128,6 +118,13 @@ class TDecoder {
     double extrinsicScale() const { return itsExtrinsicScale; }
     std::uint64_t decodeCount() const { return itsDecodeCount; }
     std::uint64_t sisoCount() const { return itsSISOCount; }
+
+    /// Set both counters, for blocks that were decoded elsewhere in the decoder's stead.
+    void setCounts(std::uint64_t decodes, std::uint64_t passes) {
+        itsDecodeCount = decodes;
+        itsSISOCount = passes;
+    }
+
     std::uint32_t metricBufferSize() const { return itsMetricBufferSize; }
 
   protected:
@@ -154,4 +151,5 @@ class TDecoder {
     std::uint32_t itsVerbosity = 0;
     std::uint32_t itsDumpCount = 0;  ///< passes still to be dumped
     bool itsDumpStop = false;        ///< stop when the last of them is written
+    quarzel::Messages itsMessages;   ///< where lines and traces go
 };

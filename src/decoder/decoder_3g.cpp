@@ -6,14 +6,11 @@
 
 #include "decoder/error_count.hpp"
 #include "engine/engine.hpp"
-#include "fixed/text_output.hpp"
 #include "interleaver/interleaver.hpp"
-
-using quarzel::errorLine;
 
 TDecoder3G* TDecoder3G::create(bool is3GPP2, const std::string& properties) {
     if (!properties.empty()) {
-        errorLine("ERROR:TDecoder3G:Unexpected properties " + properties);
+        quarzel::standardStreams.error({"ERROR:TDecoder3G:Unexpected properties ", properties});
         return nullptr;
     }
     return new TDecoder3G(is3GPP2);
@@ -46,11 +43,10 @@ bool TDecoder3G::decode(const std::vector<short>& soft, std::vector<unsigned cha
             return false;
         }
     }
+    hard.resize(itsLLR.size());
     itsSISOCount += 2ULL * iterations;
     ++itsDecodeCount;
-    hard.resize(itsLLR.size());
-    std::transform(itsLLR.begin(), itsLLR.end(), hard.begin(),
-                   [](short llr) { return static_cast<unsigned char>(llr >= 0 ? 1 : 0); });
+    std::transform(itsLLR.begin(), itsLLR.end(), hard.begin(), decide);
     hard.resize(itsBlockSize - tailSteps);
     return true;
 }
@@ -67,7 +63,7 @@ bool TDecoder3G::decode(const std::vector<short>& soft, const std::vector<unsign
         }
         itsLLR.resize(itsBlockSize - tailSteps);
         const unsigned long long errors =
-            quarzel::countErrors(reference, itsLLR, [](short llr) { return llr >= 0; });
+            quarzel::countErrors(reference, itsLLR, [](short llr) { return decide(llr) != 0; });
         itsLLR.resize(itsBlockSize);
         bitErrors[iteration] += errors;
         blockErrors[iteration] += errors != 0 ? 1 : 0;
@@ -85,8 +81,14 @@ bool TDecoder3G::calcSISO(unsigned siso) {
     if (siso == 0 && !startExtrinsic()) {
         return false;
     }
-    return calcIntrinsic(siso) && calcGamma(siso) && calcAlpha(siso) && calcBeta(siso) && calcLLR(siso) &&
-           calcExtrinsic(siso) && checkDump(siso);
+    if (!calcIntrinsic(siso) || !calcGamma(siso) || !calcAlpha(siso) || !calcBeta(siso) || !calcLLR(siso) ||
+        !calcExtrinsic(siso)) {
+        return false;
+    }
+    if (itsPassListener != nullptr) {
+        itsPassListener->passEnded(*this, siso);
+    }
+    return checkDump(siso);
 }
 
 /// The a-priori values of the first pass: the caller's, used once, or none.
@@ -96,7 +98,7 @@ bool TDecoder3G::startExtrinsic() {
         return true;
     }
     if (itsExtrinsicIn.size() != itsBlockSize) {
-        errorLine("ERROR:TDecoder3G:Number of soft extrinsic inputs does not match block size");
+        itsMessages.error({"ERROR:TDecoder3G:Number of soft extrinsic inputs does not match block size"});
         return false;
     }
     const std::int16_t mask = itsEngine->stateFormat()->mask;

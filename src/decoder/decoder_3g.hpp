@@ -6,6 +6,27 @@
 #include "decoder/decoder.hpp"
 #include "decoder/trace_columns.hpp"
 
+class TDecoder3G;
+
+namespace quarzel {
+
+/// Told of each pass that has run.
+class PassListener {
+  public:
+    virtual ~PassListener() = default;
+
+    /// @param decoder  shows the pass in its work storage
+    /// @param siso     number of the pass in its block
+    virtual void passEnded(const TDecoder3G& decoder, unsigned siso) = 0;
+
+  protected:
+    PassListener() = default;
+    PassListener(const PassListener&) = default;
+    PassListener& operator=(const PassListener&) = default;
+};
+
+}  // namespace quarzel
+
 /// The 3GPP turbo decoder with one processing unit: the literal course of a decode, one operation after the
 /// other. Its pass structure is that of the parallel decoder too.
 ///
@@ -13,6 +34,12 @@
 /// constituent code 1, in natural order; two passes are an iteration.
 class TDecoder3G : public TDecoder {
   public:
+    /// Termination steps of a constituent code.
+    static constexpr unsigned tailSteps = 3;
+
+    /// The decision that a log-likelihood ratio gives.
+    static constexpr unsigned char decide(short llr) { return llr >= 0 ? 1 : 0; }
+
     /// @param is3GPP2     take soft values in the 3GPP2 layout (rate 1/5, 18 tail values) rather than in that
     /// of
     ///                    3GPP (rate 1/3, 12 tail values)
@@ -43,6 +70,17 @@ class TDecoder3G : public TDecoder {
     /// The streams of the block that `extract` has just taken apart, one line each. `extract` calls it for
     /// the standard output stream while dumps are pending.
     virtual void dumpInput(std::ostream& stream) const;
+
+    /// Tell a listener of each pass, before its trace is written; null ends it.
+    /// @param listener  not owned
+    void setPassListener(quarzel::PassListener* listener) { itsPassListener = listener; }
+
+    /// @name The streams of the block last taken apart; code is 0 or 1 for constituent code 1 or 2
+    /// @{
+    const std::vector<short>& systematic(unsigned code) const { return itsSys.at(code); }
+    const std::vector<short>& parity0(unsigned code) const { return itsPar0.at(code); }
+    const std::vector<short>& parity1(unsigned code) const { return itsPar1.at(code); }
+    /// @}
 
     /// What the trace shows of a step; trace_columns.hpp names the entries.
     quarzel::TraceRow traceRow(unsigned step) const;
@@ -87,9 +125,6 @@ class TDecoder3G : public TDecoder {
     /// The streams that a pass uses: 1, those of constituent code 2, in an even pass, else 0.
     static constexpr unsigned inputSet(unsigned siso) { return siso % 2 == 0 ? 1 : 0; }
 
-    /// Termination steps of a constituent code.
-    static constexpr unsigned tailSteps = 3;
-
     std::array<std::vector<short>, 2> itsSys;  ///< systematic values of code 1 and, interleaved, 2; with tail
     std::array<std::vector<short>, 2> itsPar0;  ///< first parity of code 1 and 2, with tail
     std::array<std::vector<short>, 2>
@@ -99,4 +134,6 @@ class TDecoder3G : public TDecoder {
   private:
     bool calcIteration(unsigned iteration);
     bool startExtrinsic();
+
+    quarzel::PassListener* itsPassListener = nullptr;
 };

@@ -6,13 +6,9 @@
 #include <optional>
 #include <sstream>
 
-#include "decoder/lane_decode.hpp"
 #include "decoder/segment_trace.hpp"
 #include "engine/tail_metrics.hpp"
-#include "fixed/text_output.hpp"
 #include "fixed/wrap16.hpp"
-
-using quarzel::errorLine;
 
 namespace {
 
@@ -29,23 +25,23 @@ T8 toBoundary(T8 metrics) {
 TDecoder3GPU::TDecoder3GPU(bool is3GPP2, unsigned numPU, unsigned numThreads)
     : TDecoder3G(is3GPP2), itsNumPU(numPU), itsNumThreads(numThreads) {}
 
-TDecoder3GPU::~TDecoder3GPU() = default;
-
 TDecoder3GPU* TDecoder3GPU::create(bool is3GPP2, const std::string& properties) {
     unsigned numPU = 4;
-    unsigned numThreads = 4;
+    unsigned numThreads = defaultThreads;
     if (!properties.empty()) {
         std::istringstream stream(properties);
         stream.imbue(std::locale::classic());
         if (!(stream >> numPU) || numPU == 0) {
-            errorLine("ERROR:TDecoder3GPU:Illegal number of processing units:" + std::to_string(numPU));
+            quarzel::standardStreams.error(
+                {"ERROR:TDecoder3GPU:Illegal number of processing units:", quarzel::Decimal(numPU)});
             return nullptr;
         }
         if (stream.peek() == ',') {
             stream.get();
             if (!(stream >> numThreads) || numThreads == 0) {
-                errorLine("ERROR:TDecoder3GPU:Illegal number of threads per processing unit:" +
-                          std::to_string(numThreads));
+                quarzel::standardStreams.error(
+                    {"ERROR:TDecoder3GPU:Illegal number of threads per processing unit:",
+                     quarzel::Decimal(numThreads)});
                 return nullptr;
             }
         }
@@ -55,7 +51,7 @@ TDecoder3GPU* TDecoder3GPU::create(bool is3GPP2, const std::string& properties) 
 
 std::string TDecoder3GPU::getProperties() const {
     std::string properties = (its3GPP2 ? "3GPP2PU:" : "3GPPPU:") + std::to_string(itsNumPU);
-    if (itsNumThreads != 4) {
+    if (itsNumThreads != defaultThreads) {
         properties += "," + std::to_string(itsNumThreads);
     }
     return properties;
@@ -70,21 +66,21 @@ bool TDecoder3GPU::allocate(unsigned blockSize) {
         const std::uint32_t K = blockSize > tailSteps ? blockSize - tailSteps : 0;
         itsNT = quarzel::threadSegments(K, itsNumPU * itsNumThreads);
         if (itsVerbosity >= 1) {
-            quarzel::outputLine("itsNT=" + std::to_string(itsNT));
+            itsMessages.trace({"itsNT=", quarzel::Decimal(itsNT)});
         }
         if (K / itsNT * itsNT + tailSteps != blockSize) {
-            errorLine("ERROR:TDecoder3GPU:Block size not supported");
+            itsMessages.error({"ERROR:TDecoder3GPU:Block size not supported"});
             return false;
         }
-        quarzel::cutSegments(K, itsNT, itsSegments);
+        quarzel::cutSegments(K, itsNT, itsAlphaSegment, itsBetaSegment);
         itsCutSize = blockSize;
         if (itsVerbosity >= 2) {
-            quarzel::traceSegments(itsSegments);
+            quarzel::traceSegments(itsMessages, itsAlphaSegment, itsBetaSegment);
         }
     }
     for (unsigned set = 0; set < 2; ++set) {
-        itsAlphaInit[set].assign(itsSegments.alpha.size(), T8{});
-        itsBetaInit[set].assign(itsSegments.beta.size(), T8{});
+        itsAlphaInit[set].assign(itsAlphaSegment.size(), T8{});
+        itsBetaInit[set].assign(itsBetaSegment.size(), T8{});
     }
     return true;
 }
@@ -122,21 +118,21 @@ bool TDecoder3GPU::calcAlpha(unsigned siso) {
     const bool traced = itsVerbosity > 8;
     std::vector<T8>& init = itsAlphaInit[inputSet(siso)];
     if (traced) {
-        quarzel::outputLine("TDecoder3GPU::calcAlpha(" + std::to_string(siso) + ")");
+        itsMessages.trace({"TDecoder3GPU::calcAlpha(", quarzel::Decimal(siso), ")"});
     }
     if (siso <= 1) {
         setInitialState(&init[0]);
         for (std::size_t i = 1; i < init.size(); ++i) {
-            preCalcAlpha(siso, itsSegments.alpha[i].from, &init[i]);
+            preCalcAlpha(siso, itsAlphaSegment[i].from, &init[i]);
         }
     }
     T8 carry = init[0];
     for (std::size_t i = 0; i < init.size(); ++i) {
-        const ABSegment& segment = itsSegments.alpha[i];
+        const ABSegment& segment = itsAlphaSegment[i];
         itsAlpha[segment.from] = init[i];
         init[i] = toBoundary(carry);
         if (traced) {
-            quarzel::traceAlphaSegment(segment, itsAlpha[segment.from], carry);
+            quarzel::traceAlphaSegment(itsMessages, segment, itsAlpha[segment.from], carry);
         }
         if (!calcAlpha(siso, segment.from, segment.to)) {
             return false;
@@ -144,7 +140,7 @@ bool TDecoder3GPU::calcAlpha(unsigned siso) {
         carry = itsAlpha[segment.to];
     }
     if (traced) {
-        quarzel::traceBoundaries("itsAlphaInit", inputSet(siso), init);
+        quarzel::traceBoundaries(itsMessages, "itsAlphaInit", inputSet(siso), init);
     }
     return true;
 }
@@ -153,14 +149,14 @@ bool TDecoder3GPU::calcBeta(unsigned siso) {
     const bool traced = itsVerbosity > 8;
     std::vector<T8>& init = itsBetaInit[inputSet(siso)];
     if (traced) {
-        quarzel::outputLine("TDecoder3GPU::calcBeta(" + std::to_string(siso) + ")");
+        itsMessages.trace({"TDecoder3GPU::calcBeta(", quarzel::Decimal(siso), ")"});
     }
     if (siso <= 1) {
         for (std::size_t j = 0; j < init.size(); ++j) {
             if (j + 1 == init.size()) {
                 preCalcBetaTail(siso, &init[j]);
             } else {
-                preCalcBeta(siso, itsSegments.beta[j].from, &init[j]);
+                preCalcBeta(siso, itsBetaSegment[j].from, &init[j]);
             }
         }
     }
@@ -170,7 +166,7 @@ bool TDecoder3GPU::calcBeta(unsigned siso) {
     itsBetaWork.assign(init.begin(),
                        init.begin() + static_cast<std::ptrdiff_t>(std::min(threads, init.size())));
     for (std::size_t j = 0; j < init.size(); ++j) {
-        const ABSegment& window = itsSegments.beta[j];
+        const ABSegment& window = itsBetaSegment[j];
         T8& start = itsBetaWork[j % threads];
         const T8 saved = itsBeta[window.to];
         itsBeta[window.from] = start;
@@ -189,7 +185,7 @@ bool TDecoder3GPU::calcBeta(unsigned siso) {
             below = j >= threads ? j - threads : init.size() - threads + j - 1;
         }
         if (traced) {
-            quarzel::traceBetaWindow(window, itsBeta[window.from], itsBeta[window.to], below);
+            quarzel::traceBetaWindow(itsMessages, window, itsBeta[window.from], itsBeta[window.to], below);
         }
         if (below) {
             init[*below] = toBoundary(itsBeta[window.to]);
@@ -197,7 +193,7 @@ bool TDecoder3GPU::calcBeta(unsigned siso) {
         }
     }
     if (traced) {
-        quarzel::traceBoundaries("itsBetaInit", inputSet(siso), init);
+        quarzel::traceBoundaries(itsMessages, "itsBetaInit", inputSet(siso), init);
     }
     return true;
 }

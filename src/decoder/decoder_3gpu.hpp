@@ -1,19 +1,8 @@
 // SPDX-License-Identifier: MIT
 #pragma once
 
-#include <functional>
-#include <map>
-#include <memory>
-
 #include "decoder/decoder_3g.hpp"
 #include "decoder/segments.hpp"
-
-namespace quarzel {
-class LaneDecoder;
-namespace lanes {
-struct Candidate;
-}
-}  // namespace quarzel
 
 /// The turbo decoder with parallel processing units.
 ///
@@ -25,13 +14,15 @@ class TDecoder3GPU : public TDecoder3G {
   public:
     using ABSegment = quarzel::ABSegment;
 
+    /// Threads of a processing unit, unless others are asked for.
+    static constexpr unsigned defaultThreads = 4;
+
     /// @param is3GPP2     see TDecoder3G
     /// @param properties  "", units, or units "," threads per unit, in decimal; 4 and 4 when not given
     /// @return a new decoder that the caller deletes, or null after a line on the standard error stream
     static TDecoder3GPU* create(bool is3GPP2, const std::string& properties);
 
     TDecoder3GPU(bool is3GPP2, unsigned numPU, unsigned numThreads);
-    ~TDecoder3GPU() override;
 
     /// Cut the block as well, and clear all boundary metrics.
     /// @return false, after a line on the standard error stream, when the segments would not be equal
@@ -45,25 +36,16 @@ class TDecoder3GPU : public TDecoder3G {
     bool calcAlpha(unsigned siso) override;
     bool calcBeta(unsigned siso) override;
 
-    void enableLanes() override;
-    void disableLanes() override;
-
-    /// The same by an instruction set of the caller's choice, one of `quarzel::lanes::candidates()`; it is
-    /// not copied.
-    void enableLanes(const quarzel::lanes::Candidate& candidate);
-
-    bool takesLanes(unsigned K) override;
-    bool decodeLanes(unsigned K, unsigned iterations, std::span<const quarzel::LaneBlock> blocks) override;
-
-    /// Blocks that the fast road decoded are decoded again first, as far as their metrics could show.
-    bool extract(const std::vector<short>& soft) override;
-
     /// Thread segments of the block last allocated.
     unsigned threadCount() const { return itsNT; }
-    const std::vector<ABSegment>& alphaSegments() const { return itsSegments.alpha; }
-    const std::vector<ABSegment>& betaSegments() const { return itsSegments.beta; }
+    const std::vector<ABSegment>& alphaSegments() const { return itsAlphaSegment; }
+    const std::vector<ABSegment>& betaSegments() const { return itsBetaSegment; }
 
-  private:
+    /// All threads of all processing units.
+    unsigned threads() const { return itsNumPU * itsNumThreads; }
+    bool is3GPP2() const { return its3GPP2; }
+
+  protected:
     using TDecoder3G::calcAlpha;
     using TDecoder3G::calcBeta;
     using TDecoder3G::calcGamma;
@@ -75,27 +57,16 @@ class TDecoder3GPU : public TDecoder3G {
     /// Start of the block's last window: the backward metrics that the three termination steps give.
     bool preCalcBetaTail(unsigned siso, T8* out) const;
 
-    int laneAlgorithm() const;
-    void rememberLaneBlock(std::uint32_t next);
-    void settleLaneBlocks();
-
     const std::uint32_t itsNumPU;
     const std::uint32_t itsNumThreads;
-    std::uint32_t itsNT = 0;  ///< thread segments of the block
-    std::uint32_t itsCutSize =
-        0;  ///< trellis steps that the segments were cut for; 0 when they are of no use
-    quarzel::Segments itsSegments;
+    std::uint32_t itsNT = 0;                      ///< thread segments of the block
     std::array<std::vector<T8>, 2> itsAlphaInit;  ///< per input set, the start of each forward segment
+    std::vector<ABSegment> itsAlphaSegment;       ///< the thread segments
     std::array<std::vector<T8>, 2> itsBetaInit;   ///< per input set, the start of each backward window
-    std::vector<T8> itsBetaWork;                  ///< per thread, the start of its next window
+    std::vector<ABSegment> itsBetaSegment;        ///< the windows: the first of all threads, the second ...
 
-    /// A block of the fast road whose metrics a literal decode would have left in the store.
-    struct LaneRecord {
-        bool live = false;
-        unsigned iterations = 0;
-        std::vector<std::int8_t> soft;
-    };
-    std::unique_ptr<quarzel::LaneDecoder> itsLanes;  ///< null while the fast road is off
-    /// By size, largest first, which is oldest first: a block hides those of its size and below.
-    std::map<std::uint32_t, LaneRecord, std::greater<>> itsLaneRecords;
+  private:
+    std::uint32_t itsCutSize =
+        0;                        ///< trellis steps that the segments were cut for; 0 when they are of no use
+    std::vector<T8> itsBetaWork;  ///< per thread, the start of its next window
 };

@@ -1,14 +1,12 @@
 // SPDX-License-Identifier: MIT
 #include <algorithm>
 #include <iterator>
+#include <ostream>
 #include <string>
 
 #include "decoder/decoder_3g.hpp"
 #include "engine/dump_columns.hpp"
 #include "engine/engine.hpp"
-#include "fixed/text_output.hpp"
-
-using quarzel::writeText;
 
 namespace {
 
@@ -17,6 +15,11 @@ constexpr const char* passHeader =
     "a7"
     "            b0          b1          b2          b3          b4          b5          b6          b7"
     "            g4          g5          g6          g7            llr         ext\n";
+
+/// In one write, which no setting of the stream changes. Its error state is as after any output.
+void write(std::ostream& stream, const std::string& text) {
+    stream.write(text.data(), static_cast<std::streamsize>(text.size()));
+}
 
 std::string inputLine(const char* label, const std::vector<short>& values) {
     std::string line = label;
@@ -31,13 +34,13 @@ std::string inputLine(const char* label, const std::vector<short>& values) {
 }  // namespace
 
 void TDecoder3G::dumpInput(std::ostream& stream) const {
-    writeText(stream, std::string(120, '-') + "\n" +               //
-                          inputLine("itsSys [0]=[", itsSys[0]) +   //
-                          inputLine("itsPar0[0]=[", itsPar0[0]) +  //
-                          inputLine("itsPar1[0]=[", itsPar1[0]) +  //
-                          inputLine("itsSys [1]=[", itsSys[1]) +   //
-                          inputLine("itsPar0[1]=[", itsPar0[1]) +  //
-                          inputLine("itsPar1[1]=[", itsPar1[1]));
+    write(stream, std::string(120, '-') + "\n" +               //
+                      inputLine("itsSys [0]=[", itsSys[0]) +   //
+                      inputLine("itsPar0[0]=[", itsPar0[0]) +  //
+                      inputLine("itsPar1[0]=[", itsPar1[0]) +  //
+                      inputLine("itsSys [1]=[", itsSys[1]) +   //
+                      inputLine("itsPar0[1]=[", itsPar0[1]) +  //
+                      inputLine("itsPar1[1]=[", itsPar1[1]));
 }
 
 quarzel::TraceRow TDecoder3G::traceRow(unsigned step) const {
@@ -55,9 +58,12 @@ quarzel::TraceRow TDecoder3G::traceRow(unsigned step) const {
 }
 
 void TDecoder3G::dumpFull(std::ostream& stream, unsigned siso) {
+    if (itsEngine == nullptr || itsEngine->stateFormat() == nullptr) {
+        return;
+    }
     const TNumberFormat& format = *itsEngine->stateFormat();
-    writeText(stream, std::string(289, '-') + "\ndecode=" + std::to_string(itsDecodeCount) +
-                          " siso=" + std::to_string(siso) + "\n" + passHeader);
+    write(stream, std::string(289, '-') + "\ndecode=" + std::to_string(itsDecodeCount) +
+                      " siso=" + std::to_string(siso) + "\n" + passHeader);
     std::string text;
     for (std::uint32_t step = 0; step < itsBlockSize; ++step) {
         const quarzel::TraceRow row = traceRow(step);
@@ -70,6 +76,7 @@ void TDecoder3G::dumpFull(std::ostream& stream, unsigned siso) {
             quarzel::appendReal(text, row[column], format);
         }
         text += '\n';
-        writeText(stream, text);
+        write(stream, text);
     }
+    stream.flush();
 }

@@ -1,7 +1,7 @@
 // SPDX-License-Identifier: MIT
 #include "decoder/segment_trace.hpp"
 
-#include "fixed/text_output.hpp"
+#include <string>
 
 namespace quarzel {
 
@@ -30,31 +30,31 @@ std::string listText(const std::vector<ABSegment>& ranges) {
 
 }  // namespace
 
-void traceSegments(const Segments& segments) {
-    outputLine("itsAlphaSegment=" + listText(segments.alpha));
-    outputLine("itsBetaSegment =" + listText(segments.beta));
+void traceSegments(const Messages& messages, const std::vector<ABSegment>& alpha,
+                   const std::vector<ABSegment>& beta) {
+    messages.trace({"itsAlphaSegment=", listText(alpha)});
+    messages.trace({"itsBetaSegment =", listText(beta)});
 }
 
-void traceAlphaSegment(const ABSegment& segment, const T8& start, const T8& next) {
-    outputLine(rangeText(segment) + " init=[" + metricsText(start) + "] newinit=[" + metricsText(next) + "]");
+void traceAlphaSegment(const Messages& messages, const ABSegment& segment, const T8& start, const T8& next) {
+    messages.trace(
+        {rangeText(segment), " init=[", metricsText(start), "] newinit=[", metricsText(next), "]"});
 }
 
-void traceBetaWindow(const ABSegment& window, const T8& from, const T8& to,
+void traceBetaWindow(const Messages& messages, const ABSegment& window, const T8& from, const T8& to,
                      std::optional<std::size_t> entry) {
-    std::string line =
-        rangeText(window) + " beta[from]=[" + metricsText(from) + "] beta[to]=[" + metricsText(to) + "]";
-    if (entry) {
-        line += " init[" + std::to_string(*entry) + "]=" + metricsText(to);
-    }
-    outputLine(line);
+    const std::string store = entry ? " init[" + std::to_string(*entry) + "]=" + metricsText(to) : "";
+    messages.trace(
+        {rangeText(window), " beta[from]=[", metricsText(from), "] beta[to]=[", metricsText(to), "]", store});
 }
 
-void traceBoundaries(const std::string& name, unsigned set, const std::vector<T8>& boundaries) {
-    std::string line = name + "[" + std::to_string(set) + "]=";
+void traceBoundaries(const Messages& messages, std::string_view name, unsigned set,
+                     const std::vector<T8>& boundaries) {
+    std::string text;
     for (const T8& metrics : boundaries) {
-        line += "[" + metricsText(metrics) + "] ";
+        text += "[" + metricsText(metrics) + "] ";
     }
-    outputLine(line);
+    messages.trace({name, "[", Decimal(set), "]=", text});
 }
 
 }  // namespace quarzel

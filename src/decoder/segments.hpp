@@ -21,12 +21,6 @@ struct ABSegment {
 std::string toText(const ABSegment& segment);
 std::ostream& operator<<(std::ostream& stream, const ABSegment& segment);
 
-struct Segments {
-    std::vector<ABSegment> alpha;  ///< one a thread segment
-    std::vector<ABSegment>
-        beta;  ///< window-major: the first windows of all thread segments, then the second ...
-};
-
 /// Thread segments that a block is cut into: doubled while there are threads left and each segment keeps 64
 /// steps. The doubling may pass a thread count that is no power of two.
 constexpr std::uint32_t threadSegments(std::uint32_t K, std::uint32_t threads) {
@@ -46,8 +40,15 @@ constexpr std::uint32_t windowLength(std::uint32_t rest) {
     return rest > 64 ? (rest + 1) / 2 : rest;
 }
 
+/// Backward windows of a thread segment of so many steps, from the lowest up.
+std::vector<std::uint16_t> windowLengths(std::uint32_t steps);
+
 /// The segments and windows of a block of K steps cut into `count` thread segments; K is a multiple of count.
-/// Replaces what `segments` holds.
-void cutSegments(std::uint32_t K, std::uint32_t count, Segments& segments);
+///
+/// @param alpha  receives the thread segments
+/// @param beta   receives the windows, window-major: the first ones of all thread segments, then the second
+/// ...
+void cutSegments(std::uint32_t K, std::uint32_t count, std::vector<ABSegment>& alpha,
+                 std::vector<ABSegment>& beta);
 
 }  // namespace quarzel

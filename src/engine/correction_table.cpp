@@ -4,7 +4,6 @@
 #include <cmath>
 
 #include "engine/engine_mod_base.hpp"
-#include "fixed/text_output.hpp"
 
 namespace {
 
@@ -23,21 +22,20 @@ unsigned char toTableByte(double y, const TNumberFormat& format) {
 
 }  // namespace
 
-std::vector<unsigned char> TCalculationEngineModBase::createLUT(unsigned points,
-                                                                const TNumberFormat* format) {
+std::vector<unsigned char> TCalculationEngineModBase::createLUT(unsigned points, const TNumberFormat* format,
+                                                                const quarzel::Messages& messages) {
     if (points == 0) {
         points = 65536;
     }
     if (format->binpt + format->shift > 8) {
-        quarzel::errorLine(
-            "ERROR:TCalculationEngineModBase::createLUT:Binary point of state metrics is incompatible with 8 "
-            "bit "
-            "lookup tables");
+        messages.error(
+            {"ERROR:TCalculationEngineModBase::createLUT:Binary point of state metrics is incompatible with "
+             "8 bit lookup tables"});
         return {};
     }
     if (!std::has_single_bit(points)) {
-        quarzel::errorLine(
-            "ERROR:TCalculationEngineModBase::createLUT:Number of points must be a binary number");
+        messages.error(
+            {"ERROR:TCalculationEngineModBase::createLUT:Number of points must be a binary number"});
         return {};
     }
     // The table ignores the low bits of a difference: its step is 8 / points, no finer than the metrics are.

@@ -5,7 +5,6 @@
 #include "engine/engine_mod.hpp"
 #include "engine/engine_mod_hash.hpp"
 #include "fixed/properties.hpp"
-#include "fixed/text_output.hpp"
 
 TCalculationEngine::TCalculationEngine() : itsSSE2(hasSSE2()) {}
 
@@ -17,7 +16,7 @@ TCalculationEngine* TCalculationEngine::create(const std::string& properties) {
     if (type == "MOD#") {
         return TCalculationEngineModHash::create(rest);
     }
-    quarzel::errorLine("ERROR:TCalculationEngine:Unrecognised type:" + type);
+    quarzel::standardStreams.error({"ERROR:TCalculationEngine:Unrecognised type:", type});
     return nullptr;
 }
 
@@ -28,9 +27,9 @@ std::vector<std::string> TCalculationEngine::getNames() {
 bool TCalculationEngine::initialise() {
     const std::int16_t mask = itsStateFormat->mask;
     if (mask == mask / 2) {
-        quarzel::outputLine(
-            "WARNING:The state number format is set to maximum bit width. Note that this will cause a 1-bit "
-            "truncation during intrinsic calculations");
+        itsMessages.warning(
+            {"WARNING:The state number format is set to maximum bit width. Note that this will cause a 1-bit "
+             "truncation during intrinsic calculations"});
     }
     return true;
 }

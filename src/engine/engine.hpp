@@ -5,6 +5,7 @@
 #include <vector>
 
 #include "engine/t8.hpp"
+#include "fixed/messages.hpp"
 #include "fixed/number_format.hpp"
 
 /// The trellis arithmetic of a constituent decoder: branch metrics, forward and backward recursion, and
@@ -61,6 +62,10 @@ class TCalculationEngine {
         itsGammaFormat = gamma;
     }
 
+    /// Where the engine's lines go: the standard streams until set.
+    void setMessages(const quarzel::Messages& messages) { itsMessages = messages; }
+    const quarzel::Messages& messages() const { return itsMessages; }
+
     const TNumberFormat* stateFormat() const { return itsStateFormat; }
     const TNumberFormat* gammaFormat() const { return itsGammaFormat; }
 
@@ -71,4 +76,5 @@ class TCalculationEngine {
     const TNumberFormat* itsInputFormat = nullptr;  ///< format of the soft inputs; nothing reads it
     const TNumberFormat* itsStateFormat = nullptr;  ///< format of the state metrics
     const TNumberFormat* itsGammaFormat = nullptr;  ///< format that branch metrics are clamped to
+    quarzel::Messages itsMessages;
 };

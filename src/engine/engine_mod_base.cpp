@@ -1,10 +1,6 @@
 // SPDX-License-Identifier: MIT
 #include "engine/engine_mod_base.hpp"
 
-#include "fixed/text_output.hpp"
-
-using quarzel::errorLine;
-
 void TCalculationEngineModBase::select(AlgorithmType type, const unsigned char* lut) {
     itsAlphaAlgorithm = itsBetaAlgorithm = itsLLRAlgorithm = type;
     itsAlphaLUT = itsBetaLUT = itsLLRLUT = lut;
@@ -25,7 +21,7 @@ T8* TCalculationEngineModBase::alpha(unsigned n, const T8* gamma, T8* alpha) {
         case AlgorithmType::ModHash:
             return itsSSE2 ? sse2_modhash_alpha(n, gamma, alpha) : modhash_alpha(n, gamma, alpha);
     }
-    errorLine("ERROR:TCalculationEngineModBase::alpha:Illegal algorithm type");
+    itsMessages.error({"ERROR:TCalculationEngineModBase::alpha:Illegal algorithm type"});
     return nullptr;
 }
 
@@ -38,7 +34,7 @@ T8* TCalculationEngineModBase::beta(unsigned n, const T8* gamma, T8* beta) {
         case AlgorithmType::ModHash:
             return itsSSE2 ? sse2_modhash_beta(n, gamma, beta) : modhash_beta(n, gamma, beta);
     }
-    errorLine("ERROR:TCalculationEngineModBase::beta:Illegal algorithm type");
+    itsMessages.error({"ERROR:TCalculationEngineModBase::beta:Illegal algorithm type"});
     return nullptr;
 }
 
@@ -54,6 +50,6 @@ short* TCalculationEngineModBase::llr(unsigned n, const T8* alpha, const T8* bet
             return itsSSE2 ? sse2_modhash_llr(n, alpha, beta, gamma, out)
                            : modhash_llr(n, alpha, beta, gamma, out);
     }
-    errorLine("ERROR:TCalculationEngineModBase::llr:Illegal algorithm type");
+    itsMessages.error({"ERROR:TCalculationEngineModBase::llr:Illegal algorithm type"});
     return nullptr;
 }

@@ -34,7 +34,9 @@ class TCalculationEngineModBase : public TCalculationEngine {
     /// @return 65536 bytes, entry j belonging to the difference j - 32768, each left-aligned as the metrics
     /// are;
     ///         empty after a line on the standard error stream when points or format do not fit
-    static std::vector<unsigned char> createLUT(unsigned points, const TNumberFormat* format);
+    /// @param messages  where the line goes
+    static std::vector<unsigned char> createLUT(unsigned points, const TNumberFormat* format,
+                                                const quarzel::Messages& messages = quarzel::standardStreams);
 
     /// The entry of a correction table that belongs to difference 0.
     static constexpr std::size_t lutCentre = 32768;

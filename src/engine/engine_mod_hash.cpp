@@ -4,15 +4,13 @@
 #include <locale>
 #include <sstream>
 
-#include "fixed/text_output.hpp"
-
 TCalculationEngineModHash* TCalculationEngineModHash::create(const std::string& properties) {
     std::uint32_t points = 0;
     if (!properties.empty()) {
         std::istringstream stream(properties);
         stream.imbue(std::locale::classic());
         if (!(stream >> points)) {
-            quarzel::errorLine("ERROR:TCalculationEngineModHash:Illegal number of points");
+            quarzel::standardStreams.error({"ERROR:TCalculationEngineModHash:Illegal number of points"});
             return nullptr;
         }
     }
@@ -24,11 +22,12 @@ std::string TCalculationEngineModHash::getProperties() const {
 }
 
 bool TCalculationEngineModHash::initialise() {
-    std::vector<unsigned char> table = createLUT(itsPoints, itsStateFormat);
+    std::vector<unsigned char> table = createLUT(itsPoints, itsStateFormat, itsMessages);
     if (table.empty()) {
         return false;
     }
     itsLUT = std::move(table);
+    itsTableFormat = *itsStateFormat;
     select(AlgorithmType::ModHash, itsLUT.data() + lutCentre);
     return true;
 }

@@ -2,6 +2,7 @@
 #pragma once
 
 #include <cstdint>
+#include <optional>
 #include <vector>
 
 #include "engine/engine_mod_base.hpp"
@@ -23,12 +24,13 @@ class TCalculationEngineModHash : public TCalculationEngineModBase {
 
     std::uint32_t points() const { return itsPoints; }
 
-    /// Whether `initialise` has built the table.
-    bool initialised() const { return !itsLUT.empty(); }
+    /// The state format that `initialise` built the table for; none before.
+    const std::optional<TNumberFormat>& tableFormat() const { return itsTableFormat; }
 
   private:
     explicit TCalculationEngineModHash(std::uint32_t points) : itsPoints(points) {}
 
     std::uint32_t itsPoints;
     std::vector<unsigned char> itsLUT;  ///< 65536 entries after `initialise`, empty before
+    std::optional<TNumberFormat> itsTableFormat;
 };

@@ -6,10 +6,10 @@
 #include <ostream>
 #include <sstream>
 
+#include "fixed/messages.hpp"
 #include "fixed/properties.hpp"
-#include "fixed/text_output.hpp"
 
-using quarzel::errorLine;
+using quarzel::standardStreams;
 
 namespace {
 
@@ -41,15 +41,15 @@ TNumberFormat* TNumberFormat::create(const std::string& properties) {
     char separator = '\0';
     stream >> nbits >> separator >> binpt;
     if (head != "Fix" || stream.fail() || separator != '_' || nbits > most || binpt > most) {
-        errorLine("ERROR:TNumberFormat:Unexpected property string:" + properties);
+        standardStreams.error({"ERROR:TNumberFormat:Unexpected property string:", properties});
         return nullptr;
     }
     if (nbits < 1 || nbits > 16) {
-        errorLine("ERROR:TNumberFormat:nbits must be in range [1:16]");
+        standardStreams.error({"ERROR:TNumberFormat:nbits must be in range [1:16]"});
         return nullptr;
     }
     if (binpt < 1 || binpt > 16 || binpt >= nbits) {
-        errorLine("ERROR:TNumberFormat:binpt must be in range [1:16] and <nbits");
+        standardStreams.error({"ERROR:TNumberFormat:binpt must be in range [1:16] and <nbits"});
         return nullptr;
     }
     return new TNumberFormat(static_cast<std::uint32_t>(nbits), static_cast<std::uint32_t>(binpt));

@@ -33,6 +33,8 @@ class TNumberFormat {
     std::int32_t maxQ;    ///< largest value, as the integer q
     std::int16_t mask;    ///< the bits of a word that the format has
 
+    bool operator==(const TNumberFormat&) const = default;
+
     /// The integer q that a word of this format holds.
     std::int32_t toInteger(std::int16_t word) const { return word >> (shift & 31U); }
 

@@ -4,9 +4,9 @@
 #include <algorithm>
 #include <fstream>
 
+#include "fixed/messages.hpp"
 #include "fixed/properties.hpp"
 #include "fixed/string_utilities.hpp"
-#include "fixed/text_output.hpp"
 
 namespace {
 
@@ -32,8 +32,8 @@ bool parse(std::istream& stream, std::map<std::string, std::string>& parameters,
         if (addKeys || parameters.contains(key)) {
             parameters[key] = stripws(right);
         } else {
-            quarzel::errorLine("ERROR:" + std::to_string(lineNumber) + ":Parameter name '" + key +
-                               "' is invalid");
+            quarzel::standardStreams.error(
+                {"ERROR:", quarzel::Decimal(lineNumber), ":Parameter name '", key, "' is invalid"});
             allGood = false;
         }
     }
@@ -44,7 +44,7 @@ bool parse(const std::string& fileName, std::map<std::string, std::string>& para
     std::ifstream file(fileName);
     file.peek();  // A directory opens as a file does and fails when it is read.
     if (!file) {
-        quarzel::errorLine("ERROR:Could not open input file '" + fileName + "'");
+        quarzel::standardStreams.error({"ERROR:Could not open input file '", fileName, "'"});
         return false;
     }
     return parse(file, parameters, addKeys);

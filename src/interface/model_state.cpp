@@ -4,14 +4,17 @@
 #include <new>
 #include <string>
 
-#include "decoder/decoder.hpp"
+#include "decoder/decoder_3gpu.hpp"
 #include "engine/engine.hpp"
 #include "fixed/number_format.hpp"
-#include "interface/messages.hpp"
-#include "interface/state.hpp"
+#include "interface/block_call.hpp"
+#include "interface/lane_implementation.hpp"
+#include "interface/pass_port.hpp"
+#include "interface/wiring.hpp"
 #include "interleaver/interleaver.hpp"
 
 using quarzel::decoderError;
+using quarzel::Messages;
 
 // The records are laid out for 64-bit Linux, whatever compiler or language calls.
 static_assert(sizeof(void*) != 8 || sizeof(vardel_ip_quarzel_generics) == 72);
@@ -38,10 +41,11 @@ vardel_ip_quarzel_generics* vardel_ip_quarzel_get_default_generics(vardel_ip_qua
     return generics;
 }
 
-namespace {
-
-/// The text for the first generic that does not fit, or null.
-const char* findFault(const vardel_ip_quarzel_generics& generics) {
+const char* vardel_ip_quarzel_check_generics(const vardel_ip_quarzel_generics* record) {
+    if (record == nullptr) {
+        return "Generics must not be a null pointer";
+    }
+    const vardel_ip_quarzel_generics& generics = *record;
     if (generics.C_NUM_PU != 2 && generics.C_NUM_PU != 4 && generics.C_NUM_PU != 8) {
         return "C_NUM_PU must be either 2, 4 or 8";
     }
@@ -66,19 +70,21 @@ const char* findFault(const vardel_ip_quarzel_generics& generics) {
     return nullptr;
 }
 
+namespace {
+
 /// Create and wire the components of a state.
 /// @return the text for the first that failed, or null
 const char* fillState(vardel_ip_quarzel_state& state) {
     const int algorithm = state.generics.C_ALGORITHM_TYPE;
-    state.state_format = TNumberFormat::create("Fix_12_3");
+    state.state_format = TNumberFormat::create(quarzel::stateFormatProperties);
     if (state.state_format == nullptr) {
         return "Could not set state number format";
     }
-    state.branch_format = TNumberFormat::create("Fix_8_3");
+    state.branch_format = TNumberFormat::create(quarzel::branchFormatProperties);
     if (state.branch_format == nullptr) {
         return "Could not set branch number format";
     }
-    state.input_format = TNumberFormat::create("Fix_8_3");
+    state.input_format = TNumberFormat::create(quarzel::inputFormatProperties);
     if (state.input_format == nullptr) {
         return "Could not set input number format";
     }
@@ -86,10 +92,11 @@ const char* fillState(vardel_ip_quarzel_state& state) {
     if (state.interleaver == nullptr) {
         return "Could not create interleaver";
     }
-    state.engine = TCalculationEngine::create(algorithm == 2 ? "MOD#:16" : "MOD");
+    state.engine = TCalculationEngine::create(quarzel::engineProperties(algorithm));
     if (state.engine == nullptr) {
         return "Could not create calculation engine";
     }
+    state.engine->setMessages(state.messages);
     state.engine->setFormats(state.input_format, state.state_format, state.branch_format);
     if (!state.engine->initialise()) {
         return "Could not initialise calculation engine";
@@ -99,32 +106,33 @@ const char* fillState(vardel_ip_quarzel_state& state) {
         return "Could not create decoder";
     }
     state.decoder->connect(state.interleaver, state.engine);
-    state.decoder->setExtrinsicScale(algorithm == 1 ? 0.75 : 1.0);
-    state.decoder->enableLanes();
+    state.decoder->setExtrinsicScale(quarzel::extrinsicScale(algorithm));
+    const auto units = static_cast<unsigned>(state.generics.C_NUM_PU);
+    state.lanes = new quarzel::LaneImplementation(units * TDecoder3GPU::defaultThreads, algorithm);
     return nullptr;
 }
 
-}  // namespace
-
-vardel_ip_quarzel_state* create_default_state(vardel_ip_quarzel_generics generics) {
+vardel_ip_quarzel_state* createRecord(const vardel_ip_quarzel_generics& generics, const Messages& messages) {
     void* memory = std::malloc(sizeof(vardel_ip_quarzel_state));
     if (memory == nullptr) {
-        decoderError("Could not allocate memory for decoder state");
+        decoderError(messages, "Could not allocate memory for decoder state");
         return nullptr;
     }
     auto* state = new (memory) vardel_ip_quarzel_state{};
     state->generics = generics;
+    state->messages = messages;
     // The shift count is taken modulo 32, so that a width of 32 gives an empty mask, as a width of 0 does.
     state->tag_mask = (1U << (static_cast<unsigned>(generics.C_TAG_WIDTH) % 32U)) - 1U;
     return state;
 }
 
-vardel_ip_quarzel_state* vardel_ip_quarzel_create_state(vardel_ip_quarzel_generics generics) {
-    if (const char* fault = findFault(generics)) {
-        decoderError(fault);
+/// Create a state all of whose lines go to `messages`.
+vardel_ip_quarzel_state* createState(const vardel_ip_quarzel_generics* generics, const Messages& messages) {
+    if (const char* fault = vardel_ip_quarzel_check_generics(generics)) {
+        decoderError(messages, fault);
         return nullptr;
     }
-    vardel_ip_quarzel_state* state = create_default_state(generics);
+    vardel_ip_quarzel_state* state = createRecord(*generics, messages);
     if (state == nullptr) {
         return nullptr;
     }
@@ -135,14 +143,12 @@ vardel_ip_quarzel_state* vardel_ip_quarzel_create_state(vardel_ip_quarzel_generi
         fault = "Unhandled exception has occurred";
     }
     if (fault != nullptr) {
-        decoderError(fault);
+        decoderError(messages, fault);
         vardel_ip_quarzel_destroy_state(state);
         return nullptr;
     }
     return state;
 }
-
-namespace {
 
 template <class Component>
 void destroy(Component*& component) {
@@ -151,6 +157,24 @@ void destroy(Component*& component) {
 }
 
 }  // namespace
+
+vardel_ip_quarzel_state* create_default_state(vardel_ip_quarzel_generics generics) {
+    return createRecord(generics, quarzel::standardStreams);
+}
+
+vardel_ip_quarzel_state* vardel_ip_quarzel_create_state(vardel_ip_quarzel_generics generics) {
+    return createState(&generics, quarzel::standardStreams);
+}
+
+vardel_ip_quarzel_state* vardel_ip_quarzel_create_state_with_messages(
+    const vardel_ip_quarzel_generics* generics, vardel_ip_quarzel_message_receiver receiver, void* cookie) {
+    return createState(generics, Messages(receiver, cookie));
+}
+
+void vardel_ip_quarzel_set_messages(vardel_ip_quarzel_state* state,
+                                    vardel_ip_quarzel_message_receiver receiver, void* cookie) {
+    state->messages = Messages(receiver, cookie);
+}
 
 void vardel_ip_quarzel_destroy_state(vardel_ip_quarzel_state* state) {
     if (state == nullptr) {
@@ -162,6 +186,8 @@ void vardel_ip_quarzel_destroy_state(vardel_ip_quarzel_state* state) {
     destroy(state->engine);
     destroy(state->interleaver);
     destroy(state->decoder);
+    destroy(state->passes);
+    destroy(state->lanes);
     std::free(state);
 }
 

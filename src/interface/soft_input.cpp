@@ -1,26 +1,38 @@
 // SPDX-License-Identifier: MIT
 #include "interface/soft_input.hpp"
 
+#include <cstdint>
+
 namespace quarzel {
 
-void toSoftValues(const vardel_ip_quarzel_inputs& inputs, const TNumberFormat& input,
-                  const TNumberFormat& state, std::vector<short>& soft) {
-    const int* const streams[] = {inputs.rsc1_sys, inputs.rsc1_par, inputs.rsc2_par};
-    soft.reserve(3 * static_cast<std::size_t>(inputs.din_size));
-    for (int position = 0; position < inputs.din_size; ++position) {
-        for (const int* stream : streams) {
+int valueAt(const BlockCall& call, std::size_t stream, int position) {
+    const std::ptrdiff_t place = call.positionStride * position;
+    switch (call.valueType) {
+        case VARDEL_IP_QUARZEL_INT8:
+            return static_cast<const std::int8_t*>(call.streams[stream])[place];
+        case VARDEL_IP_QUARZEL_INT16:
+            return static_cast<const std::int16_t*>(call.streams[stream])[place];
+        default:
+            return static_cast<const std::int32_t*>(call.streams[stream])[place];
+    }
+}
+
+void toSoftValues(const BlockCall& call, const TNumberFormat& input, const TNumberFormat& state,
+                  std::vector<short>& soft) {
+    soft.reserve(3 * static_cast<std::size_t>(call.size));
+    for (int position = 0; position < call.size; ++position) {
+        for (std::size_t stream = 0; stream < 3; ++stream) {
             int saturated = 0;
-            soft.push_back(toSoftValue(stream[position], input, state, saturated));
+            soft.push_back(toSoftValue(valueAt(call, stream, position), input, state, saturated));
         }
     }
 }
 
-std::optional<Saturation> findSaturation(const vardel_ip_quarzel_inputs& inputs, const TNumberFormat& input) {
-    const int* const streams[] = {inputs.rsc1_sys, inputs.rsc1_par, inputs.rsc2_par};
-    for (int position = 0; position < inputs.din_size; ++position) {
+std::optional<Saturation> findSaturation(const BlockCall& call, const TNumberFormat& input) {
+    for (int position = 0; position < call.size; ++position) {
         for (std::size_t stream = 0; stream < 3; ++stream) {
             int saturated = 0;
-            toSoftValue(streams[stream][position], input, input, saturated);
+            toSoftValue(valueAt(call, stream, position), input, input, saturated);
             if (saturated != 0) {
                 return Saturation{position, stream, saturated > 0};
             }

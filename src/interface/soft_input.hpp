@@ -6,7 +6,7 @@
 #include <vector>
 
 #include "fixed/soft_value.hpp"
-#include "vardel_ip_quarzel.h"
+#include "interface/block_call.hpp"
 
 /// From the caller's integers to the decoder's soft values: pure and silent.
 namespace quarzel {
@@ -18,13 +18,16 @@ struct Saturation {
     bool positive;
 };
 
+/// A value of the caller's.
+int valueAt(const BlockCall& call, std::size_t stream, int position);
+
 /// Convert a block: position by position systematic, parity 1, parity 2.
 ///
-/// @param soft  receives 3 * din_size words of the state format
-void toSoftValues(const vardel_ip_quarzel_inputs& inputs, const TNumberFormat& input,
-                  const TNumberFormat& state, std::vector<short>& soft);
+/// @param soft  receives 3 * size words of the state format
+void toSoftValues(const BlockCall& call, const TNumberFormat& input, const TNumberFormat& state,
+                  std::vector<short>& soft);
 
 /// The first value of a block that the conversion saturates, in position order.
-std::optional<Saturation> findSaturation(const vardel_ip_quarzel_inputs& inputs, const TNumberFormat& input);
+std::optional<Saturation> findSaturation(const BlockCall& call, const TNumberFormat& input);
 
 }  // namespace quarzel

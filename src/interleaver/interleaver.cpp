@@ -1,10 +1,7 @@
 // SPDX-License-Identifier: MIT
 #include "interleaver/interleaver.hpp"
 
-#include <iostream>
-
 #include "fixed/properties.hpp"
-#include "fixed/text_output.hpp"
 #include "interleaver/interleaver_3gpplte.hpp"
 
 TInterleaver* TInterleaver::create(const std::string& properties) {
@@ -12,7 +9,7 @@ TInterleaver* TInterleaver::create(const std::string& properties) {
     if (type == "3GPPLTE") {
         return TInterleaver3GPPLTE::create(rest);
     }
-    quarzel::errorLine("ERROR:TInterleaver:Unrecognised type:" + type);
+    quarzel::standardStreams.error({"ERROR:TInterleaver:Unrecognised type:", type});
     return nullptr;
 }
 
@@ -52,6 +49,6 @@ void TInterleaver::dumpAll(unsigned first, unsigned last, bool showK) const {
             line.append(separator).append(std::to_string(entry));
             separator = " ";
         }
-        quarzel::outputLine(line);
+        itsMessages.trace({line});
     }
 }

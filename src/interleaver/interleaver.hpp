@@ -5,6 +5,8 @@
 #include <string>
 #include <vector>
 
+#include "fixed/messages.hpp"
+
 /// The permutation between the two constituent codes of a turbo code, for any block size of its family.
 ///
 /// The two tables are a cache that the decoder fills and reads: a table whose size is K is the one of K.
@@ -46,6 +48,13 @@ class TInterleaver {
     mutable std::vector<std::uint32_t> itsPermutation;         ///< permutation of the K last computed
     mutable std::vector<std::uint32_t> itsInversePermutation;  ///< entry itsPermutation[i] is i
 
+    /// Where `dumpAll` prints: the standard streams until set.
+    void setMessages(const quarzel::Messages& messages) { itsMessages = messages; }
+    const quarzel::Messages& messages() const { return itsMessages; }
+
   protected:
     TInterleaver() = default;
+
+  private:
+    quarzel::Messages itsMessages;
 };

@@ -3,7 +3,7 @@
 
 #include <algorithm>
 
-#include "fixed/text_output.hpp"
+#include "fixed/messages.hpp"
 #include "interleaver/lte_params.hpp"
 
 namespace {
@@ -20,7 +20,7 @@ const LteParams* findParams(unsigned K) {
 
 TInterleaver3GPPLTE* TInterleaver3GPPLTE::create(const std::string& properties) {
     if (!properties.empty()) {
-        quarzel::errorLine("ERROR:TInterleaver3GPPLTE:Unexpected properties:" + properties);
+        quarzel::standardStreams.error({"ERROR:TInterleaver3GPPLTE:Unexpected properties:", properties});
         return nullptr;
     }
     return new TInterleaver3GPPLTE;

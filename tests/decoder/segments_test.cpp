@@ -18,9 +18,14 @@ std::vector<std::uint32_t> windowLengths(std::uint32_t length) {
     return windows;
 }
 
+struct Segments {
+    std::vector<ABSegment> alpha;
+    std::vector<ABSegment> beta;
+};
+
 Segments cut(std::uint32_t K, std::uint32_t count) {
     Segments segments;
-    cutSegments(K, count, segments);
+    cutSegments(K, count, segments.alpha, segments.beta);
     return segments;
 }
 

@@ -40,6 +40,17 @@ cmake -S "$source/tests/install/consumer" -B "$work/cmake" -DCMAKE_PREFIX_PATH="
 cmake --build "$work/cmake" >>"$work/log"
 expect "CMake, shared library" "$work/cmake/decode_block"
 expect "CMake, classes in the archive" "$work/cmake/decode_with_classes"
+expect "CMake, ports from C99" "$work/cmake/use_ports"
+expect "CMake, the class from C++20" "$work/cmake/use_core"
+
+# As a part of another project it has the same targets, and installs nothing.
+cmake -S "$source/tests/install/subproject" -B "$work/parent" -DQUARZEL_SOURCE="$source" >>"$work/log"
+cmake --install "$work/parent" --prefix "$work/nothing" >>"$work/log"
+if [ -n "$(find "$work/nothing" -type f 2>/dev/null)" ]; then
+    echo "a subproject installed files" >&2
+    exit 1
+fi
+echo "ok: a subproject has the targets and installs nothing"
 
 export PKG_CONFIG_PATH=$libdir/pkgconfig
 cc -std=c99 "$source/examples/decode_block.c" -o "$work/by_pkg_config" \

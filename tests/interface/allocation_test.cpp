@@ -1,8 +1,7 @@
 // SPDX-License-Identifier: MIT
 #include <gtest/gtest.h>
 
-#include "decoder/decoder.hpp"
-#include "interface/state.hpp"
+#include "support/capture.hpp"
 #include "support/count_allocations.hpp"
 #include "support/model.hpp"
 
@@ -36,7 +35,7 @@ TEST(Allocation, NoneForABlockOfASizeThatWasSeen) {
 TEST(Allocation, LiteralDecodesTakeTheTwoVectorsOfTheCallOnceTheLargestSizeWasSeen) {
     for (const int algorithm : {0, 1, 2}) {
         const State state = makeState(genericsOf(8, 8, algorithm));
-        state->decoder->disableLanes();
+        vardel_ip_quarzel_set_implementation(state.get(), "literal");
         EXPECT_GT(allocationsOf(state.get(), 6144), 2U);
         for (const std::size_t K : sizes) {
             EXPECT_LE(allocationsOf(state.get(), K), 2U) << K;
@@ -77,6 +76,65 @@ TEST(Allocation, MayFailAnywhereInABatch) {
         failures += result != 0 ? 1 : 0;
         ASSERT_EQ(run(), 0) << "after " << allowed << " allocations";
         ASSERT_LT(allowed, 1000U);
+    }
+    EXPECT_GT(failures, 10);
+}
+
+TEST(Allocation, ErrorLinesAreWrittenWhereThereIsNoMemoryAtAll) {
+    const State state = makeState();
+    const Block block(6144 + 4);
+    std::vector<unsigned char> bits(6144);
+    vardel_ip_quarzel_outputs outputs{bits.data(), 6144, 0, 0};
+    int status = 0;
+    vardel_ip_quarzel_state* none = state.get();
+    const Output output = capture([&] {
+        failAllocationsAfter(0);
+        status = vardel_ip_quarzel_bitacc_simulate(state.get(), &outputs, block.inputs());
+        none = vardel_ip_quarzel_create_state(defaultGenerics());
+        allowAllocations();
+    });
+    EXPECT_EQ(status, 99);
+    EXPECT_EQ(none, nullptr);
+    EXPECT_EQ(output.err,
+              "ERROR:decoder:Unhandled exception has occurred\n"
+              "ERROR:decoder:Unhandled exception has occurred\n");
+}
+
+TEST(Allocation, ATraceAskedForBeforeMemoryRanOutIsWrittenAfterIt) {
+    std::vector<unsigned char> bits(6144);
+    vardel_ip_quarzel_outputs outputs{bits.data(), 6144, 0, 0};
+    const Block large(1024 + 4, 20);
+    const Block small(44, 5);
+    const auto traceOf = [&](std::size_t allowed, int& status) {
+        const State state = makeState();
+        vardel_ip_quarzel_bitacc_simulate(state.get(), &outputs, large.inputs());
+        vardel_ip_quarzel_bitacc_dump_config(state.get(), 3);
+        capture([&] {
+            failAllocationsAfter(allowed);
+            status = vardel_ip_quarzel_bitacc_simulate(state.get(), &outputs, small.inputs());
+            allowAllocations();
+        });
+        // A decode that failed may have written passes of its trace before: count on from a fresh request.
+        vardel_ip_quarzel_bitacc_dump_config(state.get(), 2);
+        return capture([&] { vardel_ip_quarzel_bitacc_simulate(state.get(), &outputs, small.inputs()); }).out;
+    };
+    int status = -1;
+    const std::string undisturbed = traceOf(SIZE_MAX / 2, status);
+    ASSERT_EQ(status, 0);
+    int failures = 0;
+    for (std::size_t allowed = 0; status != 0 || allowed == 0; ++allowed) {
+        std::string trace = traceOf(allowed, status);
+        // A block that failed is not counted.
+        const std::size_t at = trace.find("decode=1");
+        if (status != 0) {
+            ++failures;
+            ASSERT_NE(at, std::string::npos) << allowed;
+            while (trace.find("decode=1") != std::string::npos) {
+                trace.replace(trace.find("decode=1"), 8, "decode=2");
+            }
+        }
+        ASSERT_EQ(trace, undisturbed) << allowed;
+        ASSERT_LT(allowed, 2000U);
     }
     EXPECT_GT(failures, 10);
 }

@@ -5,6 +5,7 @@
 #include <random>
 
 #include "interface/state.hpp"
+#include "interleaver/interleaver.hpp"
 #include "interleaver/lte_params.hpp"
 #include "support/capture.hpp"
 #include "support/model.hpp"
@@ -273,6 +274,19 @@ TEST(Simulate, StatesDoNotAffectEachOtherAndBlocksAreForgotten) {
         ASSERT_EQ(simulate(shared.get(), block.inputs()).bits, simulate(fresh.get(), block.inputs()).bits)
             << "K " << params.K << " round " << round;
     }
+}
+
+TEST(Simulate, AHugeSizeIsRefusedWithoutATableForIt) {
+    const State state = makeState();
+    // The permutation alone would take 40 MB.
+    const Block block(10'000'004);
+    std::vector<unsigned char> bits(10'000'000);
+    vardel_ip_quarzel_outputs outputs{bits.data(), 10'000'000, -77, 5};
+    const Output output = capture(
+        [&] { EXPECT_EQ(vardel_ip_quarzel_bitacc_simulate(state.get(), &outputs, block.inputs()), 2); });
+    EXPECT_EQ(output.err, "ERROR:TDecoder3G:The interleaver has no block size of 10000000 bits\n");
+    EXPECT_EQ(state->interleaver->itsPermutation.capacity(), 0U);
+    EXPECT_EQ(outputs.dout_size, -77);
 }
 
 }  // namespace

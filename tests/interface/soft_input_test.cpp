@@ -18,6 +18,13 @@ short convert(int value, int* saturated = nullptr) {
     return toSoftValue(value, inputFormat, stateFormat, saturated != nullptr ? *saturated : ignored);
 }
 
+/// A block of ints as a call holds it.
+BlockCall callOf(const Block& block) {
+    const vardel_ip_quarzel_inputs inputs = block.inputs();
+    vardel_ip_quarzel_outputs outputs{};
+    return RecordSource(&outputs, &inputs).block(0);
+}
+
 TEST(SoftInput, ScalesBy16AndSaturatesToEightBits) {
     EXPECT_EQ(convert(127), 2032);
     EXPECT_EQ(convert(-128), -2048);
@@ -65,16 +72,16 @@ TEST(SoftInput, OtherFormatsAreRequantisedToTheStateFormat) {
 TEST(SoftInput, PositionsInterleaveTheThreeStreams) {
     const Block block({1, 2, 3}, {4, 5, 6}, {7, 8, 9}, 1, 0);
     std::vector<short> soft;
-    toSoftValues(block.inputs(), inputFormat, stateFormat, soft);
-    EXPECT_FALSE(findSaturation(block.inputs(), inputFormat));
+    toSoftValues(callOf(block), inputFormat, stateFormat, soft);
+    EXPECT_FALSE(findSaturation(callOf(block), inputFormat));
     EXPECT_EQ(soft, (std::vector<short>{16, 64, 112, 32, 80, 128, 48, 96, 144}));
 }
 
 TEST(SoftInput, TellsTheFirstSaturatedValueInPositionOrder) {
     const Block block({1, 2, -500}, {4, 5, 6}, {7, 300, 9}, 1, 0);
     std::vector<short> soft;
-    toSoftValues(block.inputs(), inputFormat, stateFormat, soft);
-    const auto first = findSaturation(block.inputs(), inputFormat);
+    toSoftValues(callOf(block), inputFormat, stateFormat, soft);
+    const auto first = findSaturation(callOf(block), inputFormat);
     ASSERT_TRUE(first);
     EXPECT_EQ(first->position, 1);
     EXPECT_EQ(first->stream, 2U);

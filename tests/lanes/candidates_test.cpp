@@ -39,9 +39,8 @@ TEST(LaneCandidates, KernelsComeByAscendingWidthFromEightLanesUp) {
 
 TEST(LaneCandidates, AModelStartsOutWithLanes) {
     const State state = makeState();
-    EXPECT_TRUE(state->decoder->takesLanes(40));
-    state->decoder->disableLanes();
-    EXPECT_FALSE(state->decoder->takesLanes(40));
+    EXPECT_STREQ(vardel_ip_quarzel_get_implementation(state.get()), lanes::bestCandidate().name);
+    EXPECT_TRUE(takesLanes(*state, 40));
 }
 
 }  // namespace

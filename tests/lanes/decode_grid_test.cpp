@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: MIT
-// Every candidate gives the literal road's decisions: every block size, unit count, algorithm type and
+// Every candidate gives the literal decoder's decisions: every block size, unit count, algorithm type and
 // kernel.
 #include <gtest/gtest.h>
 
@@ -8,7 +8,6 @@
 #include <utility>
 #include <vector>
 
-#include "decoder/lane_decode.hpp"
 #include "interleaver/lte_block_sizes.hpp"
 #include "lanes/lane_setup.hpp"
 #include "support/random.hpp"
@@ -38,7 +37,7 @@ std::vector<LaneModel> makeLaneModels(int units, int algorithm) {
     return models;
 }
 
-/// A few different blocks of one size, and what the literal road makes of them.
+/// A few different blocks of one size, and what the literal decoder makes of them.
 struct Expected {
     std::vector<Block> blocks;
     std::vector<std::vector<unsigned char>> bits;
@@ -66,17 +65,17 @@ void expectLanesEqual(const LaneModel& model, const Expected& expected, std::siz
     const std::size_t K = expected.bits.front().size();
     std::vector<std::size_t> order(groupSize);
     std::vector<std::vector<unsigned char>> bits(groupSize, std::vector<unsigned char>(K, 0xEE));
-    std::vector<LaneBlock> group;
+    std::vector<vardel_ip_quarzel_inputs> inputs;
+    std::vector<vardel_ip_quarzel_outputs> outputs;
     for (std::size_t i = 0; i < groupSize; ++i) {
         order[i] = random() % expected.blocks.size();
-        const Block& block = expected.blocks[order[i]];
-        group.push_back(
-            {{block.systematic.data(), block.parity1.data(), block.parity2.data()}, bits[i].data()});
+        inputs.push_back(expected.blocks[order[i]].inputs());
+        outputs.push_back({bits[i].data(), static_cast<int>(K), 0, 0});
     }
-    TDecoder3GPU& decoder = decoderOf(model.state);
-    ASSERT_TRUE(decoder.takesLanes(static_cast<unsigned>(K)));
-    decoder.decodeLanes(static_cast<unsigned>(K), static_cast<unsigned>(expected.blocks[0].iterations),
-                        group);
+    ASSERT_TRUE(takesLanes(*model.state, static_cast<std::uint32_t>(K)));
+    ASSERT_EQ(vardel_ip_quarzel_bitacc_simulate_batch(model.state.get(), outputs.data(), inputs.data(),
+                                                      static_cast<int>(groupSize), nullptr),
+              0);
     for (std::size_t i = 0; i < groupSize; ++i) {
         ASSERT_EQ(bits[i], expected.bits[order[i]])
             << model.name << ", K " << K << ", iterations " << expected.blocks[0].iterations << ", block "
@@ -92,7 +91,7 @@ std::size_t moreThanAVector(std::size_t K) {
 #if defined(NDEBUG)
 constexpr std::size_t stride = 1;
 #else
-constexpr std::size_t stride = 10;  // the literal road is slow without an optimiser
+constexpr std::size_t stride = 10;  // the literal decoder is slow without an optimiser
 #endif
 
 class DecodeGrid : public testing::TestWithParam<std::tuple<int, int>> {};

@@ -1,9 +1,10 @@
 // SPDX-License-Identifier: MIT
-// The arithmetic of lanes on whole domains, against the literal road's definitions.
+// The arithmetic of lanes on whole domains, against the literal decoder's definitions.
 #include <gtest/gtest.h>
 
 #include <algorithm>
 #include <memory>
+#include <numeric>
 #include <string>
 #include <utility>
 #include <vector>
@@ -74,7 +75,7 @@ TEST(LaneArithmetic, TheStaircaseIsTheCorrectionTableForEveryDifference) {
     });
 }
 
-/// The literal road: the extrinsic value of a pass, then what the next one makes of it.
+/// The literal decoder: the extrinsic value of a pass, then what the next one makes of it.
 std::int16_t literalHalf(int llr, int channel, bool scaled) {
     const int intrinsic = channel / 2;
     const int extrinsic = llr - 4 * intrinsic;
@@ -122,43 +123,71 @@ TEST(LaneArithmetic, TheModuloMaximumIsTheScalarOneForEveryPair) {
     });
 }
 
-TEST(LaneArithmetic, SoftInputsAreConvertedAsInTheLiteralRoadForEveryInteger) {
+/// Compare the conversion of some values, which fill whole groups, with the literal one.
+template <class Value>
+void expectConverted(const Conversions& conversions, Conversions::Convert<Value> convert,
+                     const std::vector<Value>& values) {
     const TNumberFormat input(8, 3);
     const TNumberFormat state(12, 3);
-    constexpr std::uint64_t chunk = 65536;
+    Words converted(values.size());
+    const auto saturated = std::make_unique<bool[]>(values.size() / conversions.width);
+    convert(values.data(), converted.data(), saturated.get(), values.size());
+    bool anyOfGroup = false;
+    for (std::size_t i = 0; i < values.size(); ++i) {
+        int how = 0;
+        if (converted[i] != toSoftValue(values[i], input, state, how)) {
+            FAIL() << values[i];
+        }
+        anyOfGroup = anyOfGroup || how != 0;
+        if ((i + 1) % conversions.width == 0 &&
+            saturated[i / conversions.width] != std::exchange(anyOfGroup, false)) {
+            FAIL() << "saturation of one of the " << conversions.width << " up to " << values[i];
+        }
+    }
+}
+
+/// Calls `check` with the conversions of every candidate that the machine supports.
+template <class Check>
+void forEachConversion(Check check) {
     forEachProbe([&](const LaneProbe& probe) {
-        std::vector<int> values(chunk);
-        Words converted(chunk);
-        const auto saturated = std::make_unique<bool[]>(chunk / 8);
-        for (std::uint64_t high = 0; high < 65536; high += exhaustive() ? 1 : 61) {
-            for (std::uint64_t low = 0; low < chunk; ++low) {
-                values[low] = static_cast<int>(static_cast<std::uint32_t>(high * chunk + low));
-            }
-            probe.toWords(values.data(), converted.data(), saturated.get(), chunk);
-            bool anyOfEight = false;
-            for (std::uint64_t low = 0; low < chunk; ++low) {
-                int how = 0;
-                if (converted[low] != toSoftValue(values[low], input, state, how)) {
-                    FAIL() << values[low];
-                }
-                anyOfEight = anyOfEight || how != 0;
-                if (low % 8 == 7 && saturated[low / 8] != std::exchange(anyOfEight, false)) {
-                    FAIL() << "saturation of one of the eight up to " << values[low];
-                }
-            }
+        for (const Conversions& conversions : probe.toWords) {
+            SCOPED_TRACE(conversions.width);
+            ASSERT_NO_FATAL_FAILURE(check(conversions));
         }
     });
 }
 
-TEST(LaneArithmetic, OneSaturatedValueAmongEightIsSeen) {
-    forEachProbe([&](const LaneProbe& probe) {
+TEST(LaneArithmetic, SoftInputsAreConvertedAsInTheLiteralRoadForEveryInteger) {
+    std::vector<std::int32_t> values(65536);
+    forEachConversion([&](const Conversions& conversions) {
+        for (std::uint64_t high = 0; high < 65536; high += exhaustive() ? 1 : 61) {
+            for (std::uint64_t low = 0; low < values.size(); ++low) {
+                values[low] = static_cast<std::int32_t>(static_cast<std::uint32_t>(high * 65536 + low));
+            }
+            ASSERT_NO_FATAL_FAILURE(expectConverted(conversions, conversions.fromInt32, values));
+        }
+    });
+}
+
+TEST(LaneArithmetic, ShorterSoftInputsAreConvertedAsInTheLiteralRoadForEveryInteger) {
+    const Words words = everyWord();
+    std::vector<std::int8_t> bytes(256);
+    std::iota(bytes.begin(), bytes.end(), std::int8_t{-128});
+    forEachConversion([&](const Conversions& conversions) {
+        ASSERT_NO_FATAL_FAILURE(expectConverted(conversions, conversions.fromInt16, words));
+        ASSERT_NO_FATAL_FAILURE(expectConverted(conversions, conversions.fromInt8, bytes));
+    });
+}
+
+TEST(LaneArithmetic, OneSaturatedValueAmongOthersIsSeen) {
+    forEachConversion([&](const Conversions& conversions) {
         for (const int value : {-129, -128, 127, 128, 1 << 23, 1 << 24}) {
-            for (std::size_t lane = 0; lane < 8; ++lane) {
-                std::vector<int> values(32);
-                values[8 + lane] = value;
-                Words converted(32);
+            for (std::size_t lane = 0; lane < conversions.width; ++lane) {
+                std::vector<std::int32_t> values(4 * conversions.width);
+                values[conversions.width + lane] = value;
+                Words converted(values.size());
                 bool saturated[4] = {};
-                probe.toWords(values.data(), converted.data(), saturated, values.size());
+                conversions.fromInt32(values.data(), converted.data(), saturated, values.size());
                 // 2^24 is shifted out whole.
                 const bool expected = value < -128 || (value > 127 && value != 1 << 24);
                 EXPECT_EQ(saturated[1], expected) << value << " in lane " << lane;

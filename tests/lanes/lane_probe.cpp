@@ -2,8 +2,8 @@
 // Compiled once for each instruction set, with QUARZEL_PROBE its name and QUARZEL_PROBE_LANES its lanes.
 #include "lanes/lane_probe.hpp"
 
-#include "engine/lanes/lane_rules.hpp"
-#include "engine/lanes/lane_transpose.hpp"
+#include "lanes/lane_rules.hpp"
+#include "lanes/lane_soft_input.hpp"
 
 namespace quarzel::test {
 
@@ -33,17 +33,29 @@ void larger(const std::int16_t* x, const std::int16_t* y, std::int16_t* result, 
     }
 }
 
-void words(const int* values, std::int16_t* result, bool* saturated, std::size_t count) {
-    for (std::size_t i = 0; i < count; i += lanes::octetLanes) {
+template <std::size_t W, class Value>
+void toWords(const Value* values, std::int16_t* result, bool* saturated, std::size_t count) {
+    for (std::size_t i = 0; i < count; i += W) {
         lanes::SoftInput input;
-        input.toWords(values + i, values + i + 4).store(result + i);
-        saturated[i / lanes::octetLanes] = input.saturated();
+        std::int16_t words[W];
+        input.template toWords<W>(values + i).store(words);
+        for (std::size_t value = 0; value < W; ++value) {
+            result[i + value] = words[lanes::SoftInput::laneOf<Value>(value, W)];
+        }
+        saturated[i / W] = input.saturated();
     }
 }
+
+template <std::size_t W>
+constexpr Conversions conversions = {W, toWords<W, std::int8_t>, toWords<W, std::int16_t>,
+                                     toWords<W, std::int32_t>};
 
 }  // namespace
 
 extern const LaneProbe QUARZEL_PROBE;
-const LaneProbe QUARZEL_PROBE = {staircase, {halfExtrinsic<0>, halfExtrinsic<1>}, larger, words};
+const LaneProbe QUARZEL_PROBE = {staircase,
+                                 {halfExtrinsic<0>, halfExtrinsic<1>},
+                                 larger,
+                                 {conversions<8>, conversions<lanes::inputWidth>}};
 
 }  // namespace quarzel::test

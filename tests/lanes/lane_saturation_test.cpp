@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: MIT
-// The lane road finds out about saturated values while it converts them.
+// Lanes find out about saturated values while it converts them.
 #include <gtest/gtest.h>
 
 #include <string>

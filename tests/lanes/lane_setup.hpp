@@ -9,9 +9,8 @@
 #include <string>
 #include <vector>
 
-#include "decoder/decoder_3gpu.hpp"
-#include "engine/lanes/lanes.hpp"
-#include "interface/state.hpp"
+#include "interface/lane_implementation.hpp"
+#include "lanes/lanes.hpp"
 #include "support/model.hpp"
 
 namespace quarzel::test {
@@ -35,21 +34,17 @@ inline std::vector<std::reference_wrapper<const lanes::Candidate>> supportedCand
     return supported;
 }
 
-inline TDecoder3GPU& decoderOf(const State& state) {
-    return dynamic_cast<TDecoder3GPU&>(*state->decoder);
-}
-
-/// A model that takes the lane road by an instruction set of the test's choice.
+/// A model that decodes in lanes by an instruction set of the test's choice.
 inline State makeLaneState(int units, int tagWidth, int algorithm, const lanes::Candidate& candidate) {
     State state = makeState(genericsOf(units, tagWidth, algorithm));
-    decoderOf(state).enableLanes(candidate);
+    state->lanes->choose(&candidate);
     return state;
 }
 
 /// A model that decodes everything literally.
 inline State makeLiteralState(int units, int tagWidth, int algorithm) {
     State state = makeState(genericsOf(units, tagWidth, algorithm));
-    state->decoder->disableLanes();
+    vardel_ip_quarzel_set_implementation(state.get(), "literal");
     return state;
 }
 

@@ -2,7 +2,7 @@
 # SPDX-License-Identifier: MIT
 # Code for a newer processor stays where it was asked for: object_hygiene.sh OBJECT...
 #
-# Objects of the lane road share nothing with others through the linker: they define no weak symbol, and none outside
+# Objects of the lanes share nothing with others through the linker: they define no weak symbol, and none outside
 # quarzel::lanes. Only those of an instruction set that has them use registers of more than 128 bits.
 set -euo pipefail
 lanes=0

@@ -9,7 +9,7 @@
 #include <string>
 #include <vector>
 
-#include "interleaver/lte_params.hpp"
+#include "quarzel/code.hpp"
 #include "support/model.hpp"
 #include "support/random.hpp"
 
@@ -79,7 +79,7 @@ TEST(Encoder, IsUndoneByEveryCoreForAllBlockSizes) {
     for (const int units : {2, 4, 8}) {
         for (const int algorithm : {0, 1, 2}) {
             const State state = makeState(genericsOf(units, 8, algorithm));
-            for (const LteParams& params : lteParams) {
+            for (const quarzel::BlockSize& params : quarzel::blockSizes()) {
                 std::vector<std::uint8_t> bits(params.K);
                 std::generate(bits.begin(), bits.end(),
                               [&] { return static_cast<std::uint8_t>(random() & 1U); });

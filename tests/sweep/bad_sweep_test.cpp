@@ -55,10 +55,10 @@ const std::vector<BadSweep> badSweeps = {
      "--shard: '3/2' is not I/N; give the number of the part, from 1, and how many there are, as 1/8"},
     {"ShardWithoutFile",
      {"--ebn0", "1", "--shard", "1/2"},
-     "--shard: a part is of use only in a file; name one with -o"},
+     "--shard: a part is only useful in a file; name one with -o"},
     {"ShardWithTime",
      {"--ebn0", "1", "--shard", "1/2", "-o", "x", "--max-time", "3"},
-     "--max-time: parts that time has stopped do not fit together; leave it out, or --shard"},
+     "--max-time: parts that end by time cannot be joined; leave out --max-time or --shard"},
     {"ResumeWithoutFile",
      {"--ebn0", "1", "--resume"},
      "--resume: there is no file to go on from; name the output with -o, or the checkpoint with "
@@ -105,7 +105,7 @@ TEST(BadSweep, LeavesACheckpointAloneUnlessToldToGoOn) {
     const ToolRun resumed =
         runTool({"sweep", "--ebn0", "9", "-o", directory.path("result.json"), "--resume"});
     EXPECT_EQ(resumed.err,
-              "quarzel: error: " + checkpoint + ": is no quarzel sweep part; give the name of one\n");
+              "quarzel: error: " + checkpoint + ": is not a quarzel sweep part; give the name of one\n");
     EXPECT_EQ(resumed.exitCode, 3);
     EXPECT_EQ(readFile(checkpoint), "precious");
 }

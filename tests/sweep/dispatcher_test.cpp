@@ -22,9 +22,9 @@ using BitErrors = std::vector<std::uint32_t>;
 
 sweep::ErrorList outcomeOf(const sweep::Task& task, const sweep::Shard& shard, const BitErrors& bitErrors) {
     sweep::ErrorList list;
-    for (const std::uint64_t group : sweep::groupNumbers(task, shard)) {
-        for (std::uint64_t block = 8 * group;
-             block < std::min<std::uint64_t>(8 * group + 8, bitErrors.size()); ++block) {
+    for (const std::uint64_t octet : sweep::octetNumbers(task, shard)) {
+        for (std::uint64_t block = 8 * octet;
+             block < std::min<std::uint64_t>(8 * octet + 8, bitErrors.size()); ++block) {
             if (bitErrors[block] != 0) {
                 list.append(block, &bitErrors[block], 1);
             }
@@ -96,7 +96,7 @@ TEST(Dispatcher, EndsAPointWhereAPlainLoopDoesWhateverTheOrderAndTheShards) {
         expectEqual(whole.states()[0], expected);
         EXPECT_EQ(whole.states()[0].bitErrorSquares, expected.bitErrorSquares);
 
-        const std::uint64_t shards = 2 + random() % 90;  // sometimes more than there are groups
+        const std::uint64_t shards = 2 + random() % 90;  // sometimes more than there are octets
         std::vector<sweep::NamedPart> parts;
         for (std::uint64_t index = 0; index < shards; ++index) {
             sweep::Dispatcher shard({configuration, {index, shards}});
@@ -150,7 +150,7 @@ TEST(Dispatcher, EndsAPointAtItsTimeLimitAndRepeatsItWithoutOne) {
     dispatcher.complete(*task, {});
     const sweep::PointState stopped = dispatcher.states()[0];
     EXPECT_EQ(stopped.stoppedBy, sweep::StopReason::time);
-    EXPECT_EQ(stopped.blocks, 8 * task->groups);
+    EXPECT_EQ(stopped.blocks, 8 * task->octets);
     EXPECT_EQ(dispatcher.next()->point, 1U);
 
     sweep::Dispatcher again({configuration, {}, {}, {stopped.blocks, 0}});

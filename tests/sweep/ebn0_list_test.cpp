@@ -43,16 +43,16 @@ TEST(EbN0List, IsReadExactly) {
 
 TEST(EbN0List, RefusesWhatIsNoneInOneLine) {
     const std::string howTo = "; give numbers as 0.5 or ranges as 0:0.1:1.5, separated by commas";
-    EXPECT_EQ(complaintOf(""), "--ebn0: '' is no number of dB" + howTo);
-    EXPECT_EQ(complaintOf("1,,2"), "--ebn0: '' is no number of dB" + howTo);
-    EXPECT_EQ(complaintOf("nan"), "--ebn0: 'nan' is no number of dB" + howTo);
-    EXPECT_EQ(complaintOf("1e1"), "--ebn0: '1e1' is no number of dB" + howTo);
-    EXPECT_EQ(complaintOf("-.+1"), "--ebn0: '-.+1' is no number of dB" + howTo);
+    EXPECT_EQ(complaintOf(""), "--ebn0: '' is not a number of dB" + howTo);
+    EXPECT_EQ(complaintOf("1,,2"), "--ebn0: '' is not a number of dB" + howTo);
+    EXPECT_EQ(complaintOf("nan"), "--ebn0: 'nan' is not a number of dB" + howTo);
+    EXPECT_EQ(complaintOf("1e1"), "--ebn0: '1e1' is not a number of dB" + howTo);
+    EXPECT_EQ(complaintOf("-.+1"), "--ebn0: '-.+1' is not a number of dB" + howTo);
     EXPECT_EQ(complaintOf("0.1234567"), "--ebn0: '0.1234567' has more than 6 decimals" + howTo);
     EXPECT_EQ(complaintOf("99999999999999999999"),
-              "--ebn0: '99999999999999999999' is no number of dB" + howTo);
+              "--ebn0: '99999999999999999999' is not a number of dB" + howTo);
     EXPECT_EQ(complaintOf("4000"), "--ebn0: '4000' lies outside -20 to 40 dB" + howTo);
-    EXPECT_EQ(complaintOf("0:1"), "--ebn0: the range '0:1' has not three parts; write FIRST:STEP:LAST");
+    EXPECT_EQ(complaintOf("0:1"), "--ebn0: the range '0:1' does not have three parts; write FIRST:STEP:LAST");
     EXPECT_EQ(complaintOf("0:0:1"),
               "--ebn0: the range '0:0:1' never ends: its step is 0; give a step above 0");
     EXPECT_EQ(

@@ -131,6 +131,14 @@ TEST(SweepCommand, ShowsATableThatLivesOnATerminal) {
     EXPECT_THAT(run.out, testing::StartsWith("K 40, 2 units, algorithm 1, 6 iterations\n"));
 }
 
+// The stored result comes from version 1.0.0.
+TEST(VerifyResult, FindsTheResultOfAnotherVersionTheSameByteForByte) {
+    const std::string file = QUARZEL_SWEEP_DATA "/small_sweep.json";
+    const ToolRun run = runTool({"verify-result", file});
+    EXPECT_EQ(run.out, file + ": the same byte for byte, 12 points with 2731 blocks\n");
+    EXPECT_EQ(run.exitCode, 0);
+}
+
 TEST(VerifyResult, FindsAResultThatComesOutOtherwise) {
     const TemporaryDirectory directory;
     sweep::Result result = resultOf(smallSweep());

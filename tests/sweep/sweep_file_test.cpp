@@ -6,6 +6,7 @@
 #include "support/random.hpp"
 #include "sweep/error.hpp"
 #include "sweeps.hpp"
+#include "tool/temporary_directory.hpp"
 
 namespace quarzel::test {
 
@@ -47,6 +48,32 @@ TEST(SweepFile, KeepsAPart) {
     EXPECT_EQ(sweep::partText(sweep::readPart(text)), text);
 }
 
+// The version of quarzel stands in a file for people; the version of the format decides.
+TEST(SweepFile, IsReadWhicheverVersionOfQuarzelWroteIt) {
+    sweep::Result result = resultOf(smallSweep());
+    for (const char* const version : {"1.0.0", "9.8.7-beta"}) {
+        result.quarzel = version;
+        const std::string text = sweep::resultText(result);
+        EXPECT_NE(text.find("\"quarzel\": \"" + result.quarzel + '"'), std::string::npos);
+        EXPECT_EQ(sweep::readResult(text).quarzel, version);
+        EXPECT_EQ(sweep::resultText(sweep::readResult(text)), text);
+    }
+}
+
+// The stored parts come from version 1.0.0. Their result names the version that joined them.
+TEST(SweepFile, OfAPartIsReadWhicheverVersionOfQuarzelWroteIt) {
+    std::vector<sweep::NamedPart> parts;
+    for (const char* const file : {"/part_1_of_2.json", "/part_2_of_2.json"}) {
+        const std::string text = readFile(std::string(QUARZEL_SWEEP_DATA) + file);
+        EXPECT_NE(text.find(R"("quarzel":"1.0.0")"), std::string::npos);
+        parts.push_back({file, sweep::readPart(text)});
+    }
+    ASSERT_STRNE(VARDEL_IP_QUARZEL_VERSION, "1.0.0");
+    const sweep::Result merged = sweep::merge(parts);
+    EXPECT_EQ(sweep::resultText(merged), sweep::resultText(resultOf(merged.configuration)));
+    EXPECT_EQ(merged.quarzel, VARDEL_IP_QUARZEL_VERSION);
+}
+
 TEST(SweepFile, IsRefusedWhereverItIsCut) {
     const std::string& text = smallResultText();
     std::mt19937 random = seededRandom();
@@ -55,7 +82,7 @@ TEST(SweepFile, IsRefusedWhereverItIsCut) {
         EXPECT_THROW(sweep::readResult(cut), sweep::Error) << cut.size();
     }
     EXPECT_EQ(complaintOf([&] { sweep::readResult(text.substr(0, text.size() / 2)); }),
-              "is truncated or altered: it is no whole JSON object; use another copy of it");
+              "is truncated or altered: it is not a whole JSON object; use another copy of it");
 }
 
 TEST(SweepFile, IsRefusedWhateverDigitIsAltered) {
@@ -79,15 +106,15 @@ TEST(SweepFile, IsRefusedWithItsReason) {
         return complaintOf([&text] { sweep::readResult(text); });
     };
     EXPECT_EQ(altered("\"seed\": 7", "\"seed\": 8"),
-              "has been altered: its checksum does not fit; use another copy of it");
+              "has been altered: its checksum does not match; use another copy of it");
     EXPECT_EQ(altered("\"version\": 1", "\"version\": 2"),
               "has version 2 of its format, not 1; use the quarzel that wrote it");
     EXPECT_EQ(altered("quarzel sweep result", "quarzel sweep part"),
-              "is no quarzel sweep result; give the name of one");
+              "is not a quarzel sweep result; give the name of one");
     EXPECT_EQ(complaintOf([] { sweep::readResult("[1]"); }),
-              "is no quarzel sweep result; give the name of one");
+              "is not a quarzel sweep result; give the name of one");
     EXPECT_EQ(complaintOf([] { sweep::readPart(smallResultText()); }),
-              "is no quarzel sweep part; give the name of one");
+              "is not a quarzel sweep part; give the name of one");
 }
 
 TEST(SweepFile, OfAnotherRunIsRefusedWithTheFirstDifference) {

@@ -9,8 +9,8 @@
 
 namespace quarzel::test {
 
-/// A sweep that is over in no time and yet has all there is: two sizes, two cores, points that end by errors,
-/// inside a group of 8 blocks, and by blocks, and a last group that is short.
+/// A sweep that takes no time and yet has everything: two sizes, two cores, points that end by errors inside
+/// an octet of blocks and points that end by blocks, and a last octet that is short.
 inline sweep::Configuration smallSweep() {
     sweep::Configuration configuration;
     configuration.blockSizes = {40, 104};

@@ -5,6 +5,7 @@
 #include <set>
 
 #include "npy_data.hpp"
+#include "quarzel/code.hpp"
 #include "run_tool.hpp"
 #include "temporary_directory.hpp"
 #include "vardel_ip_quarzel.h"
@@ -18,6 +19,14 @@ namespace {
 ToolRun decodeShipped(const std::string& name, const std::string& reference) {
     return runTool({"decode", shipped(name + ".soft.npy"), "--units", "8", "--algorithm", "1", "--iterations",
                     "6", "--reference", shipped(name + '.' + reference + ".npy")});
+}
+
+/// The JSON report of a capture of 400 blocks of 40 bits, decoded by default.
+std::string jsonFor(const std::string& file, const std::string& errors = "") {
+    return "{\"capture\":\"" + file +
+           "\",\"block_size\":40,\"units\":2,\"algorithm\":1,\"iterations\":6,\"implementation\":\"" +
+           implementations().front() + "\",\"blocks\":400,\"bits\":16000,\"seconds\":T,\"mbit_per_s\":S" +
+           errors + "}\n";
 }
 
 std::string textFor(const std::string& file, const std::string& rest) {
@@ -108,20 +117,17 @@ TEST(DecodeCommand, CountsOneIterationInTheSingular) {
 TEST(DecodeCommand, PrintsOneJsonObjectWithStableKeys) {
     const ToolRun run =
         runTool({"decode", shipped("k40.soft.npy"), "--json", "--reference", shipped("k40.sent.npy")});
-    EXPECT_EQ(maskTimes(run.out), "{\"capture\":\"" + shipped("k40.soft.npy") +
-                                      "\",\"block_size\":40,\"units\":2,\"algorithm\":1,\"iterations\":6,"
-                                      "\"blocks\":400,\"bits\":16000,\"seconds\":T,\"mbit_per_s\":S,"
-                                      "\"bit_errors\":39,\"block_errors\":6,\"bit_error_rate\":0.0024375,"
-                                      "\"block_error_rate\":0.015}\n");
+    EXPECT_EQ(maskTimes(run.out),
+              jsonFor(shipped("k40.soft.npy"),
+                      ",\"bit_errors\":39,\"block_errors\":6,\"bit_error_rate\":0.0024375,"
+                      "\"block_error_rate\":0.015"));
     EXPECT_EQ(run.err, "");
     EXPECT_EQ(run.exitCode, 0);
 }
 
 TEST(DecodeCommand, LeavesTheErrorsOutOfJsonWithoutAReference) {
     const ToolRun run = runTool({"decode", shipped("k40.soft.npy"), "--json"});
-    EXPECT_EQ(maskTimes(run.out), "{\"capture\":\"" + shipped("k40.soft.npy") +
-                                      "\",\"block_size\":40,\"units\":2,\"algorithm\":1,\"iterations\":6,"
-                                      "\"blocks\":400,\"bits\":16000,\"seconds\":T,\"mbit_per_s\":S}\n");
+    EXPECT_EQ(maskTimes(run.out), jsonFor(shipped("k40.soft.npy")));
     EXPECT_EQ(run.exitCode, 0);
 }
 
@@ -245,6 +251,29 @@ TEST(DecodeCommand, GivesTheSameWhateverTheNumberOfThreads) {
     EXPECT_EQ(outputs.size(), 1U);
 }
 
+TEST(DecodeCommand, DecidesAlikeWithEveryImplementation) {
+    const TemporaryDirectory directory;
+    const std::string out = directory.path("out.npy");
+    ASSERT_EQ(implementations().back(), "literal");
+    for (const std::string& name : implementations()) {
+        const ToolRun run =
+            runTool({"decode", shipped("k40.soft.npy"), "--implementation", name, "-o", out, "--json"});
+        EXPECT_EQ(nlohmann::json::parse(run.out).at("implementation"), name) << run.err;
+        EXPECT_EQ(readFile(out), readFile(shipped("k40.decided.npy"))) << name;
+    }
+}
+
+TEST(DecodeCommand, NamesTheImplementationsThatThereAre) {
+    std::string names;
+    for (const std::string& name : implementations()) {
+        names += (names.empty() ? "" : ",") + name;
+    }
+    const ToolRun run = runTool({"decode", shipped("k40.soft.npy"), "--implementation", "fast"});
+    EXPECT_EQ(run.err,
+              "quarzel: error: --implementation: fast not in {" + names + "}; see 'quarzel decode --help'\n");
+    EXPECT_EQ(run.exitCode, 2);
+}
+
 TEST(DecodeCommand, KeepsResultsCleanWhenTheLibraryWarns) {
     const TemporaryDirectory directory;
     xt::xarray<std::int16_t> soft = shippedSoft("k40.soft.npy");
@@ -253,9 +282,7 @@ TEST(DecodeCommand, KeepsResultsCleanWhenTheLibraryWarns) {
     const std::string file = directory.path("loud.npy");
     xt::dump_npy(file, soft);
     const ToolRun run = runTool({"decode", file, "--json"});
-    EXPECT_EQ(maskTimes(run.out), "{\"capture\":\"" + file +
-                                      "\",\"block_size\":40,\"units\":2,\"algorithm\":1,\"iterations\":6,"
-                                      "\"blocks\":400,\"bits\":16000,\"seconds\":T,\"mbit_per_s\":S}\n");
+    EXPECT_EQ(maskTimes(run.out), jsonFor(file));
     EXPECT_EQ(run.err,
               "WARNING:decoder:RSC1 parity value in position 7 saturated positively, further saturation will "
               "not be "

@@ -25,6 +25,12 @@ void expectFailure(const ToolRun& run, const std::string& message, const Tempora
     EXPECT_EQ(directory.names(), std::vector<std::string>{"capture.npy"}) << "no output may be left";
 }
 
+/// What the user is told of a block that the stand-in model refused.
+std::string refused(const TemporaryDirectory& directory, const std::string& block, int status) {
+    return directory.path("capture.npy") + ": block " + block + " could not be decoded (status " +
+           std::to_string(status) + "); the model says: Number of iterations must be in the range 1 to 15";
+}
+
 }  // namespace
 
 TEST(Failure, DoesNotComeFromTheStandInUnasked) {
@@ -34,18 +40,12 @@ TEST(Failure, DoesNotComeFromTheStandInUnasked) {
 
 TEST(Failure, NamesTheBlockThatTheDecoderRefused) {
     const TemporaryDirectory directory;
-    expectFailure(runWithSecondBlock(2, directory),
-                  directory.path("capture.npy") +
-                      ": block 2 of 3 could not be decoded (status 2); the line above says why",
-                  directory);
+    expectFailure(runWithSecondBlock(2, directory), refused(directory, "2 of 3", 2), directory);
 }
 
 TEST(Failure, NamesTheBlockAtWhichTheDecoderBroke) {
     const TemporaryDirectory directory;
-    expectFailure(runWithSecondBlock(99, directory),
-                  directory.path("capture.npy") +
-                      ": block 2 of 3 could not be decoded (status 99); the line above says why",
-                  directory);
+    expectFailure(runWithSecondBlock(99, directory), refused(directory, "2 of 3", 99), directory);
 }
 
 // The second block fails at once, while another thread is still busy with the first, which fails after it.
@@ -59,9 +59,7 @@ TEST(Failure, NamesTheFirstBlockThatFailedWhicheverThreadWasQuicker) {
     for (const char* threads : {"1", "2", "8"}) {
         expectFailure(runTool({"decode", directory.path("capture.npy"), "--threads", threads},
                               {.program = QUARZEL_TOOL_ON_STAND_IN}),
-                      directory.path("capture.npy") +
-                          ": block 2 of 64 could not be decoded (status 3); the line above says why",
-                      directory);
+                      refused(directory, "2 of 64", 3), directory);
     }
 }
 

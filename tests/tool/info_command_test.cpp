@@ -5,8 +5,8 @@
 #include <nlohmann/json.hpp>
 #include <numeric>
 
-#include "interleaver/lte_params.hpp"
 #include "long_runs.hpp"
+#include "quarzel/code.hpp"
 #include "run_tool.hpp"
 
 namespace quarzel::test {
@@ -87,18 +87,19 @@ TEST(InfoCommand, TellsTheSameInJson) {
 }
 
 TEST(InfoCommand, CoversEveryBlockWithSegmentsAndEverySegmentWithWindows) {
-    for (std::size_t i = 0; i < lteParams.size(); i += everyNthRun) {
-        const LteParams& row = lteParams[i];
-        const auto told = nlohmann::json::parse(runTool({"info", std::to_string(row.K), "--json"}).out);
+    const std::vector<BlockSize> sizes = blockSizes();
+    for (std::size_t i = 0; i < sizes.size(); i += everyNthRun) {
+        const std::uint32_t K = sizes[i].K;
+        const auto told = nlohmann::json::parse(runTool({"info", std::to_string(K), "--json"}).out);
         ASSERT_EQ(told.at("cores").size(), 3U);
         for (const auto& core : told.at("cores")) {
             const std::uint32_t segments = core.at("segments");
             const std::uint32_t steps = core.at("steps_per_segment");
             const std::vector<std::uint32_t> windows = core.at("window_lengths");
-            EXPECT_EQ(segments * steps, row.K);
+            EXPECT_EQ(segments * steps, K);
             EXPECT_LE(segments, core.at("threads").get<std::uint32_t>());
-            EXPECT_EQ(std::accumulate(windows.begin(), windows.end(), 0U), steps) << row.K;
-            EXPECT_LE(*std::max_element(windows.begin(), windows.end()), 64U) << row.K;
+            EXPECT_EQ(std::accumulate(windows.begin(), windows.end(), 0U), steps) << K;
+            EXPECT_LE(*std::max_element(windows.begin(), windows.end()), 64U) << K;
         }
     }
 }

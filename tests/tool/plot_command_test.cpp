@@ -126,7 +126,7 @@ TEST_F(PlotCommand, RefusesAnAlteredResult) {
     text[text.find("\"bit_errors\": ") + 14] = '9';
     itsDirectory.write("result.json", text);
     expectRefused(plot({"-o", itsSvg}),
-                  itsResult + ": has been altered: its checksum does not fit; use another copy of it", 3);
+                  itsResult + ": has been altered: its checksum does not match; use another copy of it", 3);
 }
 
 TEST_F(PlotCommand, RefusesAnOutputThatCannotBe) {

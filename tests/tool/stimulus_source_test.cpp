@@ -6,7 +6,7 @@
 #include <algorithm>
 #include <set>
 
-#include "decode/core_layout.hpp"
+#include "quarzel/code.hpp"
 
 namespace quarzel::test {
 
@@ -54,7 +54,7 @@ TEST(StimulusSource, GivesWhatTheNamesSay) {
 }
 
 TEST(StimulusSource, KeepsNoiseInItsSegment) {
-    const std::size_t steps = tool::coreLayout(K, units).steps;
+    const std::size_t steps = layout(K, units).segment_steps;
     ASSERT_LT(2 * steps, K);
     const std::set<std::size_t> first = noisyPositions(soft(Stimulus::firstSegment));
     EXPECT_GT(first.size(), steps / 2);

@@ -6,7 +6,7 @@
 
 #include <nlohmann/json.hpp>
 
-#include "interleaver/lte_params.hpp"
+#include "quarzel/code.hpp"
 
 namespace quarzel::test {
 
@@ -65,9 +65,9 @@ TEST(VectorCoverage, CountsCorrectionsBySegment) {
 
 TEST(VectorCoverage, WantsEveryBlockSize) {
     tool::VectorCoverage coverage(8);
-    for (const LteParams& row : lteParams) {
+    for (const BlockSize& size : blockSizes()) {
         EXPECT_THAT(coverage.missing(), testing::Contains("a block size"));
-        coverage.add(row.K, 1, "x", softWith(row.K), std::vector<unsigned char>(row.K, 1));
+        coverage.add(size.K, 1, "x", softWith(size.K), std::vector<unsigned char>(size.K, 1));
     }
     EXPECT_THAT(coverage.missing(), testing::Not(testing::Contains("a block size")));
     EXPECT_THAT(coverage.missing(), testing::Not(testing::Contains("a window shape")));

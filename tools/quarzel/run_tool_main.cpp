@@ -20,21 +20,18 @@ int fail(ExitCode code, const char* message) {
 }  // namespace
 
 int runToolMain(int argc, const char* const* argv, const MakeWorkers& makeWorkers) {
-    // The library writes its warnings to std::cout. Standard output is for results alone, and so std::cout
-    // leads to standard error from here on.
-    std::ostream results(std::cout.rdbuf(std::cerr.rdbuf()));
     // A write beyond the limit of file sizes then fails with an error that the user is told.
     std::signal(SIGXFSZ, SIG_IGN);
     ExitCode exitCode = ExitCode::done;
     try {
-        exitCode = runCommandLine(argc, argv, results, makeWorkers);
+        exitCode = runCommandLine(argc, argv, std::cout, makeWorkers);
     } catch (const ToolError& error) {
         return fail(error.code(), error.what());
     } catch (const std::bad_alloc&) {
         return fail(ExitCode::decodingFailed,
                     "there is not enough memory; cut the capture into smaller files");
     }
-    if (!results.flush()) {
+    if (!std::cout.flush()) {
         return fail(ExitCode::file,
                     "standard output: cannot be written; free some space or send it elsewhere");
     }

@@ -24,6 +24,13 @@ ToolError fileError(std::string_view file, std::string_view problem, std::string
     return {ExitCode::file, file, problem, remedy};
 }
 
+ToolError decodingError(std::string_view file, std::string_view block, const Error& error) {
+    const std::string_view said = error.what();
+    return {ExitCode::decodingFailed, file,
+            fmt::format("{} could not be decoded (status {})", block, error.status()),
+            fmt::format("the model says: {}", said.substr(0, said.find('\n')))};
+}
+
 std::string errorLine(std::string_view message) {
     std::string line = fmt::format("quarzel: error: {}", message);
     const auto isControl = [](char c) { return static_cast<unsigned char>(c) < ' ' || c == '\x7f'; };

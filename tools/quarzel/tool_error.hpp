@@ -5,6 +5,8 @@
 #include <string>
 #include <string_view>
 
+#include "quarzel/core.hpp"
+
 namespace quarzel::tool {
 
 /// How the tool ends; a part of its interface.
@@ -39,6 +41,10 @@ class ToolError : public std::runtime_error {
 
 /// A file that cannot be read, understood or written.
 ToolError fileError(std::string_view file, std::string_view problem, std::string_view remedy);
+
+/// A block that the model has refused.
+/// @param block  which one
+ToolError decodingError(std::string_view file, std::string_view block, const Error& error);
 
 /// The line that the user sees. Control characters, which a file name may hold, are shown as '?', so that it
 /// is one line whatever happens.

@@ -36,11 +36,11 @@ unsigned threadsOfRank() {
 }
 
 /// The other ranks. Signals are for rank 0, which ends the sweep and keeps what is done.
-void serve(unsigned usual, unsigned most) {
+void serve(unsigned usual, unsigned max) {
     std::signal(SIGINT, SIG_IGN);
     std::signal(SIGTERM, SIG_IGN);
     try {
-        quarzel::mpi::serve(usual, most);
+        quarzel::mpi::serve(usual, max);
     } catch (const std::exception& error) {
         std::cerr << "quarzel-mpi: error: rank " << rankHere() << ": " << error.what() << std::endl;
         MPI_Abort(MPI_COMM_WORLD, 1);

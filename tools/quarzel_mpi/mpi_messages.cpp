@@ -16,7 +16,7 @@ constexpr int answerTag = 2;
 using Words = std::vector<std::uint64_t>;
 
 void appendTask(Words& words, const sweep::Task& task) {
-    words.insert(words.end(), {task.point, task.firstGroup, task.groups});
+    words.insert(words.end(), {task.point, task.firstOctet, task.octets});
 }
 
 /// Task, number of blocks in error, their numbers, their bit errors.
@@ -70,7 +70,7 @@ void broadcast(std::string& text) {
 
 }  // namespace
 
-// What is to be done travels as a part of which nothing is done.
+// The sweep travels as a part that has not begun.
 void announce(const std::optional<Announcement>& announcement) {
     std::string text =
         announcement ? sweep::partText(sweep::freshPart(announcement->configuration, announcement->shard))

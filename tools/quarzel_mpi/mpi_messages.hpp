@@ -8,29 +8,29 @@
 
 #include "sweep/dispatcher.hpp"
 
-/// What the ranks say to one another. Rank 0 has the dispatcher; the others ask it for tasks.
+/// The messages between ranks. Rank 0 has the dispatcher; the others ask it for tasks.
 namespace quarzel::mpi {
 
 /// The work that rank 0 announces to all.
 struct Announcement {
     sweep::Configuration configuration;
     sweep::Shard shard;
-    unsigned threads;  ///< of each rank; 0: as is usual
+    unsigned threads;  ///< of each rank; 0: the usual number
 };
 
 /// On rank 0: begin a sweep with all ranks; or, without one, let them end.
 void announce(const std::optional<Announcement>& announcement);
 
-/// On the others: wait for it.
+/// On the others: wait for the announcement.
 std::optional<Announcement> awaitAnnouncement();
 
-/// A task and what came of it.
+/// A task and its blocks in error.
 struct Outcome {
     sweep::Task task;
     sweep::ErrorList errors;
 };
 
-/// On the other ranks: hand in an outcome, if there is one, and receive a task, unless there is none left.
+/// On the other ranks: hand in an outcome, if there is one, and receive a task, unless none is left.
 std::optional<sweep::Task> exchange(const std::optional<Outcome>& outcome);
 
 /// On rank 0: what a rank has handed in.

@@ -13,6 +13,7 @@
 #include <thread>
 #include <vector>
 
+#include "link/parallel.hpp"
 #include "mpi_messages.hpp"
 #include "sweep/block_simulator.hpp"
 
@@ -20,7 +21,7 @@ namespace quarzel::mpi {
 
 namespace {
 
-/// Tasks of other ranks are so much larger, since asking for one takes time.
+/// How much larger the tasks of other ranks are, since asking for one takes time.
 constexpr unsigned taskSize = 8;
 constexpr std::chrono::microseconds nap{100};
 constexpr std::chrono::milliseconds tickPeriod{50};
@@ -48,7 +49,7 @@ bool answerRequest(sweep::Dispatcher& dispatcher, unsigned& askers) {
     return true;
 }
 
-/// Threads of one rank that ask rank 0, one at a time.
+/// What the threads of a rank do: they ask rank 0 for tasks, one at a time.
 class Asker {
   public:
     explicit Asker(const Announcement& announcement)
@@ -64,7 +65,7 @@ class Asker {
             const std::size_t pointsPerCurve = configuration.ebN0.size();
             outcome = Outcome{*task, simulator.simulate(itsCurves[task->point / pointsPerCurve],
                                                         configuration.ebN0[task->point % pointsPerCurve],
-                                                        sweep::groupNumbers(*task, itsAnnouncement.shard))};
+                                                        sweep::octetNumbers(*task, itsAnnouncement.shard))};
         }
     }
 
@@ -118,16 +119,12 @@ void MpiWorkers::run(sweep::Dispatcher& dispatcher, sweep::Observer& observer) {
     dispatcher.rethrow();
 }
 
-void serve(unsigned usual, unsigned most) {
+void serve(unsigned usual, unsigned max) {
     while (const std::optional<Announcement> announcement = awaitAnnouncement()) {
-        const unsigned threads = std::min(announcement->threads == 0 ? usual : announcement->threads, most);
+        const unsigned threads = std::min(announcement->threads == 0 ? usual : announcement->threads, max);
         sumOver(threads);
         Asker asker(*announcement);
-        std::vector<std::jthread> helpers;
-        while (helpers.size() + 1 < threads) {
-            helpers.emplace_back([&asker] { asker.run(); });
-        }
-        asker.run();
+        link::forEachOnThreads(threads, threads, [&asker] { return [&asker](std::size_t) { asker.run(); }; });
     }
 }
 

@@ -11,7 +11,7 @@ function [bits, details] = quarzel_decode (sys, par1, par2, iterations, options)
   %   sys, par1 and par2 are the systematic values and the parities of the two constituent codes, in units of 1/8;
   %   POSITIVE MEANS BIT 1. Each is
   %
-  %     a vector of K + 4 values   one block; bits is a vector of K, lying as sys does
+  %     a vector of K + 4 values   one block; bits is a vector of K, a row or a column as sys
   %     a matrix                   a block in each column; bits has K rows
   %     a cell array of vectors    blocks of any sizes; bits is a cell array of the same size
   %
@@ -159,12 +159,27 @@ end
 %!   assert (quarzel_decode (other{:}, 4), expected);
 %! end
 
+%!test  % what saturates, too
+%! warning ('off', 'quarzel:warning', 'local');
+%! wide = cellfun (@(x) 1e5 * double (x), soft, 'UniformOutput', false);
+%! whole = cellfun (@int32, wide, 'UniformOutput', false);
+%! assert (quarzel_decode (wide{:}), quarzel_decode (whole{:}));
+
 %!test  % cells of several sizes
 %! long = uint8 (rand (1, 512) > 0.5);
 %! [s, p, q] = quarzel_encode ({bits(:,1), long});
 %! scale = @(cells) cellfun (@(x) 16 * x - 8, cells, 'UniformOutput', false);
 %! decoded = quarzel_decode (scale (s), scale (p), scale (q), 3, struct ('units', 8, 'algorithm', 'max-star'));
 %! assert (decoded, {bits(:,1), long});
+
+%!test  % no cells, no blocks
+%! assert (quarzel_decode ({}, {}, {}), {});
+
+%!test  % cells of several classes, with tags
+%! [decoded, details] = quarzel_decode ({soft{1}(:,1), double(soft{1}(:,2)')}, {soft{2}(:,1), double(soft{2}(:,2)')}, ...
+%!                                      {soft{3}(:,1), double(soft{3}(:,2)')}, 2, struct ('tags', [7 8]));
+%! assert (decoded, {bits(:,1), bits(:,2)'});
+%! assert (details.tags, uint32 ([7 8]));
 
 %!test  % tags come back masked
 %! warning ('off', 'quarzel:warning', 'local');
@@ -186,15 +201,15 @@ end
 %! delete (file);
 
 %!error <three streams are needed> quarzel_decode (1)
-%!error <streams of 45 soft values fit no block size; the nearest that do: 44 \(K = 40\), 52 \(K = 48\)> ...
+%!error <no block size for streams of 45 soft values; the nearest that have one: 44 \(K = 40\), 52 \(K = 48\)> ...
 %! quarzel_decode (zeros (45, 1), zeros (45, 1), zeros (45, 1))
-%!error <nearest that do: 44> quarzel_decode ([], [], [])
+%!error <nearest that have one: 44> quarzel_decode ([], [], [])
 %!error id=quarzel:type quarzel_decode (single (soft{1}), soft{2}, soft{3})
 %!error <not single; for instance int8\(round\(8 \* llr\)\)> quarzel_decode (single (1), 1, 1)
 %!error <real and full> quarzel_decode (sparse (zeros (44, 1)), zeros (44, 1), zeros (44, 1))
 %!error <real and full> quarzel_decode (1i * ones (44, 1), zeros (44, 1), zeros (44, 1))
-%!error <no whole number> quarzel_decode (0.5 * ones (44, 1), zeros (44, 1), zeros (44, 1))
-%!error <no whole number> quarzel_decode (NaN (44, 1), zeros (44, 1), zeros (44, 1))
+%!error <not a whole number> quarzel_decode (0.5 * ones (44, 1), zeros (44, 1), zeros (44, 1))
+%!error <not a whole number> quarzel_decode (NaN (44, 1), zeros (44, 1), zeros (44, 1))
 %!error <one class and size> quarzel_decode (zeros (44, 1), zeros (1, 44), zeros (44, 1))
 %!error <one class and size> quarzel_decode (soft{1}, double (soft{2}), soft{3})
 %!error <one class and size> quarzel_decode (zeros (44, 2, 2), zeros (44, 2, 2), zeros (44, 2, 2))
@@ -205,7 +220,7 @@ end
 %!error <iterations must be a whole number> quarzel_decode (soft{:}, 1.5)
 %!error <iterations must be a whole number> quarzel_decode (soft{:}, 1e10)
 %!error <units must be 2, 4 or 8, not 3> quarzel_decode (soft{:}, 6, struct ('units', 3))
-%!error <no algorithm 'log-map'; choose max-log> quarzel_decode (soft{:}, 6, struct ('algorithm', 'log-map'))
+%!error <no algorithm 'log-map'; choose one of max-log, scaled-max-log, max-star> quarzel_decode (soft{:}, 6, struct ('algorithm', 'log-map'))
 %!error <no option 'unit'; choose from units, algorithm> quarzel_decode (soft{:}, 6, struct ('unit', 2))
 %!error <options must be a struct> quarzel_decode (soft{:}, 6, 8)
 %!error <6 tags for 7 blocks|one tag a block> quarzel_decode (soft{:}, 6, struct ('tags', 1:6))

@@ -7,7 +7,7 @@ function [sys, par1, par2] = quarzel_encode (bits)
   %
   %   bits, logical or numbers of value 0 and 1, is
   %
-  %     a vector of K bits         one block; the streams are vectors of K + 4, lying as bits does
+  %     a vector of K bits         one block; the streams are vectors of K + 4, rows or columns as bits
   %     a matrix                   a block in each column
   %     a cell array of vectors    blocks of any sizes; the streams are cell arrays
   %

@@ -8,23 +8,22 @@
 // functions that users call raise it. They have checked that numbers are whole and in the range of an int.
 #include <mex.h>
 
+#include <algorithm>
 #include <array>
 #include <cstdint>
 #include <string>
 #include <vector>
 
-#include "common/core.hpp"
 #include "common/encoding.hpp"
-#include "link/size_table.hpp"
+#include "common/host_core.hpp"
 #include "mex_blocks.hpp"
 
 namespace {
 
 using quarzel::bindings::BindingError;
-using quarzel::bindings::Core;
 using quarzel::bindings::Fault;
 using quarzel::bindings::guarded;
-using quarzel::bindings::Messages;
+using quarzel::bindings::HostCore;
 using quarzel::bindings::Outcome;
 using quarzel::octave::MexBlocks;
 
@@ -56,67 +55,55 @@ std::string textOf(const mxArray* array) {
     return text.data();
 }
 
-/// Throw what went wrong inside; its warnings have been kept.
+/// Throw what went wrong inside.
 void check(const Outcome& outcome) {
     if (!outcome.done()) {
         throw BindingError(outcome.fault, outcome.message());
     }
 }
 
-void add(std::vector<std::string>& warnings, const Outcome& outcome) {
-    warnings.insert(warnings.end(), outcome.warnings.begin(), outcome.warnings.end());
-    check(outcome);
-}
-
-/// Tags of the caller, one a block in their order; none at all when `from` is empty.
-void setTags(const mxArray* from, std::vector<quarzel::bindings::SoftBlock>& blocks) {
-    if (mxIsEmpty(from)) {
-        return;
+/// The tags of the caller, one for each block; zeros when there are none.
+std::vector<unsigned> tagsOf(const mxArray* from, std::size_t blocks) {
+    const std::size_t count = mxGetNumberOfElements(from);
+    if (count == 0) {
+        return std::vector<unsigned>(blocks);
     }
-    if (mxGetNumberOfElements(from) != blocks.size()) {
-        throw BindingError(Fault::value, "there are " + std::to_string(mxGetNumberOfElements(from)) +
-                                             " tags for " + std::to_string(blocks.size()) +
-                                             " blocks; give one tag a block");
+    if (count != blocks) {
+        throw BindingError(Fault::value, "there are " + std::to_string(count) + " tags for " +
+                                             std::to_string(blocks) + " blocks; give one tag a block");
     }
     const auto* const tags = static_cast<const std::uint32_t*>(mxGetData(from));
-    for (std::size_t i = 0; i < blocks.size(); ++i) {
-        blocks[i].tag = tags[i];
-    }
+    return {tags, tags + count};
 }
 
 void decode(mxArray* answer, const mxArray* const* arguments, std::vector<std::string>& warnings) {
-    MexBlocks arrays({arguments[0], arguments[1], arguments[2]});
-    auto& blocks = arrays.blocks();
-    mxSetField(answer, 0, "bits", arrays.bits());
-    setTags(arguments[7], blocks);
+    const MexBlocks blocks({arguments[0], arguments[1], arguments[2]});
+    mxSetField(answer, 0, "bits", blocks.bits());
+    std::vector<unsigned> tags = tagsOf(arguments[7], blocks.count());
     const int iterations = wholeNumber(arguments[3]);
     const int algorithm = mxIsChar(arguments[5]) ? quarzel::bindings::algorithmOf(textOf(arguments[5]))
                                                  : wholeNumber(arguments[5]);
-    Core core;
-    add(warnings, core.open({wholeNumber(arguments[4]), algorithm, wholeNumber(arguments[6])}));
-    if (const int passes = wholeNumber(arguments[8])) {
-        if (blocks.size() != 1) {
-            throw BindingError(Fault::value, "a trace shows one block; decode the others without one");
-        }
-        std::string text;
-        add(warnings, core.trace(blocks[0], iterations, static_cast<unsigned>(passes), text));
-        mxSetField(answer, 0, "trace", mxCreateString(text.c_str()));
-    } else {
-        add(warnings, core.decode(blocks, iterations));
+    HostCore core;
+    check(core.open({wholeNumber(arguments[4]), algorithm, wholeNumber(arguments[6])}));
+    const int passes = wholeNumber(arguments[8]);
+    Outcome outcome = passes == 0 ? blocks.decode(core, iterations, tags)
+                                  : blocks.trace(core, iterations, tags, static_cast<unsigned>(passes));
+    warnings.swap(outcome.warnings);
+    check(outcome);
+    if (passes != 0) {
+        mxSetField(answer, 0, "trace", mxCreateString(outcome.trace.c_str()));
     }
-    mxArray* const tags =
-        mxCreateNumericMatrix(1, static_cast<mwSize>(blocks.size()), mxUINT32_CLASS, mxREAL);
-    for (std::size_t i = 0; i < blocks.size(); ++i) {
-        static_cast<std::uint32_t*>(mxGetData(tags))[i] = blocks[i].tag;
-    }
-    mxSetField(answer, 0, "tags", tags);
+    mxArray* const tagsBack =
+        mxCreateNumericMatrix(1, static_cast<mwSize>(tags.size()), mxUINT32_CLASS, mxREAL);
+    std::copy(tags.begin(), tags.end(), static_cast<std::uint32_t*>(mxGetData(tagsBack)));
+    mxSetField(answer, 0, "tags", tagsBack);
 }
 
 /// The columns of a uint8 matrix, encoded: (K + 4) x 3 x blocks.
 void encode(mxArray* answer, const mxArray* bits) {
     const std::size_t K = mxGetM(bits);
     const std::size_t blocks = mxGetN(bits);
-    const std::array<mwSize, 3> shape = {static_cast<mwSize>(K + quarzel::link::tailPositions), 3,
+    const std::array<mwSize, 3> shape = {static_cast<mwSize>(K + quarzel::tailPositions), 3,
                                          static_cast<mwSize>(blocks)};
     mxArray* const code = mxCreateNumericArray(3, shape.data(), mxUINT8_CLASS, mxREAL);
     mxSetField(answer, 0, "bits", code);
@@ -128,7 +115,7 @@ mxArray* run(int count, const mxArray* const* arguments) noexcept {
     mxArray* const answer = mxCreateStructMatrix(1, 1, static_cast<int>(answerFields.size()),
                                                  const_cast<const char**>(answerFields.data()));
     std::vector<std::string> warnings;
-    const Outcome outcome = guarded([&](const Messages&) {
+    const Outcome outcome = guarded([&] {
         const std::string command = count > 0 && mxIsChar(arguments[0]) ? textOf(arguments[0]) : "";
         if (command == "decode" && count == 10) {
             decode(answer, arguments + 1, warnings);

@@ -15,7 +15,7 @@ the standard places it.
 from ._core import ModelWarning
 from ._core import version as __version__
 from .code import Segments, block_sizes, encode, qpp, segments
-from .decoder import Decoder, algorithms
+from .decoder import Decoder, algorithms, implementations
 from .scoreboard import Mismatch, Scoreboard
 from .simulation import Curve, Point, SweepResult, sweep
 from .trace import BlockTrace, read_trace
@@ -34,6 +34,7 @@ __all__ = [
     "algorithms",
     "block_sizes",
     "encode",
+    "implementations",
     "qpp",
     "read_trace",
     "segments",

@@ -11,7 +11,7 @@ from numpy.typing import ArrayLike, NDArray
 
 
 class SoftBlocks(NamedTuple):
-    """Three streams of one type, and how the blocks lay before they became rows."""
+    """Three streams of one type and layout, and the shape of the blocks before they became rows."""
 
     streams: tuple[NDArray[Any], NDArray[Any], NDArray[Any]]
     """each (blocks, K + 4)"""
@@ -38,9 +38,7 @@ def soft_blocks(systematic: ArrayLike, parity1: Optional[ArrayLike], parity2: Op
         raise ValueError(f"the three streams have the shapes {shapes}; they must have the same one")
     if streams[0].ndim == 0:
         raise ValueError("a stream must be an array of K + 4 soft values, or of blocks of them")
-    dtype = np.result_type(*streams)
-    rows = tuple(_rows(stream, dtype) for stream in streams)
-    return SoftBlocks(rows, streams[0].shape[:-1])
+    return SoftBlocks(_rows(streams), streams[0].shape[:-1])
 
 
 def _soft_array(values: ArrayLike, name: str) -> NDArray[Any]:
@@ -55,9 +53,12 @@ def _soft_array(values: ArrayLike, name: str) -> NDArray[Any]:
     return array
 
 
-def _rows(stream: NDArray[Any], dtype: np.dtype[Any]) -> NDArray[Any]:
-    """A stream as (blocks, K + 4), the values of a block after one another, copied only when they are not."""
-    rows = stream.reshape(math.prod(stream.shape[:-1]), stream.shape[-1])
-    rows = rows.astype(dtype.newbyteorder("="), copy=False)
-    contiguous = rows.strides[1] == rows.itemsize and rows.flags.aligned
-    return rows if contiguous else np.ascontiguousarray(rows)
+def _rows(streams: tuple[NDArray[Any], ...]) -> tuple[NDArray[Any], NDArray[Any], NDArray[Any]]:
+    """The streams as (blocks, K + 4) of one type and with the same strides, copied only when they must be."""
+    shape = streams[0].shape
+    dtype = np.result_type(*streams).newbyteorder("=")
+    rows = [stream.reshape(math.prod(shape[:-1]), shape[-1]).astype(dtype, copy=False) for stream in streams]
+    if len({row.strides for row in rows}) != 1 or not all(row.flags.aligned for row in rows):
+        rows = list(np.stack(rows))
+    systematic, parity1, parity2 = rows
+    return systematic, parity1, parity2

@@ -26,7 +26,7 @@ class Segments(NamedTuple):
 
 
 def _size(K: int) -> int:
-    """K as the extension takes it; it says which sizes there are when this is none."""
+    """K as the extension takes it; the extension names the nearest sizes when K is not one."""
     return min(max(operator.index(K), 0), 2**32 - 1)
 
 
@@ -42,8 +42,14 @@ def segments(K: int, units: int) -> Segments:
     """How a core with 2, 4 or 8 processing units cuts a block of K information bits."""
     if units not in (2, 4, 8):
         raise ValueError(f"units must be 2, 4 or 8, not {units}")
-    alpha, beta = _core.segments(_size(K), operator.index(units))
-    return Segments(alpha, beta.reshape(-1, len(alpha), 2))
+    count, windows = _core.layout(_size(K), operator.index(units))
+    lengths = np.array(windows, dtype=np.int32)
+    tops = np.cumsum(lengths, dtype=np.int32)
+    starts = np.arange(count, dtype=np.int32) * tops[-1]
+    alpha = np.stack([starts, starts + tops[-1]], axis=-1)
+    bottoms = (tops - lengths)[:, None] + starts
+    beta = np.stack([tops[:, None] + starts - 1, np.maximum(bottoms - 1, 0)], axis=-1)
+    return Segments(alpha, beta)
 
 
 def encode(bits: ArrayLike) -> NDArray[np.uint8]:
@@ -51,7 +57,7 @@ def encode(bits: ArrayLike) -> NDArray[np.uint8]:
 
     :param bits: (..., K) information bits, integers or booleans of value 0 or 1
     :returns: (..., 3, K + 4) code bits: systematic, parity 1, parity 2, each with its four tail positions
-    :raises ValueError: K is no block size; the text names the nearest ones
+    :raises ValueError: K is not a block size; the text names the nearest ones
     """
     array = np.asarray(bits)
     if array.dtype.kind not in "biu":

@@ -12,10 +12,21 @@ from numpy.typing import ArrayLike, NDArray
 
 from . import _core
 from ._soft import soft_blocks
-from .trace import BlockTrace, parse_trace
+from .trace import BlockTrace, trace_of_arrays
+
+_MAX_PASSES = 30
 
 algorithms: tuple[str, ...] = _core.algorithms
 """The arithmetics of the core, in the order of their numbers 0, 1 and 2."""
+
+
+def implementations() -> tuple[str, ...]:
+    """The implementations of the model that this machine can run, the fastest first.
+
+    They are named by the instruction set in whose SIMD lanes they decode; the last one, ``"literal"``, decodes
+    step by step. All give the same bits, tags and warnings.
+    """
+    return tuple(_core.implementations())
 
 
 class Decoder:
@@ -23,23 +34,30 @@ class Decoder:
 
     :param units: processing units: 2, 4 or 8
     :param algorithm: ``"max-log"``, ``"scaled-max-log"`` (extrinsic values scaled by 0.75) or ``"max-star"``;
-        their numbers 0, 1 and 2 are good, too
+        their numbers 0, 1 and 2 may be given, too
     :param tag_width: width of the block tag in bits, 0 to 32; at 0 and at 32 every tag comes back as 0, as it
         does from the core
+    :param implementation: one of :func:`implementations`; the fastest when it is not given
 
-    Use it in a ``with`` statement, or call :meth:`close`; or leave it to the garbage collector. One thread at
-    a time may use a decoder, a second one gets a RuntimeError; threads with a decoder each run side by side,
-    since the GIL is released while blocks are decoded. The model warns of the first soft value that it
+    Use it in a ``with`` statement, or call :meth:`close`, or leave it to the garbage collector. Only one thread
+    at a time may use a decoder, a second one gets a RuntimeError. Threads that have a decoder each run side by
+    side, since the GIL is released while blocks are decoded. The model warns of the first soft value that it
     saturates and of the first tag that it truncates: see :class:`ModelWarning`.
     """
 
     def __init__(
-        self, units: int = 2, algorithm: Union[str, int] = "scaled-max-log", tag_width: int = 8
+        self,
+        units: int = 2,
+        algorithm: Union[str, int] = "scaled-max-log",
+        tag_width: int = 8,
+        implementation: Optional[str] = None,
     ) -> None:
         self._units = operator.index(units)
         self._algorithm = algorithm_number(algorithm)
         self._tag_width = operator.index(tag_width)
-        self._core = _core.Core(self._units, self._algorithm, self._tag_width)
+        if implementation == "":
+            raise ValueError("implementation must not be empty; leave it out for the fastest one")
+        self._core = _core.Core(self._units, self._algorithm, self._tag_width, implementation or "")
 
     @property
     def units(self) -> int:
@@ -55,6 +73,11 @@ class Decoder:
     def tag_width(self) -> int:
         """Width of the block tag in bits."""
         return self._tag_width
+
+    @property
+    def implementation(self) -> str:
+        """The name of the implementation that decodes. Traced blocks are always decoded by ``"literal"``."""
+        return self._core.implementation
 
     @overload
     def decode(
@@ -102,16 +125,31 @@ class Decoder:
         :returns: (..., K) uint8 of 0 and 1, or (..., K / 8) when packed; with tags a tuple of them and the
             tags that come back, masked to the tag width
         :raises TypeError: a stream is not int8, int16 or int32
-        :raises ValueError: shapes differ, K + 4 fits no block size, or the decoder is closed
+        :raises ValueError: shapes differ, there is no block size K, or the decoder is closed
         :raises RuntimeError: another thread is using the decoder
         """
         blocks = soft_blocks(systematic, parity1, parity2)
         tag_array = None if tags is None else _tag_array(tags, blocks.shape)
-        bits, tags_back = self._core.decode(*blocks.streams, operator.index(iterations), tag_array)
+        bits, tags_back = self._core.decode(*blocks.streams, operator.index(iterations), tag_array, False)
         if packed:
             bits = np.packbits(bits, axis=-1)
         bits = bits.reshape(*blocks.shape, bits.shape[-1])
         return bits if tags is None else (bits, tags_back.reshape(blocks.shape))
+
+    def decode_every_iteration(
+        self,
+        systematic: ArrayLike,
+        parity1: Optional[ArrayLike] = None,
+        parity2: Optional[ArrayLike] = None,
+        iterations: int = 6,
+    ) -> NDArray[np.uint8]:
+        """Decode as :meth:`decode` does, and give the decisions after every iteration.
+
+        :returns: (..., iterations, K) uint8 of 0 and 1; index i - 1 holds what ``decode(..., iterations=i)`` gives
+        """
+        blocks = soft_blocks(systematic, parity1, parity2)
+        bits, _ = self._core.decode(*blocks.streams, operator.index(iterations), None, True)
+        return bits.reshape(*blocks.shape, *bits.shape[1:])
 
     def trace(
         self,
@@ -130,16 +168,14 @@ class Decoder:
         blocks = soft_blocks(systematic, parity1, parity2)
         if blocks.shape != ():
             raise ValueError(f"a trace shows one block, not blocks of shape {blocks.shape}; pick one of them")
-        count = 2 * operator.index(iterations) if passes is None else operator.index(passes)
-        if count < 1 and passes is not None:
+        count = _MAX_PASSES if passes is None else min(operator.index(passes), _MAX_PASSES)
+        if count < 1:
             raise ValueError(f"passes must be 1 or more, not {count}; there are two an iteration")
-        bits, text = self._core.trace(*blocks.streams, operator.index(iterations), max(count, 0))
-        trace = parse_trace(text)[0]
-        trace.bits = bits[0]
-        return trace
+        bits, block, inputs, signals = self._core.trace(*blocks.streams, operator.index(iterations), count)
+        return trace_of_arrays(block, inputs, signals, bits[0])
 
     def close(self) -> None:
-        """Free the model. Good to call again."""
+        """Free the model. It may be called again."""
         self._core.close()
 
     def __enter__(self) -> Decoder:
@@ -161,12 +197,12 @@ class Decoder:
 def algorithm_number(algorithm: Union[str, int]) -> int:
     """The number of an algorithm that is given by name or number; the model checks numbers.
 
-    :raises ValueError: there is none of that name
+    :raises ValueError: there is no algorithm of that name
     """
     if not isinstance(algorithm, str):
         return operator.index(algorithm)
     if algorithm not in algorithms:
-        raise ValueError(f"there is no algorithm {algorithm!r}; choose {', '.join(algorithms)}")
+        raise ValueError(f"there is no algorithm {algorithm!r}; choose one of {', '.join(algorithms)}")
     return algorithms.index(algorithm)
 
 

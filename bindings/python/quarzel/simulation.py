@@ -3,6 +3,7 @@
 
 from __future__ import annotations
 
+import importlib
 import json
 import operator
 import os
@@ -82,7 +83,7 @@ class SweepResult:
     def read(cls, path: Union[str, os.PathLike[str]]) -> SweepResult:
         """Read a result file.
 
-        :raises ValueError: it is no whole, unaltered result
+        :raises ValueError: it is not a whole, unaltered result
         """
         with open(path, encoding="utf-8", newline="") as file:
             text = file.read()
@@ -152,11 +153,12 @@ def sweep(
     :param max_blocks: a point ends after so many blocks,
     :param max_block_errors: or with this block error (0: however many there are),
     :param max_seconds: or after this time (0: however long it takes); the result then depends on the clock
-    :param per_iteration: count errors after every iteration; each takes its own decoding
+    :param per_iteration: count errors after every iteration
     :param threads: as many as the process may use when not given
     :param on_point: called with a curve (without points) and a point of it when that has ended, in order; what
         it raises ends the sweep
     :raises ValueError: the sweep is not possible; the text says why
+    :raises ImportError: this build or this machine lacks what sweeps need; the text says what
     """
     if llr is not None and scale is not None:
         raise ValueError("llr and scale are two quantisers; give one of them")
@@ -194,11 +196,16 @@ def sweep(
 
 
 def _extension() -> Any:
+    """The engine of sweeps, which is a part of its own: decoding does without."""
     try:
-        from . import _sweep
+        return importlib.import_module("._sweep", __package__)
+    except ModuleNotFoundError as error:
+        raise ImportError(
+            "this build of quarzel has no sweeps; build it with -DQUARZEL_SWEEP=ON where fmt, MPFR, nlohmann_json, "
+            "OpenSSL and Random123 are installed"
+        ) from error
     except ImportError as error:
-        raise ImportError(f"sweeps need libraries that are not installed ({error}); decoding does without") from error
-    return _sweep
+        raise ImportError(f"sweeps need a library that is not installed: {error}") from error
 
 
 def _listed(values: Any) -> list[Any]:

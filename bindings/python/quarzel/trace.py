@@ -1,15 +1,18 @@
 # SPDX-License-Identifier: MIT
-"""Traces as arrays."""
+"""Traces as arrays, and their text form."""
 
 from __future__ import annotations
 
+import functools
 import os
 import re
 from dataclasses import dataclass, field
-from typing import Optional, Union
+from typing import Any, Optional, Union
 
 import numpy as np
 from numpy.typing import NDArray
+
+from . import _core
 
 Signals = dict[str, NDArray[np.int16]]
 
@@ -21,8 +24,9 @@ _INPUTS = {
     "itsPar0[1]": "code2_par0",
     "itsPar1[1]": "code2_par1",
 }
-_COLUMNS = {"int": 1, "a": 8, "b": 8, "g": 4, "llr": 1, "ext": 1}
-_RULER = re.compile(r"^(-{20,}\n)", re.MULTILINE)
+_SIGNALS = _core.signals()
+_BEFORE_A_GAP = ("a", "b", "g", "llr")
+_RULER = re.compile(r"^-{20,}\n", re.MULTILINE)
 _WORDS_A_UNIT = 16
 _UNITS_A_REAL = 8
 
@@ -41,10 +45,19 @@ class BlockTrace:
     passes: list[Signals] = field(default_factory=list)
     """one entry a pass; an even pass decodes constituent code 2, an odd one constituent code 1. Each has
     ``int``, ``llr`` and ``ext`` (K + 3,), ``a`` and ``b`` (K + 3, 8) by encoder state, ``g`` (K + 3, 4)"""
-    text: str = ""
-    """the same as text, as the tool writes and compares it"""
     bits: Optional[NDArray[np.uint8]] = None
     """(K,) hard decisions; None for a trace that was read from a file"""
+
+    @functools.cached_property
+    def text(self) -> str:
+        """The same as text, as the tool writes and compares it. It is made when it is asked for first."""
+        words = {label: self.inputs[name].astype(np.int32) * _WORDS_A_UNIT for label, name in _INPUTS.items()}
+        lines = [f"{label}=[{' '.join(map(str, values.tolist()))}]\n" for label, values in words.items()]
+        tables = [
+            f"{'-' * 289}\ndecode={self.block} siso={number}\n{_heading()}{_rows_text(signals)}"
+            for number, signals in enumerate(self.passes)
+        ]
+        return "".join(["-" * 120 + "\n", *lines, *tables])
 
     def save(self, path: Union[str, os.PathLike[str]]) -> None:
         """Write the text form to a file, for ``quarzel trace-diff``."""
@@ -52,20 +65,25 @@ class BlockTrace:
             file.write(self.text)
 
 
+def trace_of_arrays(
+    block: int, inputs: NDArray[np.int16], signals: Signals, bits: NDArray[np.uint8]
+) -> BlockTrace:
+    """The trace of arrays as the extension gives them: inputs (2, 3, K + 3), and signals by pass first."""
+    passes = [{name: values[i] for name, values in signals.items()} for i in range(len(signals["int"]))]
+    return BlockTrace(block, dict(zip(_INPUTS.values(), inputs.reshape(6, -1))), passes, bits)
+
+
 def read_trace(path: Union[str, os.PathLike[str]]) -> list[BlockTrace]:
-    """The blocks of a file in the text form, from ``quarzel decode --trace`` or :meth:`BlockTrace.save`."""
-    with open(path, encoding="ascii") as file:
-        return parse_trace(file.read())
+    """The blocks of a file in the text form, from ``quarzel decode --trace`` or :meth:`BlockTrace.save`.
 
-
-def parse_trace(text: str) -> list[BlockTrace]:
-    """The blocks of a trace in the text form.
-
-    :raises ValueError: the text is no trace of the model
+    :raises ValueError: the file is not a trace of the model
     """
+    with open(path, encoding="ascii") as file:
+        before, *tables = _RULER.split(file.read())
+    if before or not tables:
+        raise ValueError(f"not a trace of the model: it begins with {before[:40]!r} instead of a ruler")
     blocks: list[BlockTrace] = []
-    before, *tables = _RULER.split(text)
-    for ruler, table in zip(tables[::2], tables[1::2]):
+    for table in tables:
         if table.startswith("itsSys"):
             blocks.append(BlockTrace(-1, dict(map(_input_line, table.splitlines()))))
         elif table.startswith("decode=") and blocks:
@@ -73,29 +91,57 @@ def parse_trace(text: str) -> list[BlockTrace]:
             blocks[-1].block = int(heading.split()[0].removeprefix("decode="))
             blocks[-1].passes.append(_signals(rows, len(blocks[-1].inputs["code1_sys"])))
         else:
-            raise ValueError(f"no trace of the model: {table[:40]!r} follows a ruler")
-        blocks[-1].text += ruler + table
-    if before or not blocks:
-        raise ValueError(f"no trace of the model: it begins with {before[:40]!r} instead of a ruler")
+            raise ValueError(f"not a trace of the model: {table[:40]!r} follows a ruler")
     return blocks
 
 
 def _input_line(line: str) -> tuple[str, NDArray[np.int16]]:
     label, _, words = line.partition("=[")
     if label not in _INPUTS or not words.endswith("]"):
-        raise ValueError(f"no trace of the model: {line[:40]!r} is no line of soft inputs")
+        raise ValueError(f"not a trace of the model: {line[:40]!r} is not a line of soft inputs")
     return _INPUTS[label], np.array(words[:-1].split(), dtype=np.int32).astype(np.int16) // _WORDS_A_UNIT
 
 
 def _signals(rows: str, steps: int) -> Signals:
-    columns = 1 + sum(_COLUMNS.values())
+    columns = 1 + sum(width for _, _, width in _SIGNALS)
     reals = np.fromstring(rows, sep=" ")
     if reals.size != steps * columns:
-        raise ValueError(f"no whole trace of the model: a pass has {reals.size} numbers, not {steps * columns}")
+        raise ValueError(f"not a whole trace of the model: a pass has {reals.size} numbers, not {steps * columns}")
     values = np.rint(reals.reshape(steps, columns) * _UNITS_A_REAL).astype(np.int16)
     signals: Signals = {}
     column = 1
-    for name, width in _COLUMNS.items():
+    for name, _, width in _SIGNALS:
         signals[name] = values[:, column] if width == 1 else values[:, column : column + width]
         column += width
     return signals
+
+
+def _heading() -> str:
+    """The headings of a pass's columns."""
+    text = "n    "
+    for name, first, width in _SIGNALS:
+        text += "  " if name in _BEFORE_A_GAP else ""
+        text += "".join(f"{name}{first + i if width > 1 else '':<{12 - len(name)}}" for i in range(width))
+    return text.rstrip() + "\n"
+
+
+@functools.cache
+def _reals() -> NDArray[Any]:
+    """The text of every value of the format, from the least one up."""
+    return np.array([f"{value / _UNITS_A_REAL:<+12.6f}" for value in range(-2048, 2048)], dtype="S12")
+
+
+def _rows_text(signals: Signals) -> str:
+    """A row for each step of a pass, every column of a fixed width."""
+    columns: list[Any] = [("step", "S5")]
+    for name, _, width in _SIGNALS:
+        columns += [(f"before {name}", "S2")] if name in _BEFORE_A_GAP else []
+        columns.append((name, "S12", (width,)))
+    rows = np.empty(len(signals["int"]), dtype=[*columns, ("end", "S1")])
+    rows["step"] = [f"{step:<5}" for step in range(len(rows))]
+    for name in _BEFORE_A_GAP:
+        rows[f"before {name}"] = "  "
+    for name, _, width in _SIGNALS:
+        rows[name] = _reals()[signals[name].reshape(-1, width) + 2048]
+    rows["end"] = "\n"
+    return rows.tobytes().decode("ascii")

@@ -1,8 +1,8 @@
 // SPDX-License-Identifier: MIT
 #include "decode_arrays.hpp"
 
+#include <algorithm>
 #include <chrono>
-#include <string>
 #include <vector>
 
 #include "raise.hpp"
@@ -10,78 +10,31 @@
 namespace quarzel::python {
 
 namespace py = pybind11;
+using bindings::ArrayBlocks;
 using bindings::BindingError;
 using bindings::Fault;
-using bindings::SoftBlock;
-using bindings::SoftType;
 
 namespace {
 
-/// The type of an array's values; the package has brought them to the machine's byte order.
-SoftType typeOf(const py::array& array) {
-    if (array.dtype().kind() == 'i') {
-        switch (array.itemsize()) {
-            case 1:
-                return SoftType::int8;
-            case 2:
-                return SoftType::int16;
-            case 4:
-                return SoftType::int32;
-            default:
-                break;
-        }
-    }
-    throw BindingError(Fault::type, "soft values must be int8, int16 or int32");
+bool alike(const py::array& first, const py::array& second) {
+    // The distance between blocks means nothing where there is only one.
+    return first.ndim() == 2 && second.ndim() == 2 && first.shape(0) == second.shape(0) &&
+           first.shape(1) == second.shape(1) && first.dtype().equal(second.dtype()) &&
+           first.strides(1) == second.strides(1) &&
+           (first.shape(0) < 2 || first.strides(0) == second.strides(0));
 }
 
-/// The blocks of three arrays, with the bits that they are to write.
-class ArrayBlocks {
-  public:
-    ArrayBlocks(const py::array& systematic, const py::array& parity1, const py::array& parity2) {
-        const std::array<const py::array*, 3> streams = {&systematic, &parity1, &parity2};
-        const SoftType type = typeOf(systematic);
-        for (const py::array* stream : streams) {
-            check(*stream, systematic);
-        }
-        const auto count = systematic.shape(0);
-        const auto positions = static_cast<std::size_t>(systematic.shape(1));
-        const py::ssize_t K = bindings::blockSizeOf(positions);
-        itsBits = Bytes({count, K});
-        for (py::ssize_t i = 0; i < count; ++i) {
-            itsBlocks.push_back({{systematic.data(i), parity1.data(i), parity2.data(i)},
-                                 type,
-                                 positions,
-                                 itsBits.mutable_data(i)});
-        }
-    }
-
-    std::vector<SoftBlock>& blocks() { return itsBlocks; }
-    Bytes bits() const { return itsBits; }
-
-  private:
-    static void check(const py::array& stream, const py::array& first) {
-        if (stream.ndim() != 2 || stream.shape(0) != first.shape(0) || stream.shape(1) != first.shape(1) ||
-            typeOf(stream) != typeOf(first)) {
-            throw BindingError(Fault::value, "the three streams must be of one type and shape");
-        }
-        if (stream.size() > 1 && stream.strides(1) != stream.itemsize()) {
-            throw BindingError(Fault::value, "the soft values of a block must lie after one another");
-        }
-    }
-
-    std::vector<SoftBlock> itsBlocks;
-    Bytes itsBits;
-};
-
-/// Run something that throws BindingErrors as Python knows them.
-template <class Work>
-auto raising(Work work) {
-    try {
-        return work();
-    } catch (const BindingError& error) {
-        raise({error.fault(), error.what(), {}});
-        throw;
-    }
+template <SoftValue Value>
+ArrayBlocks blocksOf(const py::array& systematic, const py::array& parity1, const py::array& parity2) {
+    const auto at = [](const py::array& array) { return static_cast<const Value*>(array.data()); };
+    constexpr py::ssize_t size = sizeof(Value);
+    return SoftBlocks<Value>{at(systematic),
+                             at(parity1),
+                             at(parity2),
+                             static_cast<std::size_t>(systematic.shape(0)),
+                             static_cast<std::size_t>(systematic.shape(1)),
+                             systematic.strides(0) / size,
+                             systematic.strides(1) / size};
 }
 
 /// Whether the user has pressed Ctrl-C; looks every tenth of a second, since that takes the GIL.
@@ -104,48 +57,54 @@ class LookForSignals {
 
 }  // namespace
 
-std::tuple<Bytes, Tags> decodeArrays(bindings::Core& core, const py::array& systematic,
-                                     const py::array& parity1, const py::array& parity2, int iterations,
-                                     const std::optional<Tags>& tags) {
-    return raising([&] {
-        ArrayBlocks arrays(systematic, parity1, parity2);
-        std::vector<SoftBlock>& blocks = arrays.blocks();
-        if (tags && (tags->ndim() != 1 || static_cast<std::size_t>(tags->size()) != blocks.size())) {
-            throw BindingError(Fault::value, "there must be one tag for each block");
-        }
-        for (std::size_t i = 0; tags && i < blocks.size(); ++i) {
-            blocks[i].tag = tags->at(i);
-        }
-        bindings::Outcome outcome;
-        {
-            const py::gil_scoped_release release;
-            outcome = core.decode(blocks, iterations, LookForSignals());
-        }
-        raise(outcome);
-        Tags tagsBack(static_cast<py::ssize_t>(blocks.size()));
-        for (std::size_t i = 0; i < blocks.size(); ++i) {
-            tagsBack.mutable_at(i) = blocks[i].tag;
-        }
-        return std::tuple(arrays.bits(), tagsBack);
-    });
+ArrayBlocks arrayBlocks(const py::array& systematic, const py::array& parity1, const py::array& parity2) {
+    if (!alike(systematic, parity1) || !alike(systematic, parity2)) {
+        throw BindingError(Fault::value, "the three streams must be of one type, shape and layout");
+    }
+    switch (systematic.dtype().kind() == 'i' ? systematic.itemsize() : 0) {
+        case 1:
+            return blocksOf<std::int8_t>(systematic, parity1, parity2);
+        case 2:
+            return blocksOf<std::int16_t>(systematic, parity1, parity2);
+        case 4:
+            return blocksOf<std::int32_t>(systematic, parity1, parity2);
+        default:
+            throw BindingError(Fault::type, "soft values must be int8, int16 or int32");
+    }
 }
 
-std::tuple<Bytes, std::string> traceArrays(bindings::Core& core, const py::array& systematic,
-                                           const py::array& parity1, const py::array& parity2, int iterations,
-                                           unsigned passes) {
+std::tuple<Bytes, Tags> decodeArrays(bindings::HostCore& core, const py::array& systematic,
+                                     const py::array& parity1, const py::array& parity2, int iterations,
+                                     const std::optional<Tags>& tags, bool everyIteration) {
     return raising([&] {
-        ArrayBlocks arrays(systematic, parity1, parity2);
-        if (arrays.blocks().size() != 1) {
-            throw BindingError(Fault::value, "a trace shows one block");
+        const ArrayBlocks blocks = arrayBlocks(systematic, parity1, parity2);
+        const py::ssize_t count = systematic.shape(0);
+        const py::ssize_t K = bindings::blockSizeOf(static_cast<std::size_t>(systematic.shape(1)));
+        bindings::checkIterations(iterations);
+        if (tags && (tags->ndim() != 1 || tags->size() != count)) {
+            throw BindingError(Fault::value, "there must be one tag for each block");
         }
-        std::string text;
+        Tags tagsBack(count);
+        const std::span<unsigned> tagSpan(tagsBack.mutable_data(), static_cast<std::size_t>(count));
+        if (tags) {
+            std::copy_n(tags->data(), count, tagSpan.begin());
+        } else {
+            std::fill(tagSpan.begin(), tagSpan.end(), 0);
+        }
+        Bytes bits(everyIteration ? std::vector<py::ssize_t>{count, iterations, K}
+                                  : std::vector<py::ssize_t>{count, K});
+        const bindings::DecodeJob job{blocks,
+                                      iterations,
+                                      {bits.mutable_data(), static_cast<std::size_t>(bits.size())},
+                                      tagSpan,
+                                      everyIteration};
         bindings::Outcome outcome;
         {
             const py::gil_scoped_release release;
-            outcome = core.trace(arrays.blocks()[0], iterations, passes, text);
+            outcome = core.decode(job, LookForSignals());
         }
         raise(outcome);
-        return std::tuple(arrays.bits(), text);
+        return std::tuple(bits, tagsBack);
     });
 }
 

@@ -7,27 +7,26 @@
 #include <optional>
 #include <tuple>
 
-#include "common/core.hpp"
+#include "common/host_core.hpp"
 
 namespace quarzel::python {
 
 using Bytes = pybind11::array_t<std::uint8_t, pybind11::array::c_style>;
 using Tags = pybind11::array_t<std::uint32_t, pybind11::array::c_style>;
 
-/// Decode blocks of one size. The GIL is released meanwhile.
-/// @param systematic  (blocks, K + 4) of int8, int16 or int32, values of a row after one another; so are
-///                    the parities
-/// @param tags        one a block
-/// @return            bits (blocks, K) and tags (blocks)
-std::tuple<Bytes, Tags> decodeArrays(bindings::Core& core, const pybind11::array& systematic,
-                                     const pybind11::array& parity1, const pybind11::array& parity2,
-                                     int iterations, const std::optional<Tags>& tags);
+/// The blocks of three arrays.
+/// @param systematic  (blocks, K + 4) of int8, int16 or int32 in the machine's byte order; the parities have
+///                    the same type, shape and strides
+/// @throws bindings::BindingError when they do not
+bindings::ArrayBlocks arrayBlocks(const pybind11::array& systematic, const pybind11::array& parity1,
+                                  const pybind11::array& parity2);
 
-/// Decode one block with a trace of its first passes.
-/// @param systematic  (1, K + 4), as above
-/// @return            bits (1, K) and the text of the trace
-std::tuple<Bytes, std::string> traceArrays(bindings::Core& core, const pybind11::array& systematic,
-                                           const pybind11::array& parity1, const pybind11::array& parity2,
-                                           int iterations, unsigned passes);
+/// Decode blocks of one size, as for arrayBlocks. The GIL is released meanwhile.
+/// @param tags             one for each block
+/// @param every_iteration  give the decisions after every iteration
+/// @return                 bits (blocks, K), or (blocks, iterations, K), and tags (blocks)
+std::tuple<Bytes, Tags> decodeArrays(bindings::HostCore& core, const pybind11::array& systematic,
+                                     const pybind11::array& parity1, const pybind11::array& parity2,
+                                     int iterations, const std::optional<Tags>& tags, bool everyIteration);
 
 }  // namespace quarzel::python

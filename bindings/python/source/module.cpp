@@ -8,32 +8,31 @@
 #include <tuple>
 #include <vector>
 
-#include "common/core.hpp"
 #include "common/encoding.hpp"
+#include "common/host_core.hpp"
 #include "decode_arrays.hpp"
-#include "decoder/segments.hpp"
-#include "interleaver/interleaver_3gpplte.hpp"
 #include "link/size_table.hpp"
 #include "raise.hpp"
+#include "trace_arrays.hpp"
 
 namespace py = pybind11;
 
 namespace {
 
 using namespace quarzel::python;
-using quarzel::bindings::Core;
-using Indices = py::array_t<std::int32_t>;
+using quarzel::bindings::HostCore;
 
-std::unique_ptr<Core> makeCore(int units, int algorithm, int tagWidth) {
-    auto core = std::make_unique<Core>();
-    raise(core->open({units, algorithm, tagWidth}));
+std::unique_ptr<HostCore> makeCore(int units, int algorithm, int tagWidth,
+                                   const std::string& implementation) {
+    auto core = std::make_unique<HostCore>();
+    raise(core->open({units, algorithm, tagWidth}, implementation));
     return core;
 }
 
 Bytes encode(const Bytes& bits) {
     const auto blocks = bits.shape(0);
     const auto K = bits.shape(1);
-    Bytes code({blocks, py::ssize_t{3}, K + quarzel::link::tailPositions});
+    Bytes code({blocks, py::ssize_t{3}, K + py::ssize_t{quarzel::tailPositions}});
     quarzel::bindings::Outcome outcome;
     {
         const auto* const from = bits.data();
@@ -48,62 +47,64 @@ Bytes encode(const Bytes& bits) {
 
 std::vector<std::uint32_t> blockSizes() {
     std::vector<std::uint32_t> sizes;
-    for (const LteParams& row : lteParams) {
-        sizes.push_back(row.K);
+    for (const quarzel::BlockSize& size : quarzel::blockSizes()) {
+        sizes.push_back(size.K);
     }
     return sizes;
 }
 
-/// The row of K.
-/// @throws pybind11::value_error naming the nearest sizes when there is none
-const LteParams& rowOf(std::uint32_t K) {
-    if (const LteParams* const row = quarzel::link::findBlockSize(K)) {
-        return *row;
+/// @throws pybind11::value_error naming the nearest sizes when K is not a block size
+void checkSize(std::uint32_t K) {
+    if (!quarzel::findBlockSize(K)) {
+        throw py::value_error("there is no block size of " + std::to_string(K) +
+                              " bits; the nearest: " + quarzel::link::nearestBlockSizesText(K));
     }
-    throw py::value_error("there is no block size of " + std::to_string(K) +
-                          " bits; the nearest: " + quarzel::link::nearestBlockSizesText(K));
 }
 
-Indices qpp(std::uint32_t size) {
-    std::vector<std::uint32_t> indices;
-    TInterleaver3GPPLTE().calcInterleaver(indices, rowOf(size).K);
-    Indices permutation(static_cast<py::ssize_t>(indices.size()));
+py::array_t<std::int32_t> qpp(std::uint32_t K) {
+    checkSize(K);
+    const std::vector<unsigned> indices = quarzel::permutation(K);
+    py::array_t<std::int32_t> permutation(static_cast<py::ssize_t>(indices.size()));
     std::copy(indices.begin(), indices.end(), permutation.mutable_data());
     return permutation;
 }
 
-Indices toArray(const std::vector<quarzel::ABSegment>& segments) {
-    Indices array({static_cast<py::ssize_t>(segments.size()), py::ssize_t{2}});
-    for (std::size_t i = 0; i < segments.size(); ++i) {
-        array.mutable_at(i, 0) = static_cast<std::int32_t>(segments[i].from);
-        array.mutable_at(i, 1) = static_cast<std::int32_t>(segments[i].to);
-    }
-    return array;
+/// The number of segments, and the lengths of the windows of one of them, from the lowest up.
+std::tuple<unsigned, std::vector<unsigned>> layout(std::uint32_t K, std::uint32_t units) {
+    checkSize(K);
+    const quarzel::Layout layout = quarzel::layout(K, units);
+    return {layout.segments, {layout.window_steps, layout.window_steps + layout.windows}};
 }
 
-std::tuple<Indices, Indices> segments(std::uint32_t K, std::uint32_t units) {
-    constexpr std::uint32_t threadsPerUnit = 4;
-    quarzel::Segments cut;
-    quarzel::cutSegments(K, quarzel::threadSegments(rowOf(K).K, threadsPerUnit * units), cut);
-    return {toArray(cut.alpha), toArray(cut.beta)};
+/// The signals of a pass, each with the number of its first column and its columns.
+std::vector<std::tuple<std::string, unsigned, unsigned>> signals() {
+    std::vector<std::tuple<std::string, unsigned, unsigned>> list;
+    for (const quarzel::Signal& signal : quarzel::signals()) {
+        list.emplace_back(signal.name, signal.first, signal.width);
+    }
+    return list;
 }
 
 }  // namespace
 
 PYBIND11_MODULE(_core, module) {
     module.doc() = "The extension behind the package quarzel; use that.";
-    module.attr("version") = QUARZEL_VERSION;
-    module.attr("algorithms") = py::tuple(py::cast(quarzel::bindings::algorithmNames));
+    module.attr("version") = vardel_ip_quarzel_version();
+    module.attr("algorithms") = py::tuple(py::cast(quarzel::algorithmNames));
     addWarning(module);
-    py::class_<Core>(module, "Core")
-        .def(py::init(&makeCore), py::arg("units"), py::arg("algorithm"), py::arg("tag_width"))
+    py::class_<HostCore>(module, "Core")
+        .def(py::init(&makeCore), py::arg("units"), py::arg("algorithm"), py::arg("tag_width"),
+             py::arg("implementation"))
+        .def_property_readonly("implementation", &HostCore::implementation)
         .def("decode", &decodeArrays, py::arg("systematic"), py::arg("parity1"), py::arg("parity2"),
-             py::arg("iterations"), py::arg("tags"))
+             py::arg("iterations"), py::arg("tags"), py::arg("every_iteration"))
         .def("trace", &traceArrays, py::arg("systematic"), py::arg("parity1"), py::arg("parity2"),
              py::arg("iterations"), py::arg("passes"))
-        .def("close", [](Core& core) { raise(core.close()); });
+        .def("close", [](HostCore& core) { raise(core.close()); });
+    module.def("implementations", &quarzel::implementations);
     module.def("encode", &encode, py::arg("bits"));
     module.def("block_sizes", &blockSizes);
     module.def("qpp", &qpp, py::arg("K"));
-    module.def("segments", &segments, py::arg("K"), py::arg("units"));
+    module.def("layout", &layout, py::arg("K"), py::arg("units"));
+    module.def("signals", &signals);
 }

@@ -15,4 +15,15 @@ void addWarning(pybind11::module_& module);
 /// @throws pybind11::error_already_set when the outcome is a fault, or the user has made warnings errors
 void raise(const bindings::Outcome& outcome);
 
+/// Run something that throws BindingErrors as Python knows them.
+template <class Work>
+auto raising(Work work) {
+    try {
+        return work();
+    } catch (const bindings::BindingError& error) {
+        raise({error.fault(), error.what(), {}, {}});
+        throw;
+    }
+}
+
 }  // namespace quarzel::python

@@ -29,14 +29,14 @@ void raising(Work work) {
     quarzel::bindings::Outcome outcome;
     {
         const py::gil_scoped_release release;
-        outcome = quarzel::bindings::guarded([&](const quarzel::bindings::Messages&) {
+        outcome = quarzel::bindings::guarded([&] {
             try {
                 work();
             } catch (const Error& error) {
                 throw BindingError(Fault::value, error.what());
             } catch (const Json::exception& error) {
                 throw BindingError(Fault::value,
-                                   std::string("the configuration is not understood: ") + error.what());
+                                   std::string("the configuration cannot be read: ") + error.what());
             }
         });
     }

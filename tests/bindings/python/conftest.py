@@ -12,6 +12,9 @@ import pytest
 hypothesis.settings.register_profile("quick", max_examples=40, deadline=None, database=None, print_blob=True)
 hypothesis.settings.load_profile("quick")
 
+# A build without sweeps has nothing to simulate with.
+collect_ignore = [] if os.environ["QUARZEL_SWEEP"] == "ON" else ["test_simulation.py"]
+
 
 @pytest.fixture
 def rng():
@@ -24,6 +27,14 @@ def rng():
 @pytest.fixture
 def captures():
     return Path(os.environ["QUARZEL_CAPTURES"])
+
+
+@pytest.fixture
+def tool():
+    """The command line tool, with which results are compared where it has been built."""
+    if "QUARZEL_TOOL" not in os.environ:
+        pytest.skip("the tool has not been built")
+    return os.environ["QUARZEL_TOOL"]
 
 
 def soft_of(code, amplitude=8):

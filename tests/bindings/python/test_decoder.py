@@ -1,8 +1,11 @@
 # SPDX-License-Identifier: MIT
 """Decoding: bits, shapes, types, and what is refused."""
 
+import contextlib
 import gc
+import signal
 import threading
+import time
 import warnings
 
 import numpy as np
@@ -55,6 +58,8 @@ def test_every_type_and_layout_means_the_same(rng, dtype, shape):
     assert np.array_equal(decoder.decode(np.asfortranarray(typed)), expected)
     backwards = [stream[..., ::-1].copy()[..., ::-1] for stream in streams]
     assert np.array_equal(decoder.decode(*backwards), expected)
+    assert np.array_equal(decoder.decode(streams[0].copy(), *backwards[1:]), expected)
+    assert np.array_equal(decoder.decode(typed[..., ::-1].copy()[..., ::-1]), expected)
 
 
 def test_streams_of_several_types_are_taken_as_they_are(rng):
@@ -68,6 +73,38 @@ def test_a_batch_is_its_blocks(rng):
     batch = quarzel.Decoder(8, "max-star").decode(soft, iterations=3)
     single = [quarzel.Decoder(8, 2).decode(block, iterations=3) for block in soft]
     assert np.array_equal(batch, single)
+
+
+def test_a_stream_may_be_the_same_for_all_blocks(rng):
+    soft = noisy(rng, (5,), 40)
+    parity = np.broadcast_to(soft[0, 1], soft[:, 1].shape)
+    copied = parity.copy()
+    decoder = quarzel.Decoder()
+    assert np.array_equal(decoder.decode(soft[:, 0], parity, parity), decoder.decode(soft[:, 0], copied, copied))
+
+
+def test_every_implementation_decides_alike(rng):
+    soft = noisy(rng, (40,), 512)
+    names = quarzel.implementations()
+    assert names[-1] == "literal"
+    assert quarzel.Decoder().implementation == names[0]
+    expected = quarzel.Decoder().decode(soft)
+    for name in names:
+        decoder = quarzel.Decoder(implementation=name)
+        assert decoder.implementation == name
+        assert np.array_equal(decoder.decode(soft), expected)
+
+
+@pytest.mark.parametrize("shape", [(), (40,), (2, 3), (0,)])
+def test_the_decisions_of_every_iteration_are_those_of_shorter_decodes(rng, shape):
+    soft = noisy(rng, shape, 64)
+    decoder = quarzel.Decoder(4, "max-star")
+    every = decoder.decode_every_iteration(soft, iterations=4)
+    assert every.shape == (*shape, 4, 64)
+    for iterations in range(1, 5):
+        assert np.array_equal(every[..., iterations - 1, :], decoder.decode(soft, iterations=iterations))
+    with pytest.raises(ValueError, match="from 1 to 15, not -1"):
+        decoder.decode_every_iteration(soft, iterations=-1)
 
 
 def test_packed_bits_are_those_of_packbits(rng):
@@ -105,9 +142,9 @@ def test_the_first_saturation_is_a_warning_that_names_the_line_of_the_user(capfd
         (np.zeros((3, 44)), TypeError, r"must be int8, int16 or int32, not float64; .*numpy\.rint\(8 \* llr\)"),
         (np.zeros((3, 44), np.int64), TypeError, r"not int64; use systematic\.astype\(numpy\.int8\)"),
         (np.zeros((3, 44), np.uint8), TypeError, "not uint8"),
-        (np.zeros((3, 45), np.int8), ValueError, r"45 soft values .* 44 \(K = 40\), 52 \(K = 48\)"),
-        (np.zeros((3, 7000), np.int8), ValueError, r"nearest that do: 6148 \(K = 6144\)"),
-        (np.zeros((3, 0), np.int8), ValueError, r"nearest that do: 44 \(K = 40\)"),
+        (np.zeros((3, 45), np.int8), ValueError, r"of 45 soft values; .* 44 \(K = 40\), 52 \(K = 48\)"),
+        (np.zeros((3, 7000), np.int8), ValueError, r"nearest that have one: 6148 \(K = 6144\)"),
+        (np.zeros((3, 0), np.int8), ValueError, r"nearest that have one: 44 \(K = 40\)"),
         (np.zeros((2, 44), np.int8), ValueError, r"shape \(2, 44\) does not hold three streams"),
         (np.int8(1), ValueError, "does not hold three streams"),
     ],
@@ -132,9 +169,11 @@ def test_refuses_streams_that_do_not_fit_together():
     [
         ({"units": 3}, ValueError, "units must be 2, 4 or 8, not 3"),
         ({"units": 2.0}, TypeError, "float"),
-        ({"algorithm": "log-map"}, ValueError, "choose max-log, scaled-max-log, max-star"),
+        ({"algorithm": "log-map"}, ValueError, "choose one of max-log, scaled-max-log, max-star"),
         ({"algorithm": 3}, ValueError, "algorithm must be 0, 1 or 2"),
         ({"tag_width": 33}, ValueError, "tag width must be a number from 0 to 32"),
+        ({"implementation": "abacus"}, ValueError, "no implementation 'abacus'; choose one of .*literal$"),
+        ({"implementation": ""}, ValueError, "implementation must not be empty"),
     ],
 )
 def test_refuses_cores_that_there_are_not(arguments, error, text):
@@ -159,9 +198,30 @@ def test_a_closed_decoder_says_so():
         decoder.trace(np.zeros((3, 44), np.int8))
 
 
+def test_a_signal_ends_a_long_batch(rng):
+    class Stopped(Exception):
+        pass
+
+    def stop(number, frame):
+        raise Stopped
+
+    block = noisy(rng, (), 6144)
+    decoder = quarzel.Decoder(8, "max-star")
+    before = signal.signal(signal.SIGALRM, stop)
+    try:
+        with pytest.raises(Stopped):
+            signal.setitimer(signal.ITIMER_REAL, 0.01)
+            decoder.decode(np.broadcast_to(block, (10000, *block.shape)), iterations=15)
+    finally:
+        signal.setitimer(signal.ITIMER_REAL, 0)
+        signal.signal(signal.SIGALRM, before)
+    assert np.array_equal(decoder.decode(block), quarzel.Decoder(8, "max-star").decode(block))
+
+
 def test_threads_with_a_decoder_each_run_side_by_side_and_one_decoder_takes_one_thread(rng):
     soft = noisy(rng, (400,), 1024)
     decoder = quarzel.Decoder()
+    end = time.monotonic() + 60
     started = threading.Event()
     refused = []
 
@@ -176,13 +236,9 @@ def test_threads_with_a_decoder_each_run_side_by_side_and_one_decoder_takes_one_
 
     def decode():
         started.set()
-        for _ in range(50):
-            try:
+        while not refused and time.monotonic() < end:
+            with contextlib.suppress(RuntimeError):
                 decoder.decode(soft)
-            except RuntimeError:
-                continue
-            if refused:
-                return
 
     thread = threading.Thread(target=decode)
     disturber = threading.Thread(target=disturb)

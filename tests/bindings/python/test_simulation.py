@@ -1,7 +1,6 @@
 # SPDX-License-Identifier: MIT
 """Sweeps: the same file as the tool's, callbacks, interruptions, refusals, pictures."""
 
-import os
 import subprocess
 
 import numpy as np
@@ -17,11 +16,11 @@ def result():
     return quarzel.sweep([0.4, 1.2], **SMALL)
 
 
-def test_the_result_is_the_file_of_the_tool(result, tmp_path):
+def test_the_result_is_the_file_of_the_tool(result, tool, tmp_path):
     ours, theirs = tmp_path / "ours.json", tmp_path / "theirs.json"
     result.save(ours)
     subprocess.run(
-        [os.environ["QUARZEL_TOOL"], "sweep", "--block-size", "40,64", "--algorithm", "0,2", "--iterations", "4",
+        [tool, "sweep", "--block-size", "40,64", "--algorithm", "0,2", "--iterations", "4",
          "--max-blocks", "300", "--seed", "7", "--ebn0", "0.4,1.2", "-o", theirs],
         check=True, capture_output=True,
     )  # fmt: skip
@@ -76,7 +75,7 @@ def test_errors_after_each_iteration():
     "arguments, text",
     [
         ({"block_size": 41}, "block size 41 is not possible; give one of the 188 sizes"),
-        ({"algorithm": "log-map"}, "choose max-log"),
+        ({"algorithm": "log-map"}, "choose one of max-log"),
         ({"algorithm": 3}, "algorithm 3 is not possible"),
         ({"units": []}, "units"),
         ({"max_blocks": 0}, "number of blocks"),

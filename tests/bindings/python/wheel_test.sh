@@ -1,10 +1,11 @@
 #!/usr/bin/env bash
 # SPDX-License-Identifier: MIT
-# Install the wheel and run the pages and the example in an empty directory: wheel_test.sh PYTHON DIST SOURCE
+# Install the wheel and run the pages and the example in an empty directory: wheel_test.sh PYTHON DIST SOURCE PAGE...
 set -euo pipefail
 python=$1
 dist=$2
 source=$3
+shift 3
 work=$(mktemp -d)
 trap 'rm -rf "$work"' EXIT
 
@@ -13,7 +14,7 @@ trap 'rm -rf "$work"' EXIT
 export PYTHONPATH=$work/packages PYTHONDONTWRITEBYTECODE=1 MPLCONFIGDIR=$work
 mkdir "$work/empty"
 cd "$work/empty"
-for page in python cocotb; do
+for page in "$@"; do
     "$python" "$source/tests/bindings/run_page.py" "$source/docs/$page.md"
 done
 rows=$("$python" "$source/examples/python_waterfall.py" --blocks 20 | wc -l)

@@ -45,12 +45,12 @@ simulator first first first.sv
 obj_dir/first | sed '/Verilog \$finish$/d' | diff expected -
 echo "ok: systemverilog.md"
 
-simulator roads roads_test "$here/roads_test.sv"
-obj_dir/roads >printed
-sed -e 's/^\[0\] %Warning: .*: quarzel: /warning: /' -e '/Verilog \$finish$/d' printed | diff "$here/roads_test.txt" -
+simulator calls dpi_calls_test "$here/dpi_calls_test.sv"
+obj_dir/calls >printed
+sed -e 's/^\[0\] %Warning: .*: quarzel: /warning: /' -e '/Verilog \$finish$/d' printed | diff "$here/dpi_calls_test.txt" -
 grep -q "^decode=1 siso=1$" trace.txt
-echo "ok: roads, refusals, warnings and traces"
-if obj_dir/roads +refused >refused 2>&1; then
+echo "ok: calls, refusals, warnings and traces"
+if obj_dir/calls +refused >refused 2>&1; then
     echo "a wrong call did not stop the simulation" >&2
     exit 1
 fi

@@ -50,8 +50,8 @@ using Reader = io::CSVReader<3, io::trim_chars<' ', '\t'>, io::no_quote_escape<'
 
 constexpr std::array<const char*, 3> columns = {"systematic", "parity1", "parity2"};
 
-int toInteger(const char* field, std::size_t column, unsigned line, const std::string& file) {
-    int value = 0;
+std::int32_t toInteger(const char* field, std::size_t column, unsigned line, const std::string& file) {
+    std::int32_t value = 0;
     const char* const end = field + std::strlen(field);
     const auto [stop, error] = std::from_chars(field, end, value);
     if (error != std::errc() || stop != end) {
@@ -63,7 +63,7 @@ int toInteger(const char* field, std::size_t column, unsigned line, const std::s
 
 /// A block while its lines come in.
 struct OpenBlock {
-    std::array<std::vector<int>, 3> streams;
+    std::array<std::vector<std::int32_t>, 3> streams;
     unsigned firstLine = 0;
 
     /// Append the block to the capture and start anew. An empty block is none.
@@ -73,19 +73,16 @@ struct OpenBlock {
             return;
         }
         const std::uint32_t K = blockSizeOf(positions, fmt::format("{}: line {}", file, firstLine));
-        if (capture.blocks.empty()) {
+        if (capture.soft.empty()) {
             capture.blockSize = K;
         } else if (K != capture.blockSize) {
-            throw fileError(
-                file,
-                fmt::format("line {}: block {} has {} positions, the blocks before have {}", firstLine,
-                            capture.blocks.size() + 1, positions, capture.blockSize + 4),
-                "give blocks of one size a file");
+            throw fileError(file,
+                            fmt::format("line {}: block {} has {} positions, the blocks before have {}",
+                                        firstLine, capture.blocks() + 1, positions, capture.positions()),
+                            "give blocks of one size a file");
         }
-        SoftBlock& block = capture.blocks.emplace_back();
-        block.reserve(3 * positions);
-        for (std::vector<int>& stream : streams) {
-            block.insert(block.end(), stream.begin(), stream.end());
+        for (std::vector<std::int32_t>& stream : streams) {
+            capture.soft.insert(capture.soft.end(), stream.begin(), stream.end());
             stream.clear();
         }
     }
@@ -130,7 +127,7 @@ Capture readCsvCapture(std::istream& stream, const std::string& file) {
         throw fileError(file, "has neither an npy header nor the CSV header systematic,parity1,parity2",
                         "give a capture in one of these formats");
     }
-    if (capture.blocks.empty()) {
+    if (capture.soft.empty()) {
         throw fileError(file, "holds no block", "record at least one");
     }
     return capture;

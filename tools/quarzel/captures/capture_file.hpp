@@ -1,20 +1,31 @@
 // SPDX-License-Identifier: MIT
 #pragma once
 
+#include <cstddef>
 #include <cstdint>
+#include <span>
 #include <string>
 #include <vector>
 
-namespace quarzel::tool {
+#include "quarzel/core.hpp"
 
-/// The soft values of one code block: K + 4 systematic ones, K + 4 of the first parity, K + 4 of the second.
-using SoftBlock = std::vector<int>;
+namespace quarzel::tool {
 
 /// Code blocks of one size, as a receiver has recorded them.
 struct Capture {
     std::string file;             ///< where it was read
     std::uint32_t blockSize = 0;  ///< K, a valid block size
-    std::vector<SoftBlock> blocks;
+    /// Of each block K + 4 systematic values, K + 4 of the first parity, K + 4 of the second.
+    std::vector<std::int32_t> soft;
+
+    std::size_t positions() const { return blockSize + tailPositions; }
+    std::size_t blocks() const { return soft.size() / (3 * positions()); }
+
+    /// `count` blocks from the block `first` on.
+    SoftBlocks<std::int32_t> part(std::size_t first, std::size_t count) const {
+        const std::size_t values = 3 * positions();
+        return softBlocks(std::span(soft).subspan(first * values, count * values), positions());
+    }
 };
 
 /// Read a capture: an npy file of int8, int16 or int32 values of shape (blocks, 3, K + 4), or CSV. Memory

@@ -14,9 +14,9 @@ namespace {
 
 /// Read blocks of `values` elements of the type Element, in the machine's (little-endian) byte order.
 template <class Element>
-std::vector<SoftBlock> readBlocks(std::istream& stream, std::uint64_t count, std::size_t values,
-                                  const std::string& file) {
-    std::vector<SoftBlock> blocks;
+std::vector<std::int32_t> readBlocks(std::istream& stream, std::uint64_t count, std::size_t values,
+                                     const std::string& file) {
+    std::vector<std::int32_t> soft;
     std::vector<Element> elements(values);
     const auto bytes = static_cast<std::streamsize>(values * sizeof(Element));
     for (std::uint64_t block = 0; block < count; ++block) {
@@ -24,9 +24,9 @@ std::vector<SoftBlock> readBlocks(std::istream& stream, std::uint64_t count, std
             throw fileError(file, fmt::format("ends within block {} of {}", block + 1, count),
                             "copy it again, it was cut short");
         }
-        blocks.emplace_back(elements.begin(), elements.end());
+        soft.insert(soft.end(), elements.begin(), elements.end());
     }
-    return blocks;
+    return soft;
 }
 
 }  // namespace
@@ -47,13 +47,12 @@ Capture readNpyCapture(std::istream& stream, const std::string& file) {
             file, "has shape " + shapeText(header.shape),
             "a capture has shape (blocks, 3, K + 4), with systematic, parity 1, parity 2 in axis 1");
     }
-    const std::uint64_t positions = header.shape[2];
     Capture capture;
-    capture.blockSize = blockSizeOf(positions, file);
+    capture.blockSize = blockSizeOf(header.shape[2], file);
     if (header.shape[0] == 0) {
         throw fileError(file, "holds no block", "record at least one");
     }
-    capture.blocks = reader(stream, header.shape[0], 3 * static_cast<std::size_t>(positions), file);
+    capture.soft = reader(stream, header.shape[0], 3 * capture.positions(), file);
     requireEnd(stream, file);
     return capture;
 }

@@ -9,10 +9,10 @@
 #include <memory>
 #include <optional>
 #include <string>
+#include <string_view>
 
 #include "captures/bits_file.hpp"
 #include "captures/capture_file.hpp"
-#include "decode/core_model.hpp"
 #include "decode/decode_report.hpp"
 #include "decode/decode_together.hpp"
 #include "decode/progress.hpp"
@@ -111,10 +111,10 @@ std::unique_ptr<TraceFile> openTrace(const Capture& capture, const DecodeOptions
     if (!trace.passes) {
         return nullptr;
     }
-    if (trace.block > capture.blocks.size()) {
+    if (trace.block > capture.blocks()) {
         throw ToolError(ExitCode::usage, "--trace-block",
                         fmt::format("{} has no block {}", options.capture, trace.block),
-                        fmt::format("give a number from 1 to {}", capture.blocks.size()));
+                        fmt::format("give a number from 1 to {}", capture.blocks()));
     }
     return std::make_unique<TraceFile>(trace, results);
 }
@@ -122,18 +122,20 @@ std::unique_ptr<TraceFile> openTrace(const Capture& capture, const DecodeOptions
 /// Decode one block after the other and trace what the user wants traced.
 PackedBits decodeTraced(const Capture& capture, const DecodeOptions& options, TraceFile& trace,
                         Progress& progress) {
-    CoreModel core(options.core.units, options.core.algorithm, &trace.writer());
-    PackedBits decisions(capture.blocks.size(), capture.blockSize);
-    std::vector<unsigned char> bits(capture.blockSize);
-    for (std::size_t block = 0; block < capture.blocks.size(); ++block) {
+    Core core = coreOf(options.core);
+    core.onMessage([&trace](MessageKind kind, std::string_view text) {
+        if (kind == MessageKind::trace) {
+            trace.writeLine(text);
+        } else {
+            std::cerr << fmt::format("{}\n", text);
+        }
+    });
+    PackedBits decisions(capture.blocks(), capture.blockSize);
+    for (std::size_t block = 0; block < capture.blocks(); ++block) {
         if (block + 1 == options.trace.block) {
-            core.trace(*options.trace.passes);
+            trace.start(core);
         }
-        if (const auto failed = core.decode({&capture.blocks[block], 1}, options.core.iterations, bits)) {
-            throw decodingError(capture, block, failed->status);
-        }
-        trace.check();
-        decisions.set(block, bits.data());
+        decodePart(core, capture, block, 1, options.core.iterations, decisions);
         progress.update(block + 1);
     }
     trace.finish();
@@ -141,7 +143,7 @@ PackedBits decodeTraced(const Capture& capture, const DecodeOptions& options, Tr
 }
 
 PackedBits decodeBlocks(const Capture& capture, const DecodeOptions& options, TraceFile* trace) {
-    Progress progress(std::cerr, ::isatty(STDERR_FILENO) != 0, capture.blocks.size());
+    Progress progress(std::cerr, ::isatty(STDERR_FILENO) != 0, capture.blocks());
     return trace != nullptr ? decodeTraced(capture, options, *trace, progress)
                             : decodeTogether(capture, options.core, options.threads, progress);
 }
@@ -151,7 +153,7 @@ void decode(const DecodeOptions& options, std::ostream& results) {
     const Capture capture = readCapture(options.capture);
     std::optional<PackedBits> reference;
     if (options.reference) {
-        reference = readBits(*options.reference, capture.blocks.size(), capture.blockSize / 8);
+        reference = readBits(*options.reference, capture.blocks(), capture.blockSize / 8);
     }
     const std::unique_ptr<TraceFile> trace = openTrace(capture, options, results);
 
@@ -162,8 +164,8 @@ void decode(const DecodeOptions& options, std::ostream& results) {
     if (options.output) {
         writeBits(*options.output, decisions);
     }
-    DecodeReport report{options.capture,       capture.blockSize, options.core,
-                        capture.blocks.size(), duration.count(),  {}};
+    DecodeReport report{options.capture,  capture.blockSize, options.core,
+                        capture.blocks(), duration.count(),  {}};
     if (reference) {
         report.errors = countErrors(decisions, *reference);
     }

@@ -52,6 +52,7 @@ void printJson(std::ostream& stream, const DecodeReport& report) {
         {"units", report.core.units},
         {"algorithm", report.core.algorithm},
         {"iterations", report.core.iterations},
+        {"implementation", report.core.implementation},
         {"blocks", report.blocks},
         {"bits", bitsOf(report)},
         {"seconds", report.seconds},

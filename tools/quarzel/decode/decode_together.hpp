@@ -1,6 +1,8 @@
 // SPDX-License-Identifier: MIT
 #pragma once
 
+#include <cstddef>
+
 #include "captures/bits_file.hpp"
 #include "captures/capture_file.hpp"
 #include "options/core_options.hpp"
@@ -8,17 +10,18 @@
 namespace quarzel::tool {
 
 class Progress;
-class ToolError;
 
-/// Decode all blocks of a capture in groups, on threads that have a model each. Decisions, warnings and
-/// errors are the same for any number of threads.
+/// Decode `count` blocks of a capture from the block `first` on, and keep their decisions.
+/// @throws ToolError naming the first block that the model refuses
+void decodePart(Core& core, const Capture& capture, std::size_t first, std::size_t count, int iterations,
+                PackedBits& decisions);
+
+/// Decode all blocks of a capture in groups, on threads that have a core each. Decisions, warnings and errors
+/// are the same for any number of threads: the user is warned of the first block that warns, once.
 ///
 /// @param threads  at least 1
-/// @throws ToolError when a block could not be decoded: the first one of the capture
-PackedBits decodeTogether(const Capture& capture, const CoreOptions& core, unsigned threads,
+/// @throws ToolError naming the first block that the model refuses
+PackedBits decodeTogether(const Capture& capture, const CoreOptions& options, unsigned threads,
                           Progress& progress);
-
-/// What the user is told when the library refused a block.
-ToolError decodingError(const Capture& capture, std::size_t block, int status);
 
 }  // namespace quarzel::tool

@@ -3,14 +3,15 @@
 
 #include <fmt/format.h>
 
+#include <array>
 #include <cstdint>
 #include <memory>
 #include <nlohmann/json.hpp>
 #include <optional>
+#include <span>
 #include <string>
 #include <vector>
 
-#include "decode/core_layout.hpp"
 #include "options/block_sizes.hpp"
 #include "options/whole_number.hpp"
 #include "tool_error.hpp"
@@ -35,12 +36,14 @@ Example:
   quarzel info 6144
 )";
 
-std::vector<CoreLayout> layoutsOf(std::uint32_t K) {
-    return {coreLayout(K, 2), coreLayout(K, 4), coreLayout(K, 8)};
+constexpr std::array<std::uint32_t, 3> cores = {2, 4, 8};  // in units
+
+std::span<const unsigned> windowsOf(const Layout& layout) {
+    return std::span(layout.window_steps).first(layout.windows);
 }
 
 /// Lengths with equal neighbours taken together: "2 x 64 + 54 + 53".
-std::string lengthsText(const std::vector<std::uint32_t>& lengths) {
+std::string lengthsText(std::span<const unsigned> lengths) {
     std::vector<std::string> groups;
     for (std::size_t first = 0, end = 0; first < lengths.size(); first = end) {
         while (end < lengths.size() && lengths[end] == lengths[first]) {
@@ -53,7 +56,7 @@ std::string lengthsText(const std::vector<std::uint32_t>& lengths) {
 }
 
 void printSizes(std::ostream& stream) {
-    stream << fmt::format("{} block sizes, in information bits:\n", lteParams.size());
+    stream << fmt::format("{} block sizes, in information bits:\n", blockSizes().size());
     for (const BlockSizeRange& range : blockSizeRanges()) {
         stream << fmt::format("{:5} to {:4} in steps of {:2}\n", range.first, range.last, range.step);
     }
@@ -61,37 +64,38 @@ void printSizes(std::ostream& stream) {
 
 void printSizesJson(std::ostream& stream) {
     nlohmann::ordered_json sizes = nlohmann::ordered_json::array();
-    for (const LteParams& row : lteParams) {
-        sizes.push_back(row.K);
+    for (const BlockSize& size : blockSizes()) {
+        sizes.push_back(size.K);
     }
     stream << nlohmann::ordered_json{{"block_sizes", sizes}}.dump() << '\n';
 }
 
-void printSize(std::ostream& stream, const LteParams& row) {
+void printSize(std::ostream& stream, const BlockSize& size) {
     stream << fmt::format(
         "block size   {} information bits\n"
         "interleaver  pi(i) = ({} i + {} i^2) mod {}, f1 = {}, f2 = {}\n"
         "\n"
         "units  threads  segments  steps per segment  windows per segment\n",
-        row.K, row.f1, row.f2, row.K, row.f1, row.f2);
-    for (const CoreLayout& layout : layoutsOf(row.K)) {
-        stream << fmt::format("{:5}  {:7}  {:8}  {:17}  {} ({})\n", layout.units, layout.threads,
-                              layout.segments, layout.steps, layout.windows.size(),
-                              lengthsText(layout.windows));
+        size.K, size.f1, size.f2, size.K, size.f1, size.f2);
+    for (const std::uint32_t units : cores) {
+        const Layout layout = quarzel::layout(size.K, units);
+        stream << fmt::format("{:5}  {:7}  {:8}  {:17}  {} ({})\n", units, layout.threads, layout.segments,
+                              layout.segment_steps, layout.windows, lengthsText(windowsOf(layout)));
     }
 }
 
-void printSizeJson(std::ostream& stream, const LteParams& row) {
-    nlohmann::ordered_json cores = nlohmann::ordered_json::array();
-    for (const CoreLayout& layout : layoutsOf(row.K)) {
-        cores.push_back({{"units", layout.units},
-                         {"threads", layout.threads},
-                         {"segments", layout.segments},
-                         {"steps_per_segment", layout.steps},
-                         {"window_lengths", layout.windows}});
+void printSizeJson(std::ostream& stream, const BlockSize& size) {
+    nlohmann::ordered_json layouts = nlohmann::ordered_json::array();
+    for (const std::uint32_t units : cores) {
+        const Layout layout = quarzel::layout(size.K, units);
+        layouts.push_back({{"units", units},
+                           {"threads", layout.threads},
+                           {"segments", layout.segments},
+                           {"steps_per_segment", layout.segment_steps},
+                           {"window_lengths", windowsOf(layout)}});
     }
     const nlohmann::ordered_json object = {
-        {"block_size", row.K}, {"f1", row.f1}, {"f2", row.f2}, {"cores", cores}};
+        {"block_size", size.K}, {"f1", size.f1}, {"f2", size.f2}, {"cores", layouts}};
     stream << object.dump() << '\n';
 }
 
@@ -111,7 +115,7 @@ void addInfoCommand(CLI::App& app, std::ostream& results) {
     command->add_flag("--json", options->json, "Print one JSON object instead of text");
     command->callback([options, &results] {
         if (options->K) {
-            (options->json ? printSizeJson : printSize)(results, blockSizeRow(*options->K, "K"));
+            (options->json ? printSizeJson : printSize)(results, knownBlockSize(*options->K, "K"));
         } else {
             (options->json ? printSizesJson : printSizes)(results);
         }

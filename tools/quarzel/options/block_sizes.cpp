@@ -7,30 +7,31 @@
 
 namespace quarzel::tool {
 
-const LteParams& blockSizeRow(std::uint64_t K, const std::string& subject) {
-    if (const LteParams* row = link::findBlockSize(K)) {
-        return *row;
+BlockSize knownBlockSize(std::uint64_t K, const std::string& subject) {
+    if (const auto size = findBlockSize(K)) {
+        return *size;
     }
     throw ToolError(ExitCode::usage, subject, fmt::format("{} is no block size of LTE", K),
                     "the nearest: " + link::nearestBlockSizesText(K));
 }
 
 std::uint32_t blockSizeOf(std::uint64_t positions, const std::string& where) {
-    if (const LteParams* row = link::findPositions(positions)) {
-        return row->K;
+    if (const auto size = link::findPositions(positions)) {
+        return size->K;
     }
     throw fileError(where, fmt::format("blocks of {} positions fit no block size", positions),
                     "the nearest that do: " + link::nearestPositionsText(positions));
 }
 
 std::vector<BlockSizeRange> blockSizeRanges() {
-    std::vector<BlockSizeRange> ranges = {{lteParams[0].K, lteParams[1].K, lteParams[1].K - lteParams[0].K}};
-    for (std::size_t row = 2; row < lteParams.size(); ++row) {
-        const std::uint32_t step = lteParams[row].K - lteParams[row - 1].K;
+    const std::vector<BlockSize> sizes = blockSizes();
+    std::vector<BlockSizeRange> ranges = {{sizes[0].K, sizes[1].K, sizes[1].K - sizes[0].K}};
+    for (std::size_t i = 2; i < sizes.size(); ++i) {
+        const std::uint32_t step = sizes[i].K - sizes[i - 1].K;
         if (step == ranges.back().step) {
-            ranges.back().last = lteParams[row].K;
+            ranges.back().last = sizes[i].K;
         } else {
-            ranges.push_back({lteParams[row].K, lteParams[row].K, step});
+            ranges.push_back({sizes[i].K, sizes[i].K, step});
         }
     }
     return ranges;

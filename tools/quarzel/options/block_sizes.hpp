@@ -9,10 +9,10 @@
 
 namespace quarzel::tool {
 
-/// The row of a block size that the user gave.
+/// The block size that the user gave.
 /// @param subject  the argument or option that he gave it with
 /// @throws ToolError naming the nearest valid ones when LTE has no such size
-const LteParams& blockSizeRow(std::uint64_t K, const std::string& subject);
+BlockSize knownBlockSize(std::uint64_t K, const std::string& subject);
 
 /// The block size K whose blocks have this many positions, K + 4, in each stream.
 /// @param where  the file, and the line when it is known, for the error message

@@ -2,6 +2,9 @@
 #pragma once
 
 #include <CLI/CLI.hpp>
+#include <string>
+
+#include "quarzel/core.hpp"
 
 namespace quarzel::tool {
 
@@ -10,14 +13,18 @@ struct CoreOptions {
     int units = 2;
     int algorithm = 1;
     int iterations = 6;
+    std::string implementation = implementations().front();
 };
+
+/// A core as chosen.
+Core coreOf(const CoreOptions& options);
 
 /// The checks of these options, for commands that take lists of them.
 CLI::Validator unitsCheck();
 CLI::Validator algorithmCheck();
 CLI::Validator iterationsCheck();
 
-/// Add --units, --algorithm and --iterations to a command.
+/// Add --units, --algorithm, --iterations and --implementation to a command.
 /// @param options  holds the defaults and receives the choice; must outlive the parse
 void addCoreOptions(CLI::App& command, CoreOptions& options);
 

@@ -48,7 +48,7 @@ bool Checkpoint::save(const sweep::Dispatcher& dispatcher) {
                     sweep::partText({dispatcher.configuration(), dispatcher.shard(), dispatcher.states()}));
         return true;
     } catch (const ToolError& error) {
-        if (!std::exchange(itsFailureIsTold, true)) {
+        if (!std::exchange(itsFailureIsReported, true)) {
             std::cerr << "quarzel: warning: the checkpoint could not be renewed: " << error.what() << '\n';
         }
         return false;

@@ -10,7 +10,7 @@
 
 namespace quarzel::tool {
 
-/// The file that keeps what a sweep has done, so that no interruption loses it.
+/// The file that keeps what a sweep has done, so that an interruption loses nothing.
 class Checkpoint {
   public:
     using Clock = std::chrono::steady_clock;
@@ -19,24 +19,24 @@ class Checkpoint {
     /// @param period  how often it is renewed
     Checkpoint(std::string file, std::chrono::seconds period);
 
-    /// Throw a ToolError when it could not be written.
+    /// @throws ToolError when it could not be written
     void probe() const;
 
-    /// Whether there is one from an earlier run.
+    /// Whether an earlier run has left one.
     bool exists() const;
 
-    /// What an earlier run has left.
+    /// Read what an earlier run has left.
     /// @throws ToolError when it is broken or belongs to another run
     sweep::Part load(const sweep::Configuration& configuration, const sweep::Shard& shard) const;
 
-    /// Renew it when it is time. A failure is told on standard error, once, and does not stop the sweep.
+    /// Renew it when it is due. A failure is reported on standard error, once, and does not stop the sweep.
     void update(const sweep::Dispatcher& dispatcher, Clock::time_point now = Clock::now());
 
     /// Renew it now.
     /// @return whether it could be
     bool save(const sweep::Dispatcher& dispatcher);
 
-    /// Remove it: it has served its purpose.
+    /// Remove it, since the sweep is done.
     void remove() const;
 
     const std::string& file() const { return itsFile; }
@@ -45,7 +45,7 @@ class Checkpoint {
     std::string itsFile;
     std::chrono::seconds itsPeriod;
     Clock::time_point itsNextTime;
-    bool itsFailureIsTold = false;
+    bool itsFailureIsReported = false;
 };
 
 }  // namespace quarzel::tool

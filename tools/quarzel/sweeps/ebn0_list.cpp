@@ -16,7 +16,7 @@ namespace quarzel::tool {
 
 namespace {
 
-constexpr std::int64_t mostValues = 10000;
+constexpr std::int64_t maxValues = 10000;
 constexpr std::size_t decimals = 6;
 
 /// A decimal number in millionths.
@@ -34,7 +34,7 @@ std::int64_t readDecibels(const std::string& option, std::string_view text) {
     const std::string_view whole = rest.substr(0, point);
     std::string fraction(rest.substr(std::min(point + 1, rest.size())));
     if (whole.empty() && fraction.empty()) {
-        throw fail("is no number of dB");
+        throw fail("is not a number of dB");
     }
     if (fraction.size() > decimals) {
         throw fail("has more than 6 decimals");
@@ -43,7 +43,7 @@ std::int64_t readDecibels(const std::string& option, std::string_view text) {
     const std::optional<std::uint64_t> decibels = whole.empty() ? 0 : readWholeNumber(whole);
     const std::optional<std::uint64_t> millionths = readWholeNumber(fraction);
     if (!decibels || !millionths) {
-        throw fail("is no number of dB");
+        throw fail("is not a number of dB");
     }
     if (*decibels > 1000) {
         throw fail("lies outside -20 to 40 dB");
@@ -58,7 +58,7 @@ void appendRange(const std::string& option, std::string_view item, const std::ve
         return ToolError(ExitCode::usage, option, fmt::format("the range '{}' {}", item, why), remedy);
     };
     if (parts.size() != 3) {
-        throw fail("has not three parts", "write FIRST:STEP:LAST");
+        throw fail("does not have three parts", "write FIRST:STEP:LAST");
     }
     const std::int64_t first = readDecibels(option, parts[0]);
     const std::int64_t step = readDecibels(option, parts[1]);
@@ -69,8 +69,8 @@ void appendRange(const std::string& option, std::string_view item, const std::ve
     if ((last > first && step < 0) || (last < first && step > 0)) {
         throw fail("never ends: its step leads away from its last value", "give a step with the other sign");
     }
-    if ((last - first) / step >= mostValues) {
-        throw fail(fmt::format("has {} values, more than {}", (last - first) / step + 1, mostValues),
+    if ((last - first) / step >= maxValues) {
+        throw fail(fmt::format("has {} values, more than {}", (last - first) / step + 1, maxValues),
                    "make it shorter or its step larger");
     }
     for (std::int64_t i = 0; i <= (last - first) / step; ++i) {

@@ -6,7 +6,7 @@
 namespace quarzel::tool {
 
 /// While it lives, the first SIGINT or SIGTERM is noted and does not end the process; one that comes more
-/// than a second later does. One at a time.
+/// than a second later does. There may be one of these at a time.
 class Interruption {
   public:
     Interruption();

@@ -22,16 +22,16 @@ std::string durationText(double seconds) {
     return fmt::format("{}:{:02}:{:02}", whole / 3600, whole / 60 % 60, whole % 60);
 }
 
-/// Blocks that a point will have at the most likely, from what it has.
+/// The blocks that a point will probably have at its end, from what it has now.
 double expectedBlocks(const sweep::PointState& point, const sweep::Configuration& configuration,
                       double shards) {
-    const double most = static_cast<double>(configuration.maxBlocks) / shards;
+    const double maxBlocks = static_cast<double>(configuration.maxBlocks) / shards;
     const auto errors = static_cast<double>(point.last().blockErrors);
     if (configuration.maxBlockErrors == 0 || errors == 0) {
-        return most;
+        return maxBlocks;
     }
     const auto wanted = static_cast<double>(configuration.maxBlockErrors);
-    return std::min(most, static_cast<double>(point.blocks) * wanted / errors);
+    return std::min(maxBlocks, static_cast<double>(point.blocks) * wanted / errors);
 }
 
 }  // namespace
@@ -50,7 +50,7 @@ void LiveTable::draw(const std::string& row, char end) {
     itsTerminal << row.substr(0, room) << wipe << end;
 }
 
-/// The speed of a point, the time that it has taken and the time that is left for it.
+/// The speed of a point, the time it has taken and the time that is left.
 std::string LiveTable::timesOf(const sweep::PointState& point, const sweep::Dispatcher& dispatcher,
                                const sweep::Curve& curve) const {
     if (point.seconds <= 0 || point.blocks == 0) {

@@ -10,8 +10,8 @@
 
 namespace quarzel::tool {
 
-/// A table that shows the user of a terminal how a sweep comes along: a row for each point that has ended,
-/// and one that changes for the point at work.
+/// A table on a terminal that shows the progress of a sweep: a row for each point that has ended, and one for
+/// the current point, which changes.
 class LiveTable {
   public:
     using Clock = std::chrono::steady_clock;
@@ -25,7 +25,7 @@ class LiveTable {
     LiveTable& operator=(const LiveTable&) = delete;
     ~LiveTable();
 
-    /// Show how far the sweep is. Cheap: draws five times a second at most, except for points that have
+    /// Show how far the sweep is. Cheap: it draws at most five times a second, and the points that have
     /// ended.
     void update(const sweep::Dispatcher& dispatcher, Clock::time_point now = Clock::now());
 
@@ -40,7 +40,7 @@ class LiveTable {
     std::size_t itsWidth;
     Clock::time_point itsNextDrawing;
     std::size_t itsPointsDrawn = 0;
-    std::size_t itsHeadingsDrawn = 0;  ///< of how many curves
+    std::size_t itsHeadingsDrawn = 0;  ///< for this many curves
 };
 
 }  // namespace quarzel::tool

@@ -7,7 +7,7 @@
 namespace quarzel::tool {
 
 /// Add `quarzel merge`, which joins the parts of a sweep.
-/// @param results  where it writes what it tells; must outlive the parse
+/// @param results  where it writes its report; must outlive the parse
 void addMergeCommand(CLI::App& app, std::ostream& results);
 
 }  // namespace quarzel::tool

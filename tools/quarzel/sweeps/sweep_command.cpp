@@ -28,7 +28,7 @@ struct Options {
     std::optional<std::string> checkpoint;
     std::uint64_t checkpointSeconds = 30;
     bool resume = false;
-    unsigned threads = 0;  // as is usual
+    unsigned threads = 0;  // the usual number
     SweepForm form = SweepForm::table;
 
     bool isShard() const { return sweep.shard != "1/1"; }
@@ -39,8 +39,8 @@ constexpr const char* description = "Simulate a link: error rates over Eb/N0";
 constexpr const char* footer = R"(A point is a block size, a core and an Eb/N0. Its blocks of random bits are
 encoded, sent as -1 and +1 with white Gaussian noise, quantised to the 8 bits of
 the core, decoded and compared. Eb/N0 is for an information bit at rate 1/3: the
-noise has the variance 1.5 / (Eb/N0), 12 tail bits not counted. All cores and
-quantisers get the same bits and the same noise.
+noise has the variance 1.5 / (Eb/N0); the 12 tail bits are not counted. All
+cores and quantisers get the same bits and the same noise.
 
 The result depends on nothing but the options above --shard: not on threads,
 parts, interruptions or the machine. (With --max-time it depends on the clock.)
@@ -48,8 +48,8 @@ The interval holds the true block error rate with a probability of 95 %.
 
 Files:
   OUT         the result, JSON: for 'quarzel plot' and 'quarzel verify-result'.
-              With --shard a part of it, for 'quarzel merge'. It is written
-              whole or not at all, at the end.
+              With --shard a part of it, for 'quarzel merge'. It is written at
+              the end, whole or not at all.
   FILE        what is done so far, renewed while the sweep runs and when it is
               interrupted (SIGINT, SIGTERM), removed at the end. --resume goes
               on from it, or begins at the beginning when there is none.
@@ -65,7 +65,7 @@ void checkOptions(const Options& options, const Checkpoint& checkpoint) {
         throw ToolError(ExitCode::usage, "-o", "the name of the file is empty", "give one");
     }
     if (options.isShard() && !options.output) {
-        throw ToolError(ExitCode::usage, "--shard", "a part is of use only in a file", "name one with -o");
+        throw ToolError(ExitCode::usage, "--shard", "a part is only useful in a file", "name one with -o");
     }
     if (options.resume && checkpoint.file().empty()) {
         throw ToolError(ExitCode::usage, "--resume", "there is no file to go on from",
@@ -84,7 +84,7 @@ void checkOptions(const Options& options, const Checkpoint& checkpoint) {
     checkpoint.probe();
 }
 
-/// What the output holds, if it is there and --resume has nothing else to go on from.
+/// What the output holds, if it exists and --resume has no checkpoint to go on from.
 std::optional<sweep::Result> finishedResult(const Options& options, const Checkpoint& checkpoint,
                                             const sweep::Configuration& configuration,
                                             const sweep::Shard& shard) {
@@ -122,7 +122,7 @@ std::optional<sweep::Result> finishedResult(const Options& options, const Checkp
     throw ToolError(ExitCode::interrupted, "", problem, "go on with the same command and --resume");
 }
 
-/// What the user can do, beyond what the failure itself tells, when the result could not be written.
+/// What the user can do, beyond what the failure itself says, when the result could not be written.
 const char* remedyForResult(bool isKept, const Checkpoint& checkpoint) {
     if (isKept) {
         return "the sweep is done: --resume then writes it at once";
@@ -130,7 +130,7 @@ const char* remedyForResult(bool isKept, const Checkpoint& checkpoint) {
     return checkpoint.exists() ? "--resume then goes on from what was kept" : "the sweep then begins anew";
 }
 
-/// Write the output of a finished sweep. What it is written from stays until it is there.
+/// Write the output of a finished sweep. The checkpoint stays until the output is there.
 void writeResult(const Options& options, const sweep::Dispatcher& dispatcher, const sweep::Result& result,
                  Checkpoint& checkpoint) {
     if (options.output) {

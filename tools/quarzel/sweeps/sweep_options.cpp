@@ -58,7 +58,7 @@ sweep::Configuration configurationOf(const SweepOptions& options) {
     sweep::Configuration configuration;
     configuration.blockSizes.clear();
     for (const std::uint64_t K : options.blockSizes) {
-        configuration.blockSizes.push_back(blockSizeRow(K, "--block-size").K);
+        configuration.blockSizes.push_back(knownBlockSize(K, "--block-size").K);
     }
     configuration.units = options.units;
     configuration.algorithms = options.algorithms;
@@ -79,7 +79,7 @@ sweep::Configuration configurationOf(const SweepOptions& options) {
 }
 
 sweep::Shard shardOf(const SweepOptions& options) {
-    constexpr std::uint64_t mostShards = 1'000'000;
+    constexpr std::uint64_t maxShards = 1'000'000;
     const std::size_t slash = options.shard.find('/');
     const ToolError bad(ExitCode::usage, "--shard", fmt::format("'{}' is not I/N", options.shard),
                         "give the number of the part, from 1, and how many there are, as 1/8");
@@ -89,12 +89,12 @@ sweep::Shard shardOf(const SweepOptions& options) {
     const std::string_view text = options.shard;
     const std::optional<std::uint64_t> number = readWholeNumber(text.substr(0, slash));
     const std::optional<std::uint64_t> count = readWholeNumber(text.substr(slash + 1));
-    if (!number || !count || *number < 1 || *number > *count || *count > mostShards) {
+    if (!number || !count || *number < 1 || *number > *count || *count > maxShards) {
         throw bad;
     }
     if (*count > 1 && options.maxSeconds != 0) {
-        throw ToolError(ExitCode::usage, "--max-time", "parts that time has stopped do not fit together",
-                        "leave it out, or --shard");
+        throw ToolError(ExitCode::usage, "--max-time", "parts that end by time cannot be joined",
+                        "leave out --max-time or --shard");
     }
     return {*number - 1, *count};
 }

@@ -10,7 +10,7 @@
 
 namespace quarzel::tool {
 
-/// What the user of a sweep chooses; Eb/N0 and shard as text.
+/// The options of a sweep; Eb/N0 and shard as text.
 struct SweepOptions {
     std::vector<std::uint64_t> blockSizes = {1024};
     std::vector<int> units = {2};
@@ -26,7 +26,7 @@ struct SweepOptions {
     std::string shard = "1/1";
 };
 
-/// Add the options that decide a sweep's result, and --shard.
+/// Add the options that the result of a sweep depends on, and --shard.
 /// @param options  holds the defaults and receives the choice; must outlive the parse
 void addSweepOptions(CLI::App& command, SweepOptions& options);
 

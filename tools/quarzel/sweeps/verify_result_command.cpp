@@ -19,7 +19,7 @@ namespace {
 
 struct Options {
     std::string file;
-    unsigned threads = 0;  // as is usual
+    unsigned threads = 0;  // the usual number
 };
 
 constexpr const char* description = "Run the sweep of a result file again";
@@ -28,7 +28,7 @@ constexpr const char* footer =
     R"(RESULT is a file that 'quarzel sweep -o' or 'quarzel merge -o' has written. Its
 sweep is run once more, which takes as long as it took, and the two files are
 compared byte by byte. Points that --max-time has ended get the same number of
-blocks.
+blocks. The file may come from another version of quarzel.
 
 Example:
   quarzel verify-result result.json
@@ -73,7 +73,7 @@ ExitCode verify(const Options& options, std::ostream& results, const MakeWorkers
         throw ToolError(ExitCode::interrupted, options.file, "the verification was interrupted",
                         "run it again");
     }
-    const sweep::Result again{stored.configuration, dispatcher.states()};
+    const sweep::Result again{stored.configuration, dispatcher.states(), stored.quarzel};
     if (sweep::resultText(again) == text) {
         results << fmt::format("{}: the same byte for byte, {} points with {} blocks\n", options.file,
                                stored.points.size(), blocks);

@@ -10,9 +10,9 @@
 namespace quarzel::tool {
 
 /// Add `quarzel verify-result`, which runs the sweep of a result file again.
-/// @param results   where it writes what it tells; must outlive the parse
-/// @param exitCode  receives ExitCode::resultsDiffer when the result comes out otherwise; must outlive the
-/// parse
+/// @param results   where it writes its report; must outlive the parse
+/// @param exitCode  receives ExitCode::resultsDiffer when the result comes out different; must outlive
+/// the parse
 void addVerifyResultCommand(CLI::App& app, std::ostream& results, ExitCode& exitCode,
                             MakeWorkers makeWorkers);
 

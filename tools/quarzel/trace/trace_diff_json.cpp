@@ -33,7 +33,7 @@ void addFirstValue(Json& object, const TraceDifference& first) {
     object["code"] = table.siso ? Json(constituentCode(*table.siso)) : Json();
     object["step"] = table.stepOf(*first.index);
     object["signal"] = column.signal;
-    object["state"] = column.index < 0 ? Json() : Json(column.index);
+    object["state"] = orNull(column.number);
     object["value_a"] = valueOf(*first.a, *first.index);
     object["value_b"] = valueOf(*first.b, *first.index);
     object["further"] = first.values - 1;

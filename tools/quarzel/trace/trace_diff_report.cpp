@@ -4,11 +4,11 @@
 #include <fmt/format.h>
 
 #include <algorithm>
+#include <array>
 #include <iterator>
 #include <string_view>
 #include <vector>
 
-#include "engine/dump_columns.hpp"
 #include "report_text.hpp"
 
 namespace quarzel::tool {
@@ -23,25 +23,20 @@ std::string valuesThatDiffer(std::size_t number, std::string_view where) {
                        number == 1 ? "differs" : "differ");
 }
 
+/// The element of the core's record of branch metrics that is in the column g4, g5, g6 or g7.
+unsigned branchElement(unsigned column) {
+    constexpr std::array<unsigned, 4> elements = {2, 1, 3, 0};
+    return elements[column - 4];
+}
+
 std::string meaningOf(const TraceTable& table, std::size_t column) {
-    if (!table.siso) {
-        return traceStreams[column].meaning;
+    const auto [signal, description, number] = table.column(column);
+    if (!number) {
+        return description;
     }
-    const auto& [signal, index, firstOfGroup] = traceColumns[column];
-    switch (signal[0]) {
-        case 'i':
-            return "intrinsic value";
-        case 'a':
-            return fmt::format("forward metric of state {}", index);
-        case 'b':
-            return fmt::format("backward metric of state {}", index);
-        case 'g':
-            return fmt::format("branch metric, element {}", branchColumns[index - 4]);
-        case 'l':
-            return "log-likelihood ratio";
-        default:
-            return "extrinsic value";
-    }
+    return signal == std::string_view("g")
+               ? fmt::format("{}, element {}", description, branchElement(*number))
+               : fmt::format("{} of state {}", description, *number);
 }
 
 /// The columns that belong to the signal of a column.
@@ -50,8 +45,8 @@ std::vector<std::size_t> columnsOfSignal(const TraceTable& table, std::size_t co
         return {column};
     }
     std::vector<std::size_t> columns;
-    for (std::size_t other = 0; other < traceColumns.size(); ++other) {
-        if (std::string_view(traceColumns[other].signal) == traceColumns[column].signal) {
+    for (std::size_t other = 0; other < passColumns().size(); ++other) {
+        if (std::string_view(passColumns()[other].signal) == passColumns()[column].signal) {
             columns.push_back(other);
         }
     }
@@ -83,7 +78,7 @@ void printContext(std::string& text, const TraceTable& a, const TraceTable& b, s
     const std::size_t step = a.stepOf(index);
     text += "\nstep    ";
     for (const std::size_t column : columns) {
-        fmt::format_to(std::back_inserter(text), " {:12}", headingOf(a.column(column)));
+        fmt::format_to(std::back_inserter(text), " {:12}", a.column(column).heading());
     }
     endRow(text);
     for (std::size_t s = step - std::min(step, contextSteps); s < std::min(steps, step + contextSteps + 1);
@@ -91,8 +86,10 @@ void printContext(std::string& text, const TraceTable& a, const TraceTable& b, s
         for (const bool isA : {true, false}) {
             fmt::format_to(std::back_inserter(text), "{:4}  {} ", s, isA ? 'A' : 'B');
             for (const std::size_t column : columns) {
-                const std::int16_t wordA = a.values[a.indexOf(s, column)];
-                appendMarkedReal(text, isA ? wordA : b.values[b.indexOf(s, column)], wordA, traceFormat());
+                const double realA = a.real(a.indexOf(s, column));
+                const double realB = b.real(b.indexOf(s, column));
+                fmt::format_to(std::back_inserter(text), "{}{:<+12.6f}", isA || realA == realB ? ' ' : '*',
+                               isA ? realA : realB);
             }
             endRow(text);
         }
@@ -118,7 +115,7 @@ void printFirstValue(std::string& text, const TraceDifference& first) {
         reportLine(text, "pass", "none: soft inputs of the block");
     }
     reportLine(text, "step", fmt::format("{} of 0 to {}", a.stepOf(index), a.steps - 1));
-    reportLine(text, "signal", fmt::format("{}: {}", headingOf(a.column(column)), meaningOf(a, column)));
+    reportLine(text, "signal", fmt::format("{}: {}", a.column(column).heading(), meaningOf(a, column)));
     reportLine(text, "value in A", valueText(a, index));
     reportLine(text, "value in B", valueText(b, index));
     reportLine(text, "further",

@@ -1,50 +1,48 @@
 // SPDX-License-Identifier: MIT
 #include "trace/trace_file.hpp"
 
-#include <utility>
+#include <string>
 
 namespace quarzel::tool {
 
 TraceFile::TraceFile(const TraceOptions& options, std::ostream& results)
-    : itsBuffer([this, &results](std::string_view text) {
-          if (itsFile) {
-              itsFile->write(text);
-          } else {
-              results.write(text.data(), static_cast<std::streamsize>(text.size()));
-          }
-      }),
-      itsStream(&itsBuffer) {
+    : itsOptions(options), itsResults(results) {
     if (!options.isToStandardOutput()) {
         itsFile.emplace(options.file);
     }
-    itsWriter = makeTraceWriter(options.form, itsStream);
+    if (options.form != "text") {
+        itsRows.emplace(options.form == "csv" ? csvRows : jsonRows,
+                        [this](std::string_view text) { write(text); });
+    }
+}
+
+void TraceFile::start(Core& core) {
+    if (itsRows) {
+        core.passes(*itsOptions.passes, [this](const vardel_ip_quarzel_pass& pass) { itsRows->add(pass); });
+    } else {
+        core.trace(*itsOptions.passes);
+    }
+}
+
+void TraceFile::writeLine(std::string_view line) {
+    write(std::string(line) + '\n');
 }
 
 void TraceFile::finish() {
-    itsWriter->end();
-    check();
+    if (itsRows) {
+        itsRows->end();
+    }
     if (itsFile) {
         itsFile->finish();
     }
 }
 
-void TraceFile::Buffer::check() const {
-    if (itsFailure) {
-        std::rethrow_exception(itsFailure);
+void TraceFile::write(std::string_view text) {
+    if (itsFile) {
+        itsFile->write(text);
+    } else {
+        itsResults.write(text.data(), static_cast<std::streamsize>(text.size()));
     }
-}
-
-std::streamsize TraceFile::Buffer::xsputn(const char* text, std::streamsize size) {
-    if (itsFailure) {
-        return 0;
-    }
-    try {
-        itsWrite({text, static_cast<std::size_t>(size)});
-    } catch (...) {
-        itsFailure = std::current_exception();
-        return 0;
-    }
-    return size;
 }
 
 }  // namespace quarzel::tool

@@ -1,58 +1,45 @@
 // SPDX-License-Identifier: MIT
 #pragma once
 
-#include <exception>
-#include <functional>
-#include <memory>
 #include <optional>
 #include <ostream>
-#include <streambuf>
-#include <string>
 #include <string_view>
 
 #include "files/output_file.hpp"
+#include "quarzel/core.hpp"
 #include "trace/trace_options.hpp"
-#include "trace/trace_writer.hpp"
+#include "trace/trace_rows.hpp"
 
 namespace quarzel::tool {
 
-/// Where the trace of a decode goes, and its writer. Nothing of it is kept in memory. A file is whole or not
-/// there.
+/// Where the trace of a decode goes. Nothing of it is kept in memory. A file is whole or not there.
 class TraceFile {
   public:
+    /// @param options  must outlive it
     /// @param results  standard output
     /// @throws ToolError when the file cannot be made
     TraceFile(const TraceOptions& options, std::ostream& results);
+    TraceFile(const TraceFile&) = delete;
+    TraceFile& operator=(const TraceFile&) = delete;
 
-    TraceWriter& writer() { return *itsWriter; }
+    /// Trace the next passes of a core. The lines of a text trace come as messages; the core's handler is to
+    /// hand them on. What cannot be written is thrown by the decode.
+    void start(Core& core);
 
-    /// Tell what could not be written. A decoder that is at work can tell nobody.
-    /// @throws ToolError when there is such a thing
-    void check() const { itsBuffer.check(); }
+    /// Write a line of a text trace.
+    void writeLine(std::string_view line);
 
     /// Put the whole trace in its place.
     /// @throws ToolError when that fails
     void finish();
 
   private:
-    /// Hands on what it is given, at once, and keeps the first failure.
-    class Buffer : public std::streambuf {
-      public:
-        explicit Buffer(std::function<void(std::string_view)> write) : itsWrite(std::move(write)) {}
-        void check() const;
+    void write(std::string_view text);
 
-      protected:
-        std::streamsize xsputn(const char* text, std::streamsize size) override;
-
-      private:
-        std::function<void(std::string_view)> itsWrite;
-        std::exception_ptr itsFailure;
-    };
-
+    const TraceOptions& itsOptions;
+    std::ostream& itsResults;
     std::optional<OutputFile> itsFile;  ///< none: standard output
-    Buffer itsBuffer;
-    std::ostream itsStream;
-    std::unique_ptr<TraceWriter> itsWriter;
+    std::optional<TraceRows> itsRows;   ///< none: text
 };
 
 }  // namespace quarzel::tool

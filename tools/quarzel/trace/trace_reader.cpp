@@ -39,7 +39,7 @@ bool takeNumber(std::string_view& text, Number& number) {
 /// A soft input, which a trace shows as a word.
 std::optional<std::int16_t> inputWord(std::string_view text) {
     std::int16_t word = 0;
-    if (!takeNumber(text, word) || !text.empty() || (word & ~traceFormat().mask) != 0) {
+    if (!takeNumber(text, word) || !text.empty() || word % 16 != 0) {
         return std::nullopt;
     }
     return word;
@@ -47,17 +47,16 @@ std::optional<std::int16_t> inputWord(std::string_view text) {
 
 /// The word of a real number.
 std::optional<std::int16_t> realWord(std::string_view text) {
-    const TNumberFormat& format = traceFormat();
     double real = 0;
     if ((take(text, "+") && text.starts_with('-')) || !takeNumber(text, real) || !text.empty()) {
         return std::nullopt;
     }
-    const double q = real * format.scale;
+    const double raw = real * 8;
     // What is no number fails the first comparison.
-    if (!(q >= format.minQ && q <= format.maxQ) || q != static_cast<std::int32_t>(q)) {
+    if (!(raw >= -2048 && raw <= 2047) || raw != static_cast<int>(raw)) {
         return std::nullopt;
     }
-    return format.toWord(static_cast<std::int32_t>(q));
+    return static_cast<std::int16_t>(static_cast<int>(raw) * 16);
 }
 
 bool isRuler(std::string_view line) {
@@ -68,8 +67,8 @@ bool isTableHeading(std::string_view line) {
     if (takeWord(line) != "n") {
         return false;
     }
-    for (const TraceColumn& column : traceColumns) {
-        if (takeWord(line) != headingOf(column)) {
+    for (const TraceColumn& column : passColumns()) {
+        if (takeWord(line) != column.heading()) {
             return false;
         }
     }
@@ -175,7 +174,7 @@ void TraceReader::readPassHeading() {
 TraceTable TraceReader::readPass() {
     itsPassIsPending = false;
     TraceTable pass = itsPass;
-    pass.values.reserve(pass.steps * traceColumnCount);
+    pass.values.reserve(pass.steps * passColumns().size());
     for (std::uint32_t step = 0; step < pass.steps; ++step) {
         if (itsTerminationOptional && step + 3 == pass.steps &&
             (itsLines.text().empty() || isRuler(itsLines.text()))) {
@@ -192,22 +191,22 @@ void TraceReader::readRow(std::uint32_t step, std::vector<std::int16_t>& values)
     if (!takeNumber(line, number) || number != step) {
         itsLines.fail(fmt::format("step {} of 0 to {}", step, itsPass.steps - 1));
     }
-    for (const TraceColumn& column : traceColumns) {
+    for (const TraceColumn& column : passColumns()) {
         const std::string_view word = takeWord(line);
         if (word.empty()) {
-            itsLines.fail("", fmt::format("a row that ends before column {}", headingOf(column)),
-                          fmt::format("a step and {} values", traceColumnCount));
+            itsLines.fail("", fmt::format("a row that ends before column {}", column.heading()),
+                          fmt::format("a step and {} values", passColumns().size()));
         }
         const auto value = realWord(word);
         if (!value) {
-            itsLines.fail(", column " + headingOf(column), fmt::format("'{}'", word),
+            itsLines.fail(", column " + column.heading(), fmt::format("'{}'", word),
                           "a multiple of 0.125 from -256 to 255.875");
         }
         values.push_back(*value);
     }
     if (!takeWord(line).empty()) {
         itsLines.fail("", "a row with more columns than ext",
-                      fmt::format("a step and {} values", traceColumnCount));
+                      fmt::format("a step and {} values", passColumns().size()));
     }
     itsLines.advance();
 }

@@ -3,85 +3,68 @@
 
 #include <fmt/format.h>
 
+#include <array>
 #include <iterator>
-
-#include "fixed/text_output.hpp"
-#include "trace/trace_table.hpp"
+#include <utility>
 
 namespace quarzel::tool {
 
 namespace {
 
-std::string numberOr(const char* nothing, const std::optional<unsigned>& number) {
+std::string textOr(const char* nothing, const std::optional<unsigned>& number) {
     return number ? std::to_string(*number) : nothing;
-}
-
-std::optional<unsigned> stateOf(const TraceColumn& column) {
-    return column.index < 0 ? std::nullopt : std::optional(static_cast<unsigned>(column.index));
-}
-
-void appendCsv(std::string& text, const TraceValue& value) {
-    fmt::format_to(std::back_inserter(text), "{},{},{},{},{},{},{:.6f}\n", value.block,
-                   numberOr("", value.pass), value.step, value.column.signal,
-                   numberOr("", stateOf(value.column)), value.raw, value.real);
-}
-
-void appendJson(std::string& text, const TraceValue& value) {
-    fmt::format_to(std::back_inserter(text),
-                   R"({{"block":{},"pass":{},"step":{},"signal":"{}","state":{},"raw":{},"real":{:.6f}}})",
-                   value.block, numberOr("null", value.pass), value.step, value.column.signal,
-                   numberOr("null", stateOf(value.column)), value.raw, value.real);
 }
 
 }  // namespace
 
-const TraceRowForm csvRows = {"block,pass,step,signal,state,raw,real\n", "", "", appendCsv};
-const TraceRowForm jsonRows = {"[\n", ",\n", "\n]\n", appendJson};
+const TraceRowForm csvRows = {"block,pass,step,signal,state,raw,real\n", "", "", "{},{},{},{},{},{},{:.6f}\n",
+                              ""};
+const TraceRowForm jsonRows = {
+    "[\n", ",\n", "\n]\n",
+    R"({{"block":{},"pass":{},"step":{},"signal":"{}","state":{},"raw":{},"real":{:.6f}}})", "null"};
 
-TraceRowWriter::TraceRowWriter(std::ostream& stream, const TraceRowForm& form)
-    : itsStream(stream), itsForm(form), itsSeparator("") {
-    itsText = itsForm.start;
-    write();
+TraceRows::TraceRows(const TraceRowForm& form, Write write) : itsForm(form), itsWrite(std::move(write)) {
+    itsWrite(itsForm.start);
 }
 
-void TraceRowWriter::writeInputs(const TraceDecoder& decoder) {
-    for (std::size_t number = 0; number < traceStreams.size(); ++number) {
-        const TraceColumn column{traceStreams[number].signal, -1, false};
-        std::uint32_t step = 0;
-        for (const std::int16_t word : decoder.stream(number)) {
-            append(decoder, std::nullopt, step++, column, word);
-            write();
-        }
+void TraceRows::add(const vardel_ip_quarzel_pass& pass) {
+    if (pass.pass == 0) {
+        addInputs(pass);
     }
-}
-
-void TraceRowWriter::writePass(TraceDecoder& decoder, unsigned siso) {
-    const auto steps = static_cast<std::uint32_t>(decoder.llr().size());
-    for (std::uint32_t step = 0; step < steps; ++step) {
-        const TraceRow row = decoder.traceRow(step);
-        for (std::size_t column = 0; column < row.size(); ++column) {
-            append(decoder, siso, step, traceColumns[column], row[column]);
+    const std::array<const std::int16_t*, 6> signalWords = {pass.intrinsic, pass.alpha, pass.beta,
+                                                            pass.gamma,     pass.llr,   pass.extrinsic};
+    const std::vector<Signal> all = signals();
+    for (std::uint32_t step = 0; step < pass.steps; ++step) {
+        auto column = passColumns().begin();
+        for (std::size_t signal = 0; signal < signalWords.size(); ++signal) {
+            const std::int16_t* words = signalWords[signal] + step * all[signal].width;
+            for (unsigned i = 0; i < all[signal].width; ++i) {
+                append({pass.block + 1, pass.pass, step}, *column++, words[i]);
+            }
         }
         write();
     }
 }
 
-void TraceRowWriter::end() {
-    itsText = itsForm.end;
-    write();
+void TraceRows::addInputs(const vardel_ip_quarzel_pass& pass) {
+    for (std::size_t i = 0; i < traceStreams.size(); ++i) {
+        const TraceColumn column{traceStreams[i].signal, traceStreams[i].description, std::nullopt};
+        for (std::uint32_t step = 0; step < pass.steps; ++step) {
+            append({pass.block + 1, std::nullopt, step}, column, pass.inputs[i / 3][i % 3][step]);
+        }
+        write();
+    }
 }
 
-void TraceRowWriter::append(const TraceDecoder& decoder, std::optional<unsigned> pass, std::uint32_t step,
-                            const TraceColumn& column, std::int16_t word) {
-    itsText += itsSeparator;
-    itsSeparator = itsForm.separator;
-    const TNumberFormat& format = decoder.format();
-    itsForm.append(itsText, {decoder.decodeCount() + 1, pass, step, column, format.toInteger(word),
-                             format.toReal(word)});
+void TraceRows::append(const Place& place, const TraceColumn& column, std::int16_t word) {
+    itsText += std::exchange(itsSeparator, itsForm.separator);
+    fmt::format_to(std::back_inserter(itsText), fmt::runtime(itsForm.row), place.block,
+                   textOr(itsForm.nothing, place.pass), place.step, column.signal,
+                   textOr(itsForm.nothing, column.number), rawOf(word), realOf(word));
 }
 
-void TraceRowWriter::write() {
-    writeText(itsStream, itsText);
+void TraceRows::write() {
+    itsWrite(itsText);
     itsText.clear();
 }
 

@@ -2,54 +2,57 @@
 #pragma once
 
 #include <cstdint>
+#include <functional>
 #include <optional>
-#include <ostream>
 #include <string>
+#include <string_view>
 
-#include "decoder/trace_columns.hpp"
-#include "trace/trace_writer.hpp"
+#include "quarzel/core.hpp"
+#include "trace/trace_table.hpp"
 
 namespace quarzel::tool {
 
-/// A value of a trace, as a row for other programs.
-struct TraceValue {
-    std::uint64_t block;           ///< number of the block, from 1
-    std::optional<unsigned> pass;  ///< none for soft inputs
-    std::uint32_t step;
-    TraceColumn column;
-    std::int32_t raw;  ///< in units of the number format
-    double real;       ///< what it stands for
-};
-
-/// A form in which rows are written.
+/// A form in which the values of a trace are written for other programs.
 struct TraceRowForm {
     const char* start;      ///< before the first row
     const char* separator;  ///< between two rows
     const char* end;        ///< after the last row
-    void (*append)(std::string& text, const TraceValue& value);
+    const char* row;        ///< a row, a format of block, pass, step, signal, number, raw and real value
+    const char* nothing;    ///< in the place of a pass or number that there is not
 };
 
 extern const TraceRowForm csvRows;
 extern const TraceRowForm jsonRows;
 
-/// Writes a trace as rows, one for each value, all those of a step or stream after one another.
-class TraceRowWriter : public TraceWriter {
+/// Writes passes as rows, one for each value, all those of a step or stream after one another. The soft
+/// inputs of a block come before its first pass.
+class TraceRows {
   public:
-    TraceRowWriter(std::ostream& stream, const TraceRowForm& form);
+    using Write = std::function<void(std::string_view text)>;
 
-    void writeInputs(const TraceDecoder& decoder) override;
-    void writePass(TraceDecoder& decoder, unsigned siso) override;
-    void end() override;
+    TraceRows(const TraceRowForm& form, Write write);
+
+    void add(const vardel_ip_quarzel_pass& pass);
+
+    /// Write what stands after the last row.
+    void end() { itsWrite(itsForm.end); }
 
   private:
-    void append(const TraceDecoder& decoder, std::optional<unsigned> pass, std::uint32_t step,
-                const TraceColumn& column, std::int16_t word);
+    /// Where a value stands.
+    struct Place {
+        unsigned long long block;  ///< number of the block, from 1
+        std::optional<unsigned> pass;
+        std::uint32_t step;
+    };
+
+    void addInputs(const vardel_ip_quarzel_pass& pass);
+    void append(const Place& place, const TraceColumn& column, std::int16_t word);
     void write();
 
-    std::ostream& itsStream;
     const TraceRowForm& itsForm;
-    const char* itsSeparator;  ///< before the next row
-    std::string itsText;       ///< rows to be written together
+    Write itsWrite;
+    const char* itsSeparator = "";  ///< before the next row
+    std::string itsText;            ///< rows to be written together
 };
 
 }  // namespace quarzel::tool

@@ -3,13 +3,18 @@
 
 namespace quarzel::tool {
 
-const TNumberFormat& traceFormat() {
-    static const TNumberFormat format(12, 3);
-    return format;
-}
-
-std::string headingOf(const TraceColumn& column) {
-    return column.index < 0 ? column.signal : column.signal + std::to_string(column.index);
+const std::vector<TraceColumn>& passColumns() {
+    static const std::vector<TraceColumn> columns = [] {
+        std::vector<TraceColumn> list;
+        for (const Signal& signal : signals()) {
+            for (unsigned i = 0; i < signal.width; ++i) {
+                const auto number = signal.width == 1 ? std::nullopt : std::optional(signal.first + i);
+                list.push_back({signal.name, signal.description, number});
+            }
+        }
+        return list;
+    }();
+    return columns;
 }
 
 }  // namespace quarzel::tool

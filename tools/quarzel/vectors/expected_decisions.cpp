@@ -126,8 +126,8 @@ ExpectedDecisions readCore(const std::string& name) {
 
 ExpectedDecisions readPacked(std::istream& stream, const std::string& file) {
     const NpyHeader header = readNpyHeader(stream, file);
-    if (header.shape.size() != 2 || header.shape[1] > lteParams.back().K / 8 ||
-        link::findBlockSize(8 * header.shape[1]) == nullptr) {
+    if (header.shape.size() != 2 || header.shape[1] > blockSizes().back().K / 8 ||
+        !findBlockSize(8 * header.shape[1])) {
         throw fileError(
             file, "has shape " + shapeText(header.shape),
             "expected bits have shape (blocks, K/8), 8 to a byte, as 'quarzel decode -o' makes them");

@@ -5,8 +5,8 @@
 #include <cstddef>
 #include <limits>
 
-#include "decode/core_layout.hpp"
 #include "link/encoder.hpp"
+#include "quarzel/code.hpp"
 
 namespace quarzel::tool {
 
@@ -49,9 +49,9 @@ std::vector<std::uint8_t> randomBits(const link::RandomSource& source, std::size
 
 std::vector<std::int8_t> overChannel(const link::QuantisedChannel& channel, const link::RandomSource& source,
                                      const std::vector<std::uint8_t>& codeBits) {
-    std::vector<int> soft(codeBits.size());
+    std::vector<std::int8_t> soft(codeBits.size());
     channel.transmit(source, codeBits.data(), 0, codeBits.size(), soft.data());
-    return {soft.begin(), soft.end()};
+    return soft;
 }
 
 /// Positions of every stream, from `first` to below `last`.
@@ -75,7 +75,7 @@ StimulusSource::StimulusSource(const VectorRequest& request)
     : itsSeed(request.seed), itsEbN0(request.ebN0), itsChannel(request.quantiser, request.ebN0) {}
 
 std::vector<std::int8_t> StimulusSource::make(const PlannedBlock& block, std::uint32_t units) const {
-    const std::size_t positions = block.blockSize + 4;
+    const std::size_t positions = block.blockSize + tailPositions;
     const link::RandomSource source(
         {itsSeed, block.blockSize, itsEbN0,
          static_cast<std::uint64_t>(block.stimulus) << stimulusShift | block.number});
@@ -85,7 +85,7 @@ std::vector<std::int8_t> StimulusSource::make(const PlannedBlock& block, std::ui
         replace(soft, range, overChannel(itsChannel, source, codeBits));
         return soft;
     };
-    const std::size_t steps = coreLayout(block.blockSize, units).steps;
+    const std::size_t steps = layout(block.blockSize, units).segment_steps;
     switch (block.stimulus) {
         case Stimulus::noise:
             return overChannel(itsChannel, source, codeWord(source));

@@ -3,11 +3,11 @@
 
 #include <fmt/format.h>
 
-#include <algorithm>
-#include <future>
 #include <mutex>
+#include <span>
 
-#include "decode/core_model.hpp"
+#include "link/parallel.hpp"
+#include "quarzel/core.hpp"
 #include "tool_error.hpp"
 
 namespace quarzel::tool {
@@ -15,15 +15,14 @@ namespace quarzel::tool {
 namespace {
 
 StimulusAndResponse makeBlock(const PlannedBlock& planned, const StimulusSource& source, int units,
-                              CoreModel& core) {
+                              Core& core) {
     StimulusAndResponse made{source.make(planned, static_cast<std::uint32_t>(units)),
                              std::vector<unsigned char>(planned.blockSize)};
-    const SoftBlock soft(made.soft.begin(), made.soft.end());
-    if (const auto failed = core.decode({&soft, 1}, planned.iterations, made.decisions)) {
-        throw ToolError(ExitCode::decodingFailed, "",
-                        fmt::format("a block of {} bits could not be decoded (status {})", planned.blockSize,
-                                    failed->status),
-                        "the line above says why");
+    try {
+        core.decode(softBlocks(std::span<const std::int8_t>(made.soft), made.soft.size() / 3),
+                    planned.iterations, made.decisions);
+    } catch (const Error& error) {
+        throw decodingError("", fmt::format("a block of {} bits", planned.blockSize), error);
     }
     return made;
 }
@@ -35,36 +34,15 @@ std::vector<StimulusAndResponse> makeBlocks(const std::vector<PlannedBlock>& pla
                                             unsigned threads,
                                             const std::function<void(std::size_t)>& progress) {
     std::vector<StimulusAndResponse> blocks(plan.size());
-    std::mutex mutex;
-    std::size_t next = 0;
+    std::mutex mutex;  // of what follows
     std::size_t done = 0;
-    const auto makeSome = [&] {
-        CoreModel core(units, algorithm);
-        for (std::unique_lock lock(mutex); next < plan.size();) {
-            const std::size_t block = next++;
-            lock.unlock();
-            StimulusAndResponse made = makeBlock(plan[block], source, units, core);
-            lock.lock();
-            blocks[block] = std::move(made);
-            progress(++done);
-        }
-    };
-    const auto work = [&] {
-        try {
-            makeSome();
-        } catch (...) {
+    link::forEachOnThreads(plan.size(), threads, [&] {
+        return [&, core = Core(CoreSettings{units, algorithm})](std::size_t block) mutable {
+            blocks[block] = makeBlock(plan[block], source, units, core);
             const std::lock_guard lock(mutex);
-            next = plan.size();  // the others need not go on
-            throw;
-        }
-    };
-    std::vector<std::future<void>> workers;
-    for (unsigned i = 0; i < std::max(1U, threads); ++i) {
-        workers.push_back(std::async(std::launch::async, work));
-    }
-    for (std::future<void>& worker : workers) {
-        worker.get();
-    }
+            progress(++done);
+        };
+    });
     return blocks;
 }
 

@@ -6,7 +6,7 @@
 #include <algorithm>
 #include <nlohmann/json.hpp>
 
-#include "interleaver/lte_params.hpp"
+#include "quarzel/code.hpp"
 #include "report_text.hpp"
 
 namespace quarzel::tool {
@@ -55,7 +55,7 @@ bool isLlr(const VectorRequest& request) {
 
 /// The block sizes as the option takes them.
 std::string sizesText(const std::vector<std::uint32_t>& sizes) {
-    return sizes.size() == lteParams.size() ? "all" : fmt::format("{}", fmt::join(sizes, ","));
+    return sizes.size() == blockSizes().size() ? "all" : fmt::format("{}", fmt::join(sizes, ","));
 }
 
 }  // namespace

@@ -6,8 +6,7 @@
 #include <limits>
 #include <nlohmann/json.hpp>
 
-#include "decode/core_layout.hpp"
-#include "interleaver/lte_params.hpp"
+#include "quarzel/code.hpp"
 #include "vectors/memory_names.hpp"
 
 namespace quarzel::tool {
@@ -17,11 +16,17 @@ namespace {
 using Json = nlohmann::ordered_json;
 using Limits = std::numeric_limits<std::int8_t>;
 
-/// The shapes that the blocks of all sizes have: window lengths of a segment.
+/// The window lengths of a segment.
+std::vector<std::uint32_t> shapeOf(std::uint32_t K, std::uint32_t units) {
+    const Layout layout = quarzel::layout(K, units);
+    return {layout.window_steps, layout.window_steps + layout.windows};
+}
+
+/// The shapes that the blocks of all sizes have.
 std::set<std::vector<std::uint32_t>> allShapes(std::uint32_t units) {
     std::set<std::vector<std::uint32_t>> shapes;
-    for (const LteParams& row : lteParams) {
-        shapes.insert(coreLayout(row.K, units).windows);
+    for (const BlockSize& size : blockSizes()) {
+        shapes.insert(shapeOf(size.K, units));
     }
     return shapes;
 }
@@ -40,7 +45,7 @@ Json countsOf(const std::map<Key, std::size_t>& counts) {
 void VectorCoverage::add(std::uint32_t K, int iterations, const std::string& stimulus,
                          const std::vector<std::int8_t>& soft, const std::vector<unsigned char>& decisions) {
     itsSizes.insert(K);
-    itsShapes.insert(coreLayout(K, itsUnits).windows);
+    itsShapes.insert(shapeOf(K, itsUnits));
     ++itsIterations[iterations];
     ++itsStimuli[stimulus];
     const std::size_t positions = soft.size() / itsStreams.size();
@@ -58,10 +63,10 @@ void VectorCoverage::add(std::uint32_t K, int iterations, const std::string& sti
 
 void VectorCoverage::countCorrections(std::uint32_t K, const std::vector<std::int8_t>& soft,
                                       const std::vector<unsigned char>& decisions) {
-    const CoreLayout layout = coreLayout(K, itsUnits);
+    const Layout layout = quarzel::layout(K, itsUnits);
     for (std::size_t i = 0; i < K; ++i) {
         const bool isCorrected = decisions[i] != 0 ? soft[i] < 0 : soft[i] > 0;
-        const std::size_t segment = i / layout.steps;
+        const std::size_t segment = i / layout.segment_steps;
         std::size_t& place = layout.segments == 1             ? itsSingle
                              : segment == 0                   ? itsFirst
                              : segment + 1 == layout.segments ? itsLast
@@ -76,7 +81,7 @@ Json VectorCoverage::toJson() const {
         streams[softMemories[i]] = {
             {"-128", itsStreams[i].low}, {"0", itsStreams[i].zero}, {"127", itsStreams[i].high}};
     }
-    return {{"block_sizes", {{"reached", itsSizes.size()}, {"of", lteParams.size()}}},
+    return {{"block_sizes", {{"reached", itsSizes.size()}, {"of", blockSizes().size()}}},
             {"window_shapes", {{"reached", itsShapes.size()}, {"of", allShapes(itsUnits).size()}}},
             {"blocks_by_iterations", countsOf(itsIterations)},
             {"blocks_by_stimulus", countsOf(itsStimuli)},
@@ -93,7 +98,7 @@ std::vector<std::string> VectorCoverage::missing() const {
             names.push_back(name);
         }
     };
-    require(itsSizes.size() == lteParams.size(), "a block size");
+    require(itsSizes.size() == blockSizes().size(), "a block size");
     require(itsShapes == allShapes(itsUnits), "a window shape");
     require(itsSingle > 0, "a correction in an only segment");
     require(itsFirst > 0, "a correction in a first segment");

@@ -1,7 +1,7 @@
 // SPDX-License-Identifier: MIT
 #include "vectors/vector_plan.hpp"
 
-#include "decode/core_layout.hpp"
+#include "quarzel/code.hpp"
 
 namespace quarzel::tool {
 
@@ -28,7 +28,7 @@ void append(std::vector<PlannedBlock>& plan, std::uint32_t K, int iterations, St
 
 /// Whether a block size is the first or the last one with its number of thread segments.
 bool isAtAnEnd(const std::vector<std::uint32_t>& sizes, std::size_t index, std::uint32_t units) {
-    const auto segments = [&](std::size_t i) { return coreLayout(sizes[i], units).segments; };
+    const auto segments = [&](std::size_t i) { return layout(sizes[i], units).segments; };
     return index == 0 || index + 1 == sizes.size() || segments(index) != segments(index - 1) ||
            segments(index) != segments(index + 1);
 }

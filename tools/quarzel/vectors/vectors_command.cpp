@@ -90,8 +90,8 @@ std::vector<Value> orDefault(const std::vector<Value>& values, std::vector<Value
 
 std::vector<std::uint32_t> allBlockSizes() {
     std::vector<std::uint32_t> sizes;
-    for (const LteParams& row : lteParams) {
-        sizes.push_back(row.K);
+    for (const BlockSize& size : blockSizes()) {
+        sizes.push_back(size.K);
     }
     return sizes;
 }
@@ -102,7 +102,7 @@ std::vector<std::uint32_t> blockSizesOf(const std::vector<std::string>& texts) {
         if (text == "all") {
             return allBlockSizes();
         }
-        sizes.push_back(blockSizeRow(std::stoull(text), "--block-size").K);
+        sizes.push_back(knownBlockSize(std::stoull(text), "--block-size").K);
     }
     return sizes;
 }

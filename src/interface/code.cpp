@@ -1,0 +1,75 @@
+// SPDX-License-Identifier: MIT
+// The facts of the code: block sizes, permutation, segments and windows, signals of a pass.
+#include <algorithm>
+#include <array>
+
+#include "decoder/decoder_3gpu.hpp"
+#include "decoder/segments.hpp"
+#include "interleaver/interleaver_3gpplte.hpp"
+#include "interleaver/lte_params.hpp"
+#include "vardel_ip_quarzel.h"
+
+namespace {
+
+/// The descriptions of the columns that decoder/trace_columns.hpp names.
+constexpr std::array<vardel_ip_quarzel_signal, 6> signals = {{
+    {"int", "intrinsic value", 1, 0},
+    {"a", "forward metric", 8, 0},
+    {"b", "backward metric", 8, 0},
+    {"g", "branch metric", 4, 4},
+    {"llr", "log-likelihood ratio", 1, 0},
+    {"ext", "extrinsic value", 1, 0},
+}};
+
+}  // namespace
+
+const char* vardel_ip_quarzel_version() {
+    return VARDEL_IP_QUARZEL_VERSION;
+}
+
+int vardel_ip_quarzel_get_block_size(int index, vardel_ip_quarzel_block_size* size) {
+    if (index < 0 || static_cast<std::size_t>(index) >= lteParams.size()) {
+        return 1;
+    }
+    const LteParams& row = lteParams[static_cast<std::size_t>(index)];
+    *size = {row.K, row.f1, row.f2};
+    return 0;
+}
+
+int vardel_ip_quarzel_get_permutation(unsigned int K, unsigned int* permutation) {
+    const TInterleaver3GPPLTE interleaver;
+    try {
+        std::vector<std::uint32_t> table;
+        if (!interleaver.valid(K) || !interleaver.calcInterleaver(table, K)) {
+            return 1;
+        }
+        std::copy(table.begin(), table.end(), permutation);
+        return 0;
+    } catch (...) {
+        return 1;
+    }
+}
+
+int vardel_ip_quarzel_get_layout(unsigned int K, unsigned int units, vardel_ip_quarzel_layout* layout) {
+    if (!TInterleaver3GPPLTE().valid(K) || (units != 2 && units != 4 && units != 8)) {
+        return 1;
+    }
+    *layout = {};
+    layout->threads = units * TDecoder3GPU::defaultThreads;
+    layout->segments = quarzel::threadSegments(K, layout->threads);
+    layout->segment_steps = K / layout->segments;
+    for (unsigned rest = layout->segment_steps; rest != 0;) {
+        const unsigned length = quarzel::windowLength(rest);
+        layout->window_steps[layout->windows++] = length;
+        rest -= length;
+    }
+    return 0;
+}
+
+int vardel_ip_quarzel_get_signal(int index, vardel_ip_quarzel_signal* signal) {
+    if (index < 0 || static_cast<std::size_t>(index) >= signals.size()) {
+        return 1;
+    }
+    *signal = signals[static_cast<std::size_t>(index)];
+    return 0;
+}
