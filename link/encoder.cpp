@@ -52,18 +52,10 @@ class ConstituentEncoders {
     std::uint32_t itsDelay3 = 0;
 };
 
-BlockSize checkedSize(std::uint32_t K) {
-    if (const auto size = findBlockSize(K)) {
-        return *size;
-    }
-    throw std::invalid_argument("LTE has no code block of " + std::to_string(K) +
-                                " bits; the nearest sizes: " + nearestBlockSizesText(K));
-}
-
 }  // namespace
 
 Encoder::Encoder(std::uint32_t blockSize) {
-    const std::vector<unsigned> table = permutation(checkedSize(blockSize).K);
+    const std::vector<unsigned> table = permutation(checkedBlockSize(blockSize));
     itsPermutation.assign(table.begin(), table.end());
 }
 

@@ -2,12 +2,13 @@
 #include "link/size_table.hpp"
 
 #include <algorithm>
+#include <stdexcept>
 
 namespace quarzel::link {
 
 namespace {
 
-/// K of a block with this many positions; 0, which is no block size, when there is not even a tail.
+/// K of a block with this many positions; 0, which is not a block size, when there is not even a tail.
 std::uint64_t sizeAt(std::uint64_t positions) {
     return positions < tailPositions ? 0 : positions - tailPositions;
 }
@@ -43,6 +44,14 @@ std::vector<std::uint32_t> nearestBlockSizes(std::uint64_t K) {
 
 std::string nearestBlockSizesText(std::uint64_t K) {
     return joinNearest(K, [](std::uint32_t size) { return std::to_string(size); });
+}
+
+std::uint32_t checkedBlockSize(std::uint32_t K) {
+    if (!findBlockSize(K)) {
+        throw std::invalid_argument("LTE has no code block of " + std::to_string(K) +
+                                    " bits; the nearest sizes: " + nearestBlockSizesText(K));
+    }
+    return K;
 }
 
 std::string nearestPositionsText(std::uint64_t positions) {

@@ -8,7 +8,7 @@
 
 #include "quarzel/code.hpp"
 
-/// Look-ups among the block sizes, and what a user is told who gives none of them.
+/// Look-ups among the block sizes, and messages for those who give another number.
 namespace quarzel::link {
 
 /// The size of blocks with this many positions, K + 4, in each stream; none when there is no such size.
@@ -20,6 +20,10 @@ std::vector<std::uint32_t> nearestBlockSizes(std::uint64_t K);
 
 /// The same as a text: "40, 48".
 std::string nearestBlockSizesText(std::uint64_t K);
+
+/// The block size itself.
+/// @throws std::invalid_argument naming the nearest sizes when there is no such size
+std::uint32_t checkedBlockSize(std::uint32_t K);
 
 /// The valid numbers of positions next to one that is not valid: "44 (K = 40), 52 (K = 48)".
 std::string nearestPositionsText(std::uint64_t positions);
