@@ -5,7 +5,7 @@
 help:
 	@echo "make demo       install what is missing, build, and decode the captures that come with the project"
 	@echo "make test       install what is missing, build, and run every test, the library's with sanitizers, too"
-	@echo "make test-long  the checks that take an hour or two: the tool with sanitizers, 64-bit Arm, whole domains, the analyser"
+	@echo "make test-long  the checks that take an hour or two: the tool with sanitizers, 64-bit Arm, whole domains, bindings without the tool, the analyser"
 	@echo "make bench      build and run the benchmarks"
 	@echo "make format     format the sources"
 
@@ -26,7 +26,8 @@ test-long:
 	@scripts/build.sh bench
 	@scripts/build.sh release
 	@tests/style/lint.sh . build/release --analyse
-	@QUARZEL_TEST_EXHAUSTIVE=1 ctest --preset release -R 'Lane|DecodeGrid|MaxStar|Wrap16'
+	@QUARZEL_TEST_EXHAUSTIVE=1 ctest --preset release -R 'Lane|DecodeGrid|MaxStar|Wrap16|RateMatching|RateRecovery|Segmentation|TurboEncoding'
+	@tests/bindings/without_tool.sh . build/without-tool
 	@scripts/build.sh sanitize-tool
 	@ctest --preset sanitize-tool
 	@scripts/build.sh aarch64

@@ -22,7 +22,7 @@ std::string toText(const ABSegment& segment);
 std::ostream& operator<<(std::ostream& stream, const ABSegment& segment);
 
 /// Thread segments that a block is cut into: doubled while there are threads left and each segment keeps 64
-/// steps. The doubling may pass a thread count that is no power of two.
+/// steps. The doubling may exceed a thread count that is not a power of two.
 constexpr std::uint32_t threadSegments(std::uint32_t K, std::uint32_t threads) {
     std::uint32_t count = 1;
     while (count < threads && std::uint64_t{128} * count <= K) {

@@ -50,7 +50,7 @@ std::vector<unsigned char> TCalculationEngineModBase::createLUT(unsigned points,
         // The complement, not the magnitude: -1 shares the entry of 0.
         const std::int32_t d = (difference >= 0 ? difference : -difference - 1) & keep;
         const double x = format->toReal(static_cast<std::int16_t>(d));
-        // The cut-off is the number of points, whatever difference they reach.
+        // The cut-off is the number of points, not the difference that they reach.
         table.push_back(toTableByte(x < points ? std::log(std::exp(-x) + 1.0) : 0.0, *format));
     }
     return table;

@@ -8,7 +8,7 @@
 #include "engine/t8.hpp"
 #include "fixed/number_format.hpp"
 
-/// Columns of the trace tables, appended to a row. Their text depends on nothing but the values: neither on a
+/// Columns of the trace tables, appended to a row. Their text depends on the values alone: neither on a
 /// stream's settings nor on a locale.
 namespace quarzel {
 

@@ -42,17 +42,17 @@ class TCalculationEngine {
                       T8* out) = 0;
 
     /// Forward recursion over n - 1 steps, n >= 1: alpha[k + 1] from alpha[k] and gamma[k], alpha[0] given.
-    /// @return alpha + n, or null when the engine's algorithm type is none of its own
+    /// @return alpha + n, or null when the engine's algorithm type is unknown
     virtual T8* alpha(unsigned n, const T8* gamma, T8* alpha) = 0;
 
     /// Backward recursion over n - 1 steps, n >= 1. Both pointers are those of the LAST step: beta[-k - 1]
     /// from beta[-k] and gamma[-k], beta[0] given.
-    /// @return beta - n, or null when the engine's algorithm type is none of its own
+    /// @return beta - n, or null when the engine's algorithm type is unknown
     virtual T8* beta(unsigned n, const T8* gamma, T8* beta) = 0;
 
     /// Log-likelihood ratios of n steps, alpha[k] being the metrics before and beta[k] those after step k. A
     /// positive one decides for bit 1.
-    /// @return out + n, or null when the engine's algorithm type is none of its own
+    /// @return out + n, or null when the engine's algorithm type is unknown
     virtual short* llr(unsigned n, const T8* alpha, const T8* beta, const T8* gamma, short* out) = 0;
 
     /// Hand the engine its formats. They are not owned and must outlive it.

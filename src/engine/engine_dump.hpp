@@ -11,7 +11,7 @@
 /// differs from its partner.
 ///
 /// Each function writes a line of headings and then n rows: the step number and the values, as the real
-/// numbers that they stand for in `format`. The text depends on nothing but the values: settings of the
+/// numbers that they stand for in `format`. The text depends on the values alone: settings of the
 /// stream (flags, width, fill, locale) neither change it nor are changed. Each returns the stream.
 
 /// Inputs of the branch metrics, and two arrays of branch metrics (elements 0 to 3).

@@ -16,7 +16,7 @@ inline constexpr std::size_t states = 8;
 /// Target of the + branch of each state.
 inline constexpr std::size_t plusTarget[states] = {4, 0, 1, 5, 6, 2, 3, 7};
 
-/// Where the branches of each state lead and come from, all told by the table above.
+/// Where the branches of each state lead and come from, all derived from the table above.
 struct Links {
     std::size_t plusTarget[states];    ///< target of the + branch
     std::size_t minusTarget[states];   ///< target of the - branch: the other of the two

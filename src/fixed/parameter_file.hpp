@@ -18,7 +18,8 @@
 ///                    own. The stream is then at its end and has not failed. One that has failed before is
 ///                    neither read nor changed
 /// @param parameters  the map. A value that is there already is replaced
-/// @param addKeys     whether keys that the map lacks are added to it. If not, each line with such a key is
+/// @param addKeys     whether keys that are not in the map are added to it. If not, each line with such a key
+/// is
 ///                    an error, and the lines after it are read all the same
 /// @return            true when no line was an error. Each error is a line on the standard error stream, with
 ///                    a line number that counts all lines of the stream from 1:

@@ -41,7 +41,7 @@ std::string toSIString(std::uint32_t value, unsigned precision);
 std::string timeToString(std::uint32_t seconds);
 
 /// The same for a number, truncated toward zero and kept to its low 32 bits. What does not fit into 64 bits,
-/// and what is no number, counts as 0.
+/// and what is not a number, counts as 0.
 std::string timeToString(double seconds);
 
 /// The same for a wider integer, kept to its low 32 bits.

@@ -27,7 +27,7 @@ constexpr std::int16_t chooseBySign(std::int16_t difference, std::int16_t x, std
     return difference < 0 ? y : x;
 }
 
-/// The modulo maximum: the larger of two metrics, told by the sign of their wrapped difference. A tie keeps
+/// The modulo maximum: the larger of two metrics by the sign of their wrapped difference. A tie keeps
 /// x. The order of the arguments matters at a difference of exactly -2^15, where either order chooses its
 /// second.
 template <class Word>

@@ -8,7 +8,7 @@
 /// One block to be decoded, and the parts of its decode that all forms of the call share.
 namespace quarzel {
 
-/// A block, whatever the form in which the caller hands it over.
+/// A block in a form that all calls share.
 struct BlockCall {
     const void* streams[3];         ///< systematic, parity 1, parity 2: the values of position 0
     std::ptrdiff_t positionStride;  ///< from a position to the next one, in values
@@ -33,7 +33,7 @@ const char* findFault(const BlockCall& call);
 /// Write "ERROR:decoder:" and a text.
 void decoderError(const Messages& messages, std::string_view text) noexcept;
 
-/// The error of a call that ended by an exception, such as a lack of memory.
+/// The error of a call that an exception ended, because memory ran out for instance.
 /// @return its status
 int unhandledException(const Messages& messages) noexcept;
 

@@ -21,8 +21,8 @@ class LaneHistory {
     /// Keep the last block of the lanes, unless a block of `next` bits, which follows, covers it.
     void keep(const LaneDecoder& lanes, std::uint32_t next);
 
-    /// Decode the blocks that are kept again, literally, by a decoder whose settings are as before
-    /// afterwards, whatever fails. Then nothing is kept any more. Nothing is written.
+    /// Decode the blocks that are kept again, literally and without a message. The decoder's settings are
+    /// restored afterwards, even if memory runs out. Then nothing is kept any more.
     /// @param lanes      the lanes that decoded them
     /// @param algorithm  their algorithm type
     void replay(TDecoder3GPU& decoder, const LaneDecoder& lanes, int algorithm);

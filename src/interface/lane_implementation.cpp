@@ -114,7 +114,7 @@ bool LaneImplementation::decode(vardel_ip_quarzel_state& state, std::uint32_t K,
     decoder.interleaver()->itsPermutation.clear();
     decoder.interleaver()->itsInversePermutation.clear();
     const std::uint64_t blocks = call.blocks.size();
-    decoder.setCounts(decoder.decodeCount() + blocks, decoder.sisoCount() + 2 * call.iterations * blocks);
+    decoder.setCounts(decoder.decodeCount() + blocks, decoder.sisoCount() + 2ULL * call.iterations * blocks);
     itsServed = &decoder;
     itsServedCount = decoder.decodeCount();
     return saturated;

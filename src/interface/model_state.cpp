@@ -16,7 +16,7 @@
 using quarzel::decoderError;
 using quarzel::Messages;
 
-// The records are laid out for 64-bit Linux, whatever compiler or language calls.
+// The layout of the records on 64-bit Linux, for every compiler and language.
 static_assert(sizeof(void*) != 8 || sizeof(vardel_ip_quarzel_generics) == 72);
 static_assert(sizeof(void*) != 8 || sizeof(vardel_ip_quarzel_inputs) == 40);
 static_assert(sizeof(void*) != 8 || sizeof(vardel_ip_quarzel_outputs) == 24);

@@ -27,7 +27,7 @@ class TInterleaver {
 
     /// Compute the inverse permutation of block size K from `itsPermutation`, which is computed first when it
     /// is not the one of K. `out` is resized to it; the inverse itself is written to
-    /// `itsInversePermutation` whatever `out` is, and `out` is meant to be that table.
+    /// `itsInversePermutation` even if `out` is another vector; pass that table.
     /// @return true; both tables are empty when the family has no such K
     virtual bool calcDeinterleaver(std::vector<std::uint32_t>& out, unsigned K) const;
 

@@ -63,11 +63,13 @@ inline std::size_t metricWord(const LaneGroup& group, std::size_t metric, std::s
     return sliceLanes * ((metric * group.slices + slice) * group.bundles + bundle);
 }
 
+/// What a block starts with in the states that it does not start in: half of the smallest metric.
+constexpr std::int16_t otherState = -32768 / 2;
+
 /// The starts of the first passes: a block's first forward one is state 0, its last backward one comes from
 /// its tail, and of the others nothing is known.
 template <bool Normalised>
 inline void setStarts(const LaneGroup& group) {
-    constexpr std::int16_t otherState = -32768 / 2;  // half of the smallest metric
     constexpr Lanes<8> unknown{};
     const std::size_t words = metricWord(group, states, 0, 0);
     const Lanes<8> first = Lanes<8>::load(group.firstSegment);
@@ -110,7 +112,9 @@ inline void hand(const LaneGroup& group, const std::int16_t* ends, const std::in
     for (std::size_t metric = 0; metric < states; ++metric) {
         const std::int16_t* const from = ends + metricWord(group, metric, 0, 0);
         std::int16_t* const to = starts + metricWord(group, metric, 0, 0);
-        std::memcpy(to + (Up ? sliceWords : 0), from + (Up ? 0 : sliceWords), topSlice * sizeof *to);
+        for (std::size_t word = 0; word < topSlice; word += W) {
+            Lanes<W>::load(from + (Up ? 0 : sliceWords) + word).store(to + (Up ? sliceWords : 0) + word);
+        }
         const std::int16_t* const leaving = from + (Up ? topSlice : 0);
         std::int16_t* const entered = to + (Up ? 0 : topSlice);
         for (std::size_t word = 0; word < sliceWords; word += W) {

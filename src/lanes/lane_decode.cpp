@@ -38,17 +38,22 @@ bool LaneDecoder::add(const LaneSchedule& schedule) {
     return true;
 }
 
-/// Fill the widest vectors: with the same slice of several bundles, else with the slices of one.
+/// Fill the widest vectors: with the same slice of several bundles, else with the slices of one. A block of
+/// one segment that is alone fills them with its states.
 LaneDecoder::Plan LaneDecoder::plan(const LaneLayout& layout, std::size_t blocks) const {
     const std::size_t bundles = (blocks + layout.blocksPerBundle() - 1) / layout.blocksPerBundle();
-    Plan best{&itsCandidate->kernels[0], false, 1};
+    const lanes::LaneKernel& narrowest = itsCandidate->kernels[0];
+    if (blocks == 1 && layout.segments == 1 && narrowest.alone[itsAlgorithm] != nullptr) {
+        return {&narrowest, Fill::states, 1};
+    }
+    Plan best{&narrowest, Fill::bundles, 1};
     for (std::size_t i = 1; i < itsCandidate->kernelCount; ++i) {
         const lanes::LaneKernel& kernel = itsCandidate->kernels[i];
         const std::size_t slots = kernel.width / sliceLanes;
         if (bundles >= slots) {
-            best = {&kernel, false, static_cast<std::uint32_t>(slots)};
+            best = {&kernel, Fill::bundles, static_cast<std::uint32_t>(slots)};
         } else if (layout.slices() % slots == 0) {
-            best = {&kernel, true, 1};
+            best = {&kernel, Fill::slices, 1};
         }
     }
     return best;
@@ -71,29 +76,32 @@ bool LaneDecoder::decode(std::uint32_t K, const LaneCall& call) {
 }
 
 /// Give a group its parts of the store, each on a cache line of its own.
-void LaneDecoder::shareStore(const LaneLayout& layout, std::size_t width) {
+void LaneDecoder::shareStore(const LaneLayout& layout, const Plan& plan) {
     constexpr std::size_t line = 64;
     constexpr std::size_t lineWords = line / sizeof(std::int16_t);
-    const std::size_t row = sliceLanes * layout.slices() * itsGroup.bundles;
+    const bool alone = plan.fill == Fill::states;
+    const std::size_t row = alone ? 1 : sliceLanes * layout.slices() * plan.bundles;
+    // Single words are written eight at a time.
+    const std::size_t stream = layout.steps * row + (alone ? sliceLanes : 0);
     const std::size_t betaRows = layout.windowLength.size() * states;
     const struct {
         std::int16_t** part;
         std::size_t words;
     } parts[] = {
-        {&itsGroup.systematic, layout.steps * row},
-        {&itsGroup.parity[0], layout.steps * row},
-        {&itsGroup.parity[1], layout.steps * row},
+        {&itsGroup.systematic, stream},
+        {&itsGroup.parity[0], stream},
+        {&itsGroup.parity[1], stream},
         {&itsGroup.tail, lanes::tailSlices * sliceLanes * itsGroup.bundles},
-        {&itsGroup.channel, layout.steps * row},
-        {&itsGroup.llr, itsGroup.iterationStride == 0 ? 0 : layout.steps * row},
-        {&itsGroup.extrinsic, layout.steps * row},
+        {&itsGroup.channel, stream},
+        {&itsGroup.llr, itsGroup.iterationStride == 0 ? 0 : stream},
+        {&itsGroup.extrinsic, stream},
         {&itsGroup.alphaState, 2 * states * row},
         {&itsGroup.alphaStart[0], states * row},
         {&itsGroup.alphaStart[1], states * row},
         {&itsGroup.betaStart[0], betaRows * row},
         {&itsGroup.betaStart[1], betaRows * row},
         {&itsGroup.boundary, states * row},
-        {&itsGroup.stepRows, lanes::maxWindow * lanes::maxStepVectors * width},
+        {&itsGroup.stepRows, lanes::maxWindow * lanes::maxStepVectors * plan.kernel->width},
     };
     const auto rounded = [](std::size_t words) { return (words + lineWords - 1) / lineWords * lineWords; };
     std::size_t needed = lineWords;
@@ -149,13 +157,15 @@ bool LaneDecoder::decodeGroup(const LaneLayout& layout, const Plan& plan, const 
         group.firstSegment[lane] = layout.segmentOf(0, lane) == 0 ? -1 : 0;
         group.lastSegment[lane] = layout.segmentOf(layout.slices() - 1, lane) + 1 == layout.segments ? -1 : 0;
     }
-    group.sliceWords = sliceLanes * (plan.acrossSlices ? 1 : group.bundles * group.steps);
-    group.rowWords = sliceLanes * group.bundles * (plan.acrossSlices ? group.slices : 1);
+    const bool slicesInRow = plan.fill == Fill::slices;
+    group.sliceWords = sliceLanes * (slicesInRow ? 1 : group.bundles * group.steps);
+    group.rowWords =
+        plan.fill == Fill::states ? 1 : sliceLanes * group.bundles * (slicesInRow ? group.slices : 1);
     group.valueBytes = call.valueBytes;
     group.iterationStride = call.iterationStride;
     // Until this group is done the store holds no block that could be read back.
     itsLast.K = 0;
-    shareStore(layout, plan.kernel->width);
+    shareStore(layout, plan);
     const std::size_t row = sliceLanes * group.slices * group.bundles;
     itsInputs.assign(3 * row + sliceLanes, silence);  // with a slice ahead of the last one
     itsOutputs.assign(row, nullptr);
@@ -164,7 +174,9 @@ bool LaneDecoder::decodeGroup(const LaneLayout& layout, const Plan& plan, const 
     }
     group.inputs = itsInputs.data();
     group.outputs = itsOutputs.data();
-    const auto& kernels = plan.acrossSlices ? plan.kernel->acrossSlices : plan.kernel->acrossBundles;
+    const auto& kernels = plan.fill == Fill::states   ? plan.kernel->alone
+                          : plan.fill == Fill::slices ? plan.kernel->acrossSlices
+                                                      : plan.kernel->acrossBundles;
     const bool saturated = kernels[itsAlgorithm](group);
 
     itsLast = {layout.K, call.iterations, call.blocks.size() - 1};

@@ -76,9 +76,10 @@ class LaneDecoder {
     std::vector<std::int16_t> softValues(const LaneRows& rows) const;
 
   private:
+    enum class Fill { bundles, slices, states };  ///< what the lanes of a vector hold
     struct Plan {
         const lanes::LaneKernel* kernel;
-        bool acrossSlices;
+        Fill fill;
         std::uint32_t bundles;
     };
     struct Last {
@@ -88,7 +89,7 @@ class LaneDecoder {
     };
 
     Plan plan(const LaneLayout& layout, std::size_t blocks) const;
-    void shareStore(const LaneLayout& layout, std::size_t width);
+    void shareStore(const LaneLayout& layout, const Plan& plan);
     void placeBlock(const LaneLayout& layout, const LaneBlock& block, std::size_t index,
                     std::size_t valueBytes);
     bool decodeGroup(const LaneLayout& layout, const Plan& plan, const LaneCall& call);

@@ -111,6 +111,10 @@ struct LaneKernel {
 
     /// Decode one bundle whose vectors hold width / 8 of its slices. Null at a width of 8.
     bool (*acrossSlices[3])(const LaneGroup&);
+
+    /// Decode one block of one segment, whose rows are single words: the eight states of its trellis fill the
+    /// lanes. Null where there is no such kernel.
+    bool (*alone[3])(const LaneGroup&);
 };
 
 }  // namespace quarzel::lanes

@@ -89,14 +89,7 @@ QUARZEL_LANES_LOOP inline bool readValues(const LaneGroup& group) {
 /// Read every value of the caller's.
 /// @return whether one was saturated
 inline bool readInputs(const LaneGroup& group) {
-    switch (group.valueBytes) {
-        case 1:
-            return readValues<std::int8_t>(group);
-        case 2:
-            return readValues<std::int16_t>(group);
-        default:
-            return readValues<std::int32_t>(group);
-    }
+    return withValues(group, [&](auto value) { return readValues<decltype(value)>(group); });
 }
 
 }  // namespace

@@ -9,6 +9,7 @@
 #include <utility>
 
 #include "engine/steps.hpp"
+#include "lanes/lane_alone.hpp"
 #include "lanes/lane_boundaries.hpp"
 #include "lanes/lane_inputs.hpp"
 #include "lanes/lane_rules.hpp"
@@ -19,11 +20,6 @@ namespace {
 /// Rows after which the metrics are normalised, and rows after a start for which their spread is not bounded.
 constexpr std::size_t normalisedRows = 8;
 constexpr std::size_t unboundedRows = 3;
-
-/// Bounds that docs/lanes.md derives: of the spread of the metrics once that many rows have passed, and of
-/// the largest metric where ratios use it.
-constexpr std::int16_t maxSpread = 12288;
-constexpr std::int16_t maxMetric = 127 + 7 * 2048;
 
 /// Whether the plain maximum may compare paths over these metrics.
 template <std::size_t W>
@@ -348,12 +344,19 @@ bool decodeGroup(const LaneGroup& group) {
 /// The kernel of one width.
 template <std::size_t W>
 constexpr LaneKernel kernelOf() {
-    LaneKernel kernel{W, {decodeGroup<W, false, 0>, decodeGroup<W, false, 1>, decodeGroup<W, false, 2>}, {}};
+    LaneKernel kernel{
+        W, {decodeGroup<W, false, 0>, decodeGroup<W, false, 1>, decodeGroup<W, false, 2>}, {}, {}};
     if constexpr (W > sliceLanes) {
         kernel.acrossSlices[0] = decodeGroup<W, true, 0>;
         kernel.acrossSlices[1] = decodeGroup<W, true, 1>;
         kernel.acrossSlices[2] = decodeGroup<W, true, 2>;
     }
+#if defined(QUARZEL_LANES_SHUFFLE)
+    if constexpr (W == sliceLanes) {
+        kernel.alone[0] = decodeAlone<0>;
+        kernel.alone[1] = decodeAlone<1>;
+    }
+#endif
     return kernel;
 }
 

@@ -47,6 +47,19 @@ inline Lanes<W> pack(typename IntsOf<W>::Signed x, typename IntsOf<W>::Signed y)
 #endif
 }
 
+/// Call `read` with a value of the type of the caller's.
+template <class Read>
+inline bool withValues(const LaneGroup& group, Read read) {
+    switch (group.valueBytes) {
+        case 1:
+            return read(std::int8_t{});
+        case 2:
+            return read(std::int16_t{});
+        default:
+            return read(std::int32_t{});
+    }
+}
+
 /// Reads values of the caller's and saturates them to the input format.
 class SoftInput {
   public:

@@ -55,10 +55,17 @@ inline void forEachSlice(const LaneGroup& group, Visit visit) {
     }
 }
 
-/// Write a byte for every LLR: 1 where it is not negative.
+/// Write a byte for each of the first Count LLRs: 1 where it is not negative.
+template <std::size_t Count>
+inline void storeBits(Lanes<8> llr, unsigned char* to) {
+    typedef std::uint8_t Bytes __attribute__((vector_size(8)));
+    const auto bits = __builtin_convertvector(~(Lanes<8>::Unsigned)llr.v >> 15, Bytes);
+    std::memcpy(to, &bits, Count);
+}
+
+/// Write the decisions of every LLR.
 /// @param offset  from the place of the decisions after the first iteration
 inline void writeDecisions(const LaneGroup& group, std::ptrdiff_t offset) {
-    typedef std::uint8_t Bytes __attribute__((vector_size(8)));
     forEachSlice(group, [&](std::size_t slice, std::size_t word) {
         unsigned char* const* lanes = group.outputs + slice * sliceLanes;
         const std::int16_t* const first = group.llr + word;
@@ -69,9 +76,7 @@ inline void writeDecisions(const LaneGroup& group, std::ptrdiff_t offset) {
             square = transpose<8>(square);
             unrolled<sliceLanes>([&](auto lane) {
                 if (lanes[lane] != nullptr) {
-                    const auto signs = ~(Lanes<8>::Unsigned)square[lane].v >> 15;
-                    const auto bits = __builtin_convertvector(signs, Bytes);
-                    std::memcpy(lanes[lane] + offset + t, &bits, sizeof bits);
+                    storeBits<8>(square[lane], lanes[lane] + offset + t);
                 }
             });
         };

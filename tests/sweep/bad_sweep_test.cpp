@@ -28,7 +28,7 @@ const std::vector<BadSweep> badSweeps = {
      "'--unit' is not understood; did you mean '--units'? see 'quarzel sweep --help'"},
     {"SizeBetweenTwo",
      {"--ebn0", "1", "--block-size", "40,41"},
-     "--block-size: 41 is no block size of LTE; the nearest: 40, 48"},
+     "--block-size: 41 is not a block size of LTE; the nearest: 40, 48"},
     {"ThreeUnits", {"--ebn0", "1", "--units", "2,3"}, "--units: '3' is not 2, 4 or 8" + seeSweep},
     {"Algorithm3", {"--ebn0", "1", "--algorithm", "3"}, "--algorithm: '3' is not 0, 1 or 2" + seeSweep},
     {"NoIteration",

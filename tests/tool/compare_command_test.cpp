@@ -104,7 +104,7 @@ TEST_F(CompareCommand, NamesTheFirstBlockAndBitThatDifferAndCounts) {
 
 TEST_F(CompareCommand, NamesWhatStandsInThePlaceOfABit) {
     for (const auto& [word, text] : std::vector<std::pair<std::string, std::string>>{
-             {"0x", "x, undefined"}, {"Z", "z, undriven"}, {"1f", "1f (hexadecimal), which is no bit"}}) {
+             {"0x", "x, undefined"}, {"Z", "z, undriven"}, {"1f", "1f (hexadecimal), which is not a bit"}}) {
         std::vector<std::string> wrong = words();
         wrong[3] = word;
         const ToolRun run = compare(wrong);
@@ -163,7 +163,7 @@ TEST_F(CompareCommand, TellsTheSameInJson) {
 TEST_F(CompareCommand, RefusesWhatItCannotRead) {
     const std::string text = itsDirectory.write("sim.hex", "1\nno\n");
     expectRefused(compareFile(text), text +
-                                         ": line 2: holds 'n', which is no hexadecimal digit; write the "
+                                         ": line 2: holds 'n', which is not a hexadecimal digit; write the "
                                          "memory with $writememh, a decision a word");
     const std::string npy = itsDirectory.path("reals.npy");
     xt::dump_npy(npy, xt::xarray<float>::from_shape({80}));
@@ -187,7 +187,7 @@ TEST_F(CompareCommand, RefusesAnExpectationThatIsNone) {
                   actual + ": is neither packed bits (.npy) nor a memory of a vector set" + remedy);
     const std::string directory = itsDirectory.path(".");
     expectRefused(runTool({"compare", directory, actual}),
-                  directory + ": is no part of a vector set" + remedy);
+                  directory + ": is not part of a vector set" + remedy);
     const std::string npy =
         itsDirectory.write("odd.npy", rawNpy(npyHeader("|u1", "(1, 131)"), std::string(131, 0)));
     expectRefused(

@@ -81,12 +81,12 @@ TEST(MemoryText, KnowsTheLineOfAWord) {
 }
 
 TEST(MemoryText, IsRefusedWhereItIsNotWellFormed) {
-    expectRefused("1\n0g", "2: holds 'g', which is no hexadecimal digit");
+    expectRefused("1\n0g", "2: holds 'g', which is not a hexadecimal digit");
     expectRefused("1 / 1", "1: holds a '/' that begins no comment");
     expectRefused("1 /* 1\n", "2: holds a comment that does not end");
     expectRefused("@ 1", "1: holds an '@' without an address");
-    expectRefused("@x 1", "1: holds an address that is no hexadecimal number");
-    expectRefused("@12345678123456789 1", "1: holds an address that is no hexadecimal number");
+    expectRefused("@x 1", "1: holds an address that is not a hexadecimal number");
+    expectRefused("@12345678123456789 1", "1: holds an address that is not a hexadecimal number");
     expectRefused("123456789", "1: holds a word of more than 32 bits");
 }
 

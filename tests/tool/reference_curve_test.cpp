@@ -50,15 +50,16 @@ TEST(ReferenceCurve, MayHaveAnEqualsSignInItsName) {
 }
 
 TEST(ReferenceCurve, IsRefusedWhereItIsNotWellFormed) {
-    expectRefused("ebn0_db,per\n1,0.1\n", ": lacks a column" + columns);
-    expectRefused("ber,bler\n1,0.1\n", ": lacks a column" + columns);
-    expectRefused("", ": is no well-formed reference curve" + columns);
+    expectRefused("ebn0_db,per\n1,0.1\n", ": is missing a column" + columns);
+    expectRefused("ber,bler\n1,0.1\n", ": is missing a column" + columns);
+    expectRefused("", ": is not a well-formed reference curve" + columns);
     expectRefused("ebn0_db,ber\n", ": holds no point" + columns);
-    expectRefused("ebn0_db,ber\n1,0.1\n2\n", ": is no well-formed reference curve" + columns);
+    expectRefused("ebn0_db,ber\n1,0.1\n2\n", ": is not a well-formed reference curve" + columns);
     expectRefused("ebn0_db,ber\none,0.1\n", ": line 2: 'one' is not a number" + columns);
-    expectRefused("ebn0_db,ber\n1,0\n",
-                  ": line 2: 0 is no error rate on a logarithmic axis; give a number above 0 and up to 1, or "
-                  "leave it out");
+    expectRefused(
+        "ebn0_db,ber\n1,0\n",
+        ": line 2: 0 is not an error rate on a logarithmic axis; give a number above 0 and up to 1, or "
+        "leave it out");
 }
 
 }  // namespace quarzel::test

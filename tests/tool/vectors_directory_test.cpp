@@ -65,7 +65,7 @@ TEST_F(VectorsDirectory, IsNotReplacedWhenItHoldsAnythingElse) {
     itsDirectory.write("set/u2_a1/simulated.hex", "");
     expectRefused(
         make({"--replace"}),
-        itsCore + "/simulated.hex: is no part of the vector set that would be replaced; move it away");
+        itsCore + "/simulated.hex: is not part of the vector set that would be replaced; move it away");
     EXPECT_TRUE(fs::exists(itsCore + "/simulated.hex"));
 }
 

@@ -11,7 +11,7 @@ BlockSize knownBlockSize(std::uint64_t K, const std::string& subject) {
     if (const auto size = findBlockSize(K)) {
         return *size;
     }
-    throw ToolError(ExitCode::usage, subject, fmt::format("{} is no block size of LTE", K),
+    throw ToolError(ExitCode::usage, subject, fmt::format("{} is not a block size of LTE", K),
                     "the nearest: " + link::nearestBlockSizesText(K));
 }
 

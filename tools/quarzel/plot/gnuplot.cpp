@@ -43,7 +43,7 @@ class MemoryFile {
             const ssize_t count =
                 ::pwrite(itsDescriptor, text.data() + done, text.size() - done, static_cast<off_t>(done));
             if (count < 0) {
-                throw gnuplotError(fmt::format("cannot be told what to do: {}", std::strerror(errno)),
+                throw gnuplotError(fmt::format("cannot be given its script: {}", std::strerror(errno)),
                                    "free some memory");
             }
             done += static_cast<std::size_t>(count);

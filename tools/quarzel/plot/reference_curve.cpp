@@ -37,7 +37,7 @@ void append(RatePoints& points, double ebN0, const char* field, const std::strin
     }
     const double rate = numberOf(field, where);
     if (!(rate > 0 && rate <= 1)) {
-        throw fileError(where, fmt::format("{} is no error rate on a logarithmic axis", field),
+        throw fileError(where, fmt::format("{} is not an error rate on a logarithmic axis", field),
                         "give a number above 0 and up to 1, or leave it out");
     }
     points.emplace_back(ebN0, rate);
@@ -47,7 +47,7 @@ void readRows(std::istream& stream, const std::string& file, ReferenceCurve& cur
     Reader reader(file, stream);
     reader.read_header(io::ignore_missing_column | io::ignore_extra_column, "ebn0_db", "ber", "bler");
     if (!reader.has_column("ebn0_db") || !(reader.has_column("ber") || reader.has_column("bler"))) {
-        throw fileError(file, "lacks a column", remedy);
+        throw fileError(file, "is missing a column", remedy);
     }
     const char* ebN0 = nullptr;
     const char* ber = nullptr;
@@ -72,7 +72,7 @@ ReferenceCurve readReferenceCurve(const std::string& argument) {
     try {
         readRows(stream, file, curve);
     } catch (const io::error::base&) {
-        throw fileError(file, "is no well-formed reference curve", remedy);
+        throw fileError(file, "is not a well-formed reference curve", remedy);
     }
     if (curve.ber.empty() && curve.bler.empty()) {
         throw fileError(file, "holds no point", remedy);

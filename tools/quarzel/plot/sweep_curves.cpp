@@ -65,7 +65,8 @@ std::vector<SweepCurve> readSweepCurves(const std::string& file) {
     } catch (const sweep::Error& error) {
         throw fileError(file, error.problem(), error.remedy());
     } catch (const Json::exception&) {
-        throw fileError(file, "is no well-formed sweep result", "give a file that 'quarzel sweep -o' wrote");
+        throw fileError(file, "is not a well-formed sweep result",
+                        "give a file that 'quarzel sweep -o' wrote");
     }
 }
 

@@ -35,7 +35,7 @@ struct SweepCurve {
 };
 
 /// Read the curves of a sweep's result file.
-/// @throws ToolError when it cannot be read or is no whole, unaltered result
+/// @throws ToolError when it cannot be read or is not a whole, unaltered result
 std::vector<SweepCurve> readSweepCurves(const std::string& file);
 
 }  // namespace quarzel::tool

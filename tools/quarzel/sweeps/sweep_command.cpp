@@ -42,7 +42,7 @@ the core, decoded and compared. Eb/N0 is for an information bit at rate 1/3: the
 noise has the variance 1.5 / (Eb/N0); the 12 tail bits are not counted. All
 cores and quantisers get the same bits and the same noise.
 
-The result depends on nothing but the options above --shard: not on threads,
+The result depends only on the options above --shard: not on threads,
 parts, interruptions or the machine. (With --max-time it depends on the clock.)
 The interval holds the true block error rate with a probability of 95 %.
 

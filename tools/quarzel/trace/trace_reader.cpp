@@ -52,7 +52,7 @@ std::optional<std::int16_t> realWord(std::string_view text) {
         return std::nullopt;
     }
     const double raw = real * 8;
-    // What is no number fails the first comparison.
+    // What is not a number fails the first comparison.
     if (!(raw >= -2048 && raw <= 2047) || raw != static_cast<int>(raw)) {
         return std::nullopt;
     }

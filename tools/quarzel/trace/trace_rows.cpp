@@ -37,7 +37,7 @@ void TraceRows::add(const vardel_ip_quarzel_pass& pass) {
     for (std::uint32_t step = 0; step < pass.steps; ++step) {
         auto column = passColumns().begin();
         for (std::size_t signal = 0; signal < signalWords.size(); ++signal) {
-            const std::int16_t* words = signalWords[signal] + step * all[signal].width;
+            const std::int16_t* words = signalWords[signal] + std::size_t{step} * all[signal].width;
             for (unsigned i = 0; i < all[signal].width; ++i) {
                 append({pass.block + 1, pass.pass, step}, *column++, words[i]);
             }

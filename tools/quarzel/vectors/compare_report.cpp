@@ -33,7 +33,7 @@ std::string valueText(const MemoryWord& word) {
         case Kind::known:
             break;
     }
-    return word.value > 1 ? fmt::format("{:x} (hexadecimal), which is no bit", word.value)
+    return word.value > 1 ? fmt::format("{:x} (hexadecimal), which is not a bit", word.value)
                           : std::to_string(word.value);
 }
 

@@ -77,7 +77,7 @@ CorePlace placeOf(const std::string& name) {
     const bool isNamed = directory.filename() == core.filename();
     const fs::path set = isNamed ? directory.parent_path() : core.parent_path();
     if (!fs::exists(core.parent_path() / manifestName)) {
-        throw fileError(name, "is no part of a vector set",
+        throw fileError(name, "is not part of a vector set",
                         "name the directory of a core that 'quarzel vectors' made");
     }
     return {set.empty() ? "." : set.string(), core.filename().string()};

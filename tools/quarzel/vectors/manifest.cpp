@@ -93,7 +93,7 @@ VectorContent readManifest(const std::string& directory) {
     try {
         const Json manifest = Json::parse(stream);
         if (manifest.at("format") != format) {
-            throw fileError(file, "is no manifest of test vectors", remedy);
+            throw fileError(file, "is not a manifest of test vectors", remedy);
         }
         if (manifest.at("version") != version) {
             throw fileError(

@@ -36,7 +36,7 @@ std::uint64_t elementsOf(const std::vector<std::uint64_t>& shape, const std::str
     return count;
 }
 
-/// A little-endian number; one of more than 32 bits becomes the greatest, which is no bit either.
+/// A little-endian number; one of more than 32 bits becomes the greatest, which is not a bit either.
 std::uint32_t numberOf(const std::array<char, 8>& bytes, std::size_t size) {
     std::uint64_t value = 0;
     for (std::size_t i = size; i > 0; --i) {

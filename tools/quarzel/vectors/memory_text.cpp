@@ -76,7 +76,7 @@ class MemoryScanner {
             }
             const std::size_t digit = digits.find(static_cast<char>(c | 0x20));
             if (digit == std::string_view::npos || address >> 60 != 0) {
-                refuse("an address that is no hexadecimal number");
+                refuse("an address that is not a hexadecimal number");
             }
             address = address << 4 | digit;
             hasDigits = true;
@@ -116,7 +116,7 @@ class MemoryScanner {
         } else if (lower == 'z' || c == '?') {
             kind = kind == MemoryWord::Kind::x ? kind : MemoryWord::Kind::z;
         } else if (digit == std::string_view::npos) {
-            refuse(fmt::format("'{}', which is no hexadecimal digit", c));
+            refuse(fmt::format("'{}', which is not a hexadecimal digit", c));
         }
         value = value << 4 | (digit == std::string_view::npos ? 0 : digit);
         if (value > std::numeric_limits<std::uint32_t>::max()) {

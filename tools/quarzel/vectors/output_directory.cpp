@@ -32,7 +32,7 @@ void requireNothingElse(const std::string& name) {
     for (const auto& entry : fs::recursive_directory_iterator(name)) {
         const std::string file = entry.path().lexically_relative(name).string();
         if (!entry.is_directory() && known.count(file) == 0) {
-            throw fileError(entry.path().string(), "is no part of the vector set that would be replaced",
+            throw fileError(entry.path().string(), "is not part of the vector set that would be replaced",
                             "move it away");
         }
     }

@@ -24,7 +24,7 @@ class OutputDirectory {
     ~OutputDirectory();
 
     /// Write a file; the folders in its name are made.
-    /// @return  what the manifest tells of it
+    /// @return  what the manifest says about it
     /// @throws ToolError when that fails
     VectorFile write(const std::string& file, std::string_view bytes);
 

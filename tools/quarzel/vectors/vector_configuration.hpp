@@ -10,7 +10,7 @@
 
 namespace quarzel::tool {
 
-/// What the manifest tells of a request.
+/// What the manifest says about a request.
 nlohmann::ordered_json configurationJson(const VectorRequest& request);
 
 /// The command that makes the set, with DIRECTORY for where.
