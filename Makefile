@@ -1,12 +1,14 @@
 # SPDX-License-Identifier: MIT
 # The commands of the README. Each does its own set-up.
-.PHONY: help demo test test-long bench format
+.PHONY: help demo test test-long bench docs package format
 
 help:
 	@echo "make demo       install what is missing, build, and decode the captures that come with the project"
 	@echo "make test       install what is missing, build, and run every test, the library's with sanitizers, too"
 	@echo "make test-long  the checks that take an hour or two: the tool with sanitizers, 64-bit Arm, whole domains, bindings without the tool, the analyser"
 	@echo "make bench      build and run the benchmarks"
+	@echo "make docs       build the site of the pages and the headers in build/docs/site, with its links checked"
+	@echo "make package    build the Debian packages in build/package, and ask lintian about them"
 	@echo "make format     format the sources"
 
 demo:
@@ -23,11 +25,13 @@ test:
 
 test-long:
 	@scripts/install-packages.sh long
+	@$(MAKE) docs
 	@scripts/build.sh bench
 	@scripts/build.sh release
 	@tests/style/lint.sh . build/release --analyse
 	@QUARZEL_TEST_EXHAUSTIVE=1 ctest --preset release -R 'Lane|DecodeGrid|MaxStar|Wrap16|RateMatching|RateRecovery|Segmentation|TurboEncoding'
 	@tests/bindings/without_tool.sh . build/without-tool
+	@tests/bindings/python/pip_test.sh . /usr/bin/python3 python cocotb python_sweeps
 	@scripts/build.sh sanitize-tool
 	@ctest --preset sanitize-tool
 	@scripts/build.sh aarch64
@@ -39,6 +43,15 @@ bench:
 	build/release/bench/quarzel_bench --benchmark_out=build/release/bench.json --benchmark_out_format=json
 	build/release/bench/quarzel_sweep_bench
 	bench/bindings.sh
+
+docs:
+	@scripts/install-packages.sh docs
+	@/usr/bin/python3 scripts/site_pages.py . build/docs/pages
+	@mkdocs build --strict --quiet --config-file docs/site/mkdocs.yml
+
+package:
+	@scripts/install-packages.sh package
+	@scripts/package.sh
 
 format:
 	@scripts/install-packages.sh test

@@ -1,6 +1,6 @@
 // SPDX-License-Identifier: MIT
-// The lane road kernel by kernel, for each instruction set: the time of a row of one vector (the trellis
-// steps of all its lanes), which is what the operation counts of docs/performance.md are held against.
+// The lanes kernel by kernel, for each instruction set: the time of a row of one vector (the trellis steps of
+// all its lanes). Beside them the limits, loops of what no decoder of this arithmetic can do without.
 #include <benchmark/benchmark.h>
 
 #include <span>
@@ -9,7 +9,7 @@
 
 #include "bench/lane_kernels.hpp"
 #include "bench/support.hpp"
-#include "interleaver/interleaver.hpp"
+#include "decoder/segments.hpp"
 #include "lanes/lane_decode.hpp"
 
 namespace quarzel::bench {
@@ -25,23 +25,25 @@ namespace {
 
 using lanes::LaneGroup;
 
-/// A group that fills vectors, as the lane road lays it out. A kernel that only keeps the group stands in for
+/// A group that fills vectors, as the decoder lays it out. A kernel that only keeps the group stands in for
 /// the decoding one.
 class LaidOut {
   public:
-    LaidOut(std::size_t width, std::uint32_t K, std::uint32_t threads)
-        : itsKernel{width, {keep, keep, keep}, {keep, keep, keep}},
-          itsCandidate{"layout", [] { return true; }, &itsKernel, 1},
-          itsDecoder(threads, itsCandidate),
+    LaidOut(std::size_t width, std::uint32_t K, std::uint32_t units)
+        : itsKernels{{lanes::sliceLanes, {keep, keep, keep}, {}, {}},
+                     {width, {keep, keep, keep}, {keep, keep, keep}, {}}},
+          itsCandidate{"layout", [] { return true; }, itsKernels, width > lanes::sliceLanes ? 2U : 1U},
+          itsDecoder(1, itsCandidate),
           itsBlocks(K, width) {
-        const std::unique_ptr<TInterleaver> interleaver(TInterleaver::create("3GPPLTE"));
-        itsDecoder.prepare(K, *interleaver);
+        const Layout cut = layout(K, units);
+        itsDecoder.add({permutation(K), cut.segments, windowLengths(cut.segment_steps)});
         std::vector<LaneBlock> blocks;
         for (std::size_t i = 0; i < width; ++i) {
             const auto& in = itsBlocks.inputs[i];
             blocks.push_back({{in.rsc1_sys, in.rsc1_par, in.rsc2_par}, itsBlocks.outputs[i].dout});
         }
-        itsDecoder.decode(K, iterations, 1, std::span(blocks).first(width / lanes::sliceLanes));
+        itsDecoder.decode(
+            K, {std::span(blocks).first(width / lanes::sliceLanes), sizeof(std::int32_t), iterations, 0});
         itsGroup = kept;
     }
 
@@ -54,7 +56,7 @@ class LaidOut {
         return false;
     }
 
-    lanes::LaneKernel itsKernel;
+    lanes::LaneKernel itsKernels[2];  ///< the narrowest, and the one of that width
     lanes::Candidate itsCandidate;
     LaneDecoder itsDecoder;
     Blocks itsBlocks;
@@ -63,9 +65,32 @@ class LaidOut {
 
 using Kernel = void (*)(const LaneGroup&);
 
+void countRows(benchmark::State& bench, std::size_t rowsOfCall, std::size_t width) {
+    const auto rows = static_cast<double>(rowsOfCall) * static_cast<double>(bench.iterations());
+    bench.counters["row"] =
+        benchmark::Counter(rows, benchmark::Counter::kIsRate | benchmark::Counter::kInvert);
+    bench.counters["bit"] = benchmark::Counter(rows * static_cast<double>(width),
+                                               benchmark::Counter::kIsRate | benchmark::Counter::kInvert);
+}
+
+/// Forward and backward together.
+void measureLimit(benchmark::State& bench, const LaneKernels& kernels, const Limit& limit) {
+    constexpr std::size_t rows = 32 * limitRows;
+    constexpr std::size_t line = 32;
+    std::vector<std::int16_t> memory(limitRows * limitVectors * kernels.width + line, 64);
+    void* first = memory.data();
+    std::size_t space = memory.size() * sizeof memory[0];
+    auto* const aligned = static_cast<std::int16_t*>(std::align(2 * line, space - 2 * line, first, space));
+    for (auto _ : bench) {
+        limit.run(rows, aligned);
+        benchmark::ClobberMemory();
+    }
+    countRows(bench, rows, kernels.width);
+}
+
 void measure(benchmark::State& bench, const LaneKernels& kernels, Kernel kernel) {
     const LaidOut laidOut(kernels.width, static_cast<std::uint32_t>(bench.range(0)),
-                          static_cast<std::uint32_t>(bench.range(1)) * 4);
+                          static_cast<std::uint32_t>(bench.range(1)));
     const LaneGroup& group = laidOut.group();
     // In the order of a decode, so that each works on values that the one before has made.
     kernels.readInputs(group);
@@ -75,12 +100,7 @@ void measure(benchmark::State& bench, const LaneKernels& kernels, Kernel kernel)
         kernel(group);
         benchmark::ClobberMemory();
     }
-    const auto rows =
-        static_cast<double>(group.steps * group.slices) * static_cast<double>(bench.iterations());
-    bench.counters["row"] =
-        benchmark::Counter(rows, benchmark::Counter::kIsRate | benchmark::Counter::kInvert);
-    bench.counters["bit"] = benchmark::Counter(rows * static_cast<double>(kernels.width),
-                                               benchmark::Counter::kIsRate | benchmark::Counter::kInvert);
+    countRows(bench, group.steps * group.slices, kernels.width);
 }
 
 void add(const char* candidate, const LaneKernels& kernels) {
@@ -103,6 +123,11 @@ void add(const char* candidate, const LaneKernels& kernels) {
             one("backward/type" + std::to_string(algorithm), kernels.backward[algorithm]);
         }
         one("writeDecisions", kernels.writeDecisions);
+        for (const Limit& limit : kernels.limits) {
+            benchmark::RegisterBenchmark(
+                (std::string("limit/") + candidate + '/' + limit.name).c_str(),
+                [&](benchmark::State& bench) { measureLimit(bench, kernels, limit); });
+        }
     }
 }
 

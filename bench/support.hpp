@@ -4,11 +4,10 @@
 #include <malloc.h>
 
 #include <cstddef>
-#include <memory>
 #include <random>
 #include <vector>
 
-#include "vardel_ip_quarzel.h"
+#include "quarzel/core.hpp"
 
 namespace quarzel::bench {
 
@@ -20,17 +19,8 @@ inline std::size_t heapBytes() {
     return info.uordblks + info.hblkhd;
 }
 
-struct DestroyState {
-    void operator()(vardel_ip_quarzel_state* state) const { vardel_ip_quarzel_destroy_state(state); }
-};
-using State = std::unique_ptr<vardel_ip_quarzel_state, DestroyState>;
-
-inline State makeState(std::int64_t units, std::int64_t algorithm) {
-    vardel_ip_quarzel_generics generics;
-    vardel_ip_quarzel_get_default_generics(&generics);
-    generics.C_NUM_PU = static_cast<int>(units);
-    generics.C_ALGORITHM_TYPE = static_cast<int>(algorithm);
-    return State(vardel_ip_quarzel_create_state(generics));
+inline Core makeCore(std::int64_t units, std::int64_t algorithm) {
+    return Core(CoreSettings{static_cast<int>(units), static_cast<int>(algorithm)});
 }
 
 /// Noisy blocks of the all-zero code word, at an amplitude of 1.0 and 0 dB, with room for their decisions.

@@ -1,5 +1,6 @@
 # SPDX-License-Identifier: MIT
-# The installed package: shared library, archive with the classes, headers, and how CMake and pkg-config find them.
+# The installed package: shared library, archive with the classes, headers, how CMake and pkg-config find them, pages and
+# examples, and what Python's and Octave's own installers take.
 include(CMakePackageConfigHelpers)
 
 set(package_dir ${CMAKE_INSTALL_LIBDIR}/cmake/vardel_ip_quarzel)
@@ -25,3 +26,15 @@ install(FILES ${CMAKE_CURRENT_BINARY_DIR}/vardel_ip_quarzel-config.cmake
 file(RELATIVE_PATH QUARZEL_PC_PREFIX /${CMAKE_INSTALL_LIBDIR}/pkgconfig /)
 configure_file(cmake/vardel_ip_quarzel.pc.in vardel_ip_quarzel.pc @ONLY)
 install(FILES ${CMAKE_CURRENT_BINARY_DIR}/vardel_ip_quarzel.pc DESTINATION ${CMAKE_INSTALL_LIBDIR}/pkgconfig)
+
+set(doc_dir ${CMAKE_INSTALL_DATADIR}/doc/quarzel)
+install(FILES README.md CHANGELOG.md LICENSE DESTINATION ${doc_dir})
+install(DIRECTORY docs examples DESTINATION ${doc_dir} PATTERN docs/site EXCLUDE)
+if(TARGET quarzel_wheel)
+  install(DIRECTORY ${PROJECT_BINARY_DIR}/bindings/python/dist/ DESTINATION ${CMAKE_INSTALL_DATADIR}/quarzel/python
+          FILES_MATCHING PATTERN "quarzel-${PROJECT_VERSION}-*.whl")
+endif()
+if(TARGET quarzel_octave_package)
+  install(FILES ${PROJECT_BINARY_DIR}/bindings/octave/quarzel-octave-${PROJECT_VERSION}.tar.gz
+          DESTINATION ${CMAKE_INSTALL_DATADIR}/quarzel/octave)
+endif()

@@ -1,15 +1,17 @@
 #!/usr/bin/env bash
 # SPDX-License-Identifier: MIT
-# Install the packages of a purpose that are missing: install-packages.sh demo|test|long. Works as root, or as a user
+# Install the packages of a purpose that are missing: install-packages.sh demo|test|docs|package|long. Works as root, or as a user
 # with sudo; says what it installs.
 set -euo pipefail
 list=$(dirname "$0")/../packages.txt
 case "${1:-}" in
 demo) purposes=demo ;;
 test) purposes='demo|test' ;;
-long) purposes='demo|test|long' ;;
+docs) purposes=docs ;;
+package) purposes='demo|test|package' ;;
+long) purposes='demo|test|docs|package|long' ;;
 *)
-    echo "usage: install-packages.sh demo|test|long" >&2
+    echo "usage: install-packages.sh demo|test|docs|package|long" >&2
     exit 2
     ;;
 esac

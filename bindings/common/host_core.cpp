@@ -83,6 +83,24 @@ std::size_t groupSize(std::size_t positions) {
     return (enoughValues / (3 * positions) / maxLanes + 1) * maxLanes;
 }
 
+/// The same for the first of some blocks of any sizes: enough of each size for the lanes, where there are
+/// many.
+std::size_t recordGroupSize(std::span<const vardel_ip_quarzel_inputs> inputs) {
+    constexpr std::size_t enoughValues = 1 << 20;
+    std::size_t values = 0;
+    std::size_t count = 0;
+    while (count < inputs.size() && values < enoughValues) {
+        values += 3 * static_cast<std::size_t>(inputs[count++].din_size);
+    }
+    return count;
+}
+
+void askWhetherToStop(const HostCore::Interrupted& interrupted) {
+    if (interrupted && interrupted()) {
+        throw BindingError(Fault::interrupted, "decoding was interrupted");
+    }
+}
+
 template <SoftValue Value>
 void decodeGroups(Core& core, SoftBlocks<Value> blocks, DecodeJob job,
                   const HostCore::Interrupted& interrupted) {
@@ -98,9 +116,7 @@ void decodeGroups(Core& core, SoftBlocks<Value> blocks, DecodeJob job,
         } else {
             core.decode(group, job.iterations, job.bits.first(bits), job.tags.first(tags));
         }
-        if (interrupted && interrupted()) {
-            throw BindingError(Fault::interrupted, "decoding was interrupted");
-        }
+        askWhetherToStop(interrupted);
         job.bits = job.bits.subspan(bits);
         job.tags = job.tags.subspan(tags);
         const std::ptrdiff_t step = blocks.blockStride * static_cast<std::ptrdiff_t>(group.count);
@@ -185,14 +201,19 @@ Outcome HostCore::decode(const DecodeJob& job, const Interrupted& interrupted) n
 }
 
 Outcome HostCore::decodeBatch(std::span<const vardel_ip_quarzel_inputs> inputs,
-                              std::span<vardel_ip_quarzel_outputs> outputs) noexcept {
+                              std::span<vardel_ip_quarzel_outputs> outputs,
+                              const Interrupted& interrupted) noexcept {
     return use([&](Core& core) {
         for (const vardel_ip_quarzel_inputs& block : inputs) {
             checkIterations(block.iterations);
             blockSizeOf(static_cast<std::size_t>(block.din_size));
         }
-        if (!inputs.empty()) {
-            core.decode(inputs, outputs);
+        while (!inputs.empty()) {
+            const std::size_t count = recordGroupSize(inputs);
+            core.decode(inputs.first(count), outputs.first(count));
+            askWhetherToStop(interrupted);
+            inputs = inputs.subspan(count);
+            outputs = outputs.subspan(count);
         }
     });
 }

@@ -54,7 +54,8 @@ class HostCore {
 
     /// Decode blocks of any sizes, as a batch.
     Outcome decodeBatch(std::span<const vardel_ip_quarzel_inputs> inputs,
-                        std::span<vardel_ip_quarzel_outputs> outputs) noexcept;
+                        std::span<vardel_ip_quarzel_outputs> outputs,
+                        const Interrupted& interrupted = {}) noexcept;
 
     /// Decode a block, with the trace of its first passes as text in the outcome.
     /// @param passes  two an iteration; more than there are mean all of them

@@ -96,9 +96,15 @@ bool LaneImplementation::fitsSize(const vardel_ip_quarzel_state& state, std::uin
             return false;
         }
     }
+    if (itsDecoder.knows(K)) {
+        return true;
+    }
     const std::uint32_t segments = threadSegments(K, itsThreads);
-    return itsDecoder.knows(K) || (K % segments == 0 && itsDecoder.add({std::move(permutation), segments,
-                                                                        windowLengths(K / segments)}));
+    LaneSchedule schedule;
+    schedule.permutation = std::move(permutation);
+    schedule.segments = segments;
+    schedule.windowLength = windowLengths(K / segments);
+    return K % segments == 0 && itsDecoder.add(schedule);
 }
 
 bool LaneImplementation::decode(vardel_ip_quarzel_state& state, std::uint32_t K, const LaneCall& call) {

@@ -97,16 +97,15 @@ class GroupDecoder {
                                    : here.loadAlphaState(here.itsGroup.alphaState + at);
         const auto step = [&](std::size_t t) {
             const Word channel = here.channelValue<Code>(window.bottom + t, column, firstIteration);
-            const BranchMetrics<Word> metrics =
-                branchMetrics(channel, here.parity<Code>(window.bottom + t, column));
+            const SignedMetrics<Word> distinct(channel, here.parity<Code>(window.bottom + t, column));
             std::int16_t* const stored = here.itsGroup.stepRows + t * stepVectors * W;
             storeMetrics<W>(words(state), stored, W);
             channel.store(stored + states * W);
             if constexpr (keepsBranchMetrics) {
-                metrics[0].store(stored + (states + 1) * W);
-                metrics[1].store(stored + (states + 2) * W);
+                distinct.same.store(stored + (states + 1) * W);
+                distinct.opposite.store(stored + (states + 2) * W);
             }
-            assign(state, alphaStep<Recursion>(state, metrics, rule));
+            assign(state, alphaStep<Recursion>(state, symmetric(distinct.same, distinct.opposite), rule));
         };
         std::size_t t = 0;
         while (t + normalisedRows <= window.length) {
@@ -148,7 +147,8 @@ class GroupDecoder {
                 metrics =
                     symmetric(Word::load(stored + (states + 1) * W), Word::load(stored + (states + 2) * W));
             } else {
-                metrics = branchMetrics(channel, here.parity<Code>(row, column));
+                const SignedMetrics<Word> distinct(channel, here.parity<Code>(row, column));
+                metrics = symmetric(distinct.same, distinct.opposite);
             }
             const auto alpha = [stored](std::size_t i) { return Word::load(stored + i * W); };
             const auto result = backwardStep(state, metrics, alpha, rule, llrRule);
@@ -280,14 +280,9 @@ class GroupDecoder {
         }
     }
 
-    /// The four branch metrics. Without a second parity only two are distinct.
+    /// The four branch metrics.
     static BranchMetrics<Word> symmetric(Word same, Word opposite) {
         return {same, opposite, opposite, same};
-    }
-
-    static BranchMetrics<Word> branchMetrics(Word channel, Word parity) {
-        const auto clamp = [](Word sum) { return max(min(sum, Word::of(highest)), Word::of(lowest)); };
-        return symmetric(clamp(add(channel, parity)), clamp(sub(channel, parity)));
     }
 
     /// Keep metrics from wrapping. The steps are multiples of what a boundary clears, so that neither

@@ -87,6 +87,21 @@ struct LaneRules<W, 2> {
     static Recursion llrNearStart() { return Recursion({}); }
 };
 
+/// The branch metrics where both parities have the sign of the intrinsic value's or the opposite one. Without
+/// a second parity a code has only these two.
+/// @param channel  twice the intrinsic value
+template <class Word>
+struct SignedMetrics {
+    Word same;
+    Word opposite;
+
+    SignedMetrics(Word channel, Word parity)
+        : same(clamp(add(channel, parity))), opposite(clamp(sub(channel, parity))) {}
+
+  private:
+    static Word clamp(Word sum) { return max(min(sum, Word::of(highest)), Word::of(lowest)); }
+};
+
 /// Half the extrinsic value, kept to the state format's precision: the LLR less four times the intrinsic
 /// value, scaled, clamped and halved. Every value is a multiple of 16, so that the truncating divisions of
 /// the definition are exact and their order does not matter.

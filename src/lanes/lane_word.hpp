@@ -146,15 +146,22 @@ inline Lanes<32> joinSlices(Lanes<8> x0, Lanes<8> x1, Lanes<8> x2, Lanes<8> x3) 
                                     28, 29, 30, 31)};
 }
 
-/// A slice, W / 8 times.
+/// A slice, W / 8 times. A machine with wider vectors loads it so.
 template <std::size_t W>
 inline Lanes<W> repeated(Lanes<8> x) {
+#if defined(__AVX512F__)
+    if constexpr (W == 32) {
+        // All of a mask: without one, GCC 12 warns about its own header.
+        return {(typename Lanes<W>::Signed)_mm512_maskz_broadcast_i32x4(0xFFFF, (__m128i)x.v)};
+    }
+#endif
+#if defined(__AVX2__)
+    if constexpr (W == 16) {
+        return {(typename Lanes<W>::Signed)_mm256_broadcastsi128_si256((__m128i)x.v)};
+    }
+#endif
     if constexpr (W == 8) {
         return x;
-    } else if constexpr (W == 16) {
-        return joinSlices(x, x);
-    } else {
-        return joinSlices(x, x, x, x);
     }
 }
 

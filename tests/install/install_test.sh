@@ -24,10 +24,13 @@ expect() { # NAME COMMAND...
     echo "ok: $name"
 }
 
-# The example in the README is the one that is built here.
-diff <(awk '/^```c$/ { code = 1; next } /^```$/ { code = 0 } code' "$source/README.md") \
-    "$source/examples/decode_block.c"
-echo "ok: the README shows the example"
+# The examples in the README are those that are built here.
+shown() { # LANGUAGE
+    awk -v language="$1" '$0 == "```" language { code = 1; next } /^```$/ { code = 0 } code' "$source/README.md"
+}
+diff <(shown c) "$source/examples/decode_block.c"
+diff <(shown cpp) "$source/examples/decode_array.cpp"
+echo "ok: the README shows the examples"
 
 # The tool is there with its manual page and its completion scripts, which it has written itself.
 "$prefix/bin/quarzel" manual | cmp - "$prefix/share/man/man1/quarzel.1"
@@ -41,16 +44,20 @@ cmake --build "$work/cmake" >>"$work/log"
 expect "CMake, shared library" "$work/cmake/decode_block"
 expect "CMake, classes in the archive" "$work/cmake/decode_with_classes"
 expect "CMake, ports from C99" "$work/cmake/use_ports"
-expect "CMake, the class from C++20" "$work/cmake/use_core"
+"$work/cmake/decode_array" | grep -qE '^4000 bits decoded by [a-z0-9.]+, first bit 0$'
+echo "ok: CMake, the class from C++20"
 
 # As a part of another project it has the same targets, and installs nothing.
-cmake -S "$source/tests/install/subproject" -B "$work/parent" -DQUARZEL_SOURCE="$source" >>"$work/log"
-cmake --install "$work/parent" --prefix "$work/nothing" >>"$work/log"
-if [ -n "$(find "$work/nothing" -type f 2>/dev/null)" ]; then
-    echo "a subproject installed files" >&2
-    exit 1
-fi
-echo "ok: a subproject has the targets and installs nothing"
+for fetch in OFF ON; do
+    cmake -S "$source/tests/install/subproject" -B "$work/parent" -DQUARZEL_SOURCE="$source" -DFETCH=$fetch >>"$work/log"
+    cmake --install "$work/parent" --prefix "$work/nothing" >>"$work/log"
+    if [ -n "$(find "$work/nothing" -type f 2>/dev/null)" ]; then
+        echo "a subproject installed files" >&2
+        exit 1
+    fi
+    rm -r "$work/parent"
+done
+echo "ok: a subproject, added or fetched, has the targets and installs nothing"
 
 export PKG_CONFIG_PATH=$libdir/pkgconfig
 cc -std=c99 "$source/examples/decode_block.c" -o "$work/by_pkg_config" \
@@ -67,8 +74,25 @@ gcc -std=c99 "$source/examples/decode_block.c" -o "$work/plain" -I"$prefix/inclu
 expect "plain gcc" env LD_LIBRARY_PATH="$libdir" "$work/plain"
 
 gcc -std=c99 "$source/examples/decode_block.c" -o "$work/static" -I"$prefix/include" \
-    "$libdir/libvardel_ip_quarzel.a" -lstdc++ -lm
-expect "plain gcc, archive" "$work/static"
+    "$libdir/libvardel_ip_quarzel.a" $(pkg-config --static --libs-only-l vardel_ip_quarzel | sed s/-lvardel_ip_quarzel//)
+expect "plain gcc, archive, with what the .pc file says that it needs" "$work/static"
+
+# A project of C alone gets what the archive needs from its target.
+cmake -S "$source/tests/install/c_consumer" -B "$work/c_only" -DCMAKE_PREFIX_PATH="$prefix" >>"$work/log"
+cmake --build "$work/c_only" >>"$work/log"
+expect "CMake, archive in a project of C alone" "$work/c_only/decode_block"
+
+# Pages, licence, examples, and the packages for pip and pkg.
+for file in doc/quarzel/README.md doc/quarzel/LICENSE doc/quarzel/docs/octave.md doc/quarzel/examples/decode_block.c; do
+    test -s "$prefix/share/$file"
+done
+if [ -d "$build/bindings/python/dist" ]; then
+    test "$(find "$prefix/share/quarzel/python" -name 'quarzel-*.whl' | wc -l)" -eq 1
+fi
+if [ -d "$build/bindings/octave/package" ]; then
+    test "$(find "$prefix/share/quarzel/octave" -name 'quarzel-octave-*.tar.gz' | wc -l)" -eq 1
+fi
+echo "ok: pages, licence, examples, wheel and Octave package"
 
 # Every installed header of the classes compiles alone.
 while read -r header; do

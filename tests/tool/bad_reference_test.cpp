@@ -1,7 +1,11 @@
 // SPDX-License-Identifier: MIT
 #include <gtest/gtest.h>
 
+#include <sstream>
+
+#include "captures/bits_file.hpp"
 #include "npy_data.hpp"
+#include "refusal.hpp"
 #include "run_tool.hpp"
 #include "temporary_directory.hpp"
 
@@ -44,20 +48,25 @@ class BadReferenceTest : public testing::TestWithParam<BadReference> {};
 
 }  // namespace
 
-TEST_P(BadReferenceTest, EndsWithOneLineThatTellsWhatIsWrong) {
-    const BadReference& bad = GetParam();
-    const TemporaryDirectory directory;
-    const std::string file = directory.write("reference.npy", bad.content);
-    const ToolRun run = runTool(
-        {"decode", shipped("k40.soft.npy"), "--reference", file, "-o", directory.path("out.npy"), "--json"});
-    EXPECT_EQ(run.err, "quarzel: error: " + file + ": " + bad.message + '\n');
-    EXPECT_EQ(run.out, "");
-    EXPECT_EQ(run.exitCode, 3);
-    EXPECT_EQ(directory.names(), std::vector<std::string>{"reference.npy"}) << "no output may be left";
+TEST_P(BadReferenceTest, IsRefusedInOneLineThatTellsWhatIsWrong) {
+    std::istringstream stream(GetParam().content);
+    EXPECT_EQ(refusalOf([&] { tool::readBits(stream, "reference.npy", 400, 5); }),
+              "quarzel: error: reference.npy: " + GetParam().message + '\n');
 }
 
 INSTANTIATE_TEST_SUITE_P(, BadReferenceTest, testing::ValuesIn(badReferences),
                          [](const auto& test) { return std::string(test.param.title); });
+
+TEST(BadReference, LeavesNoOutput) {
+    const TemporaryDirectory directory;
+    const std::string file = directory.write("reference.npy", npy("|u1", "(399, 5)", 1995));
+    const ToolRun run = runTool(
+        {"decode", shipped("k40.soft.npy"), "--reference", file, "-o", directory.path("out.npy"), "--json"});
+    EXPECT_EQ(run.err, "quarzel: error: " + file + ": has shape (399, 5)" + shape + '\n');
+    EXPECT_EQ(run.out, "");
+    EXPECT_EQ(run.exitCode, 3);
+    EXPECT_EQ(directory.names(), std::vector<std::string>{"reference.npy"}) << "no output may be left";
+}
 
 TEST(BadReference, MayNotBeMissing) {
     const ToolRun run = runTool({"decode", shipped("k40.soft.npy"), "--reference", "none.npy"});

@@ -3,7 +3,7 @@
 
 #include <sstream>
 
-#include "tool_error.hpp"
+#include "refusal.hpp"
 #include "vectors/memory_image.hpp"
 
 namespace quarzel::test {
@@ -33,14 +33,8 @@ std::string wordsOf(const MemoryImage& image) {
 }
 
 void expectRefused(const std::string& text, const std::string& message) {
-    try {
-        read(text);
-        FAIL() << text << " is not well-formed";
-    } catch (const tool::ToolError& error) {
-        EXPECT_EQ(error.what(),
-                  "m.hex: line " + message + "; write the memory with $writememh, a decision a word");
-        EXPECT_EQ(error.code(), tool::ExitCode::file);
-    }
+    EXPECT_EQ(refusalOf([&] { read(text); }), "quarzel: error: m.hex: line " + message +
+                                                  "; write the memory with $writememh, a decision a word\n");
 }
 
 }  // namespace

@@ -4,8 +4,8 @@
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
+#include "refusal.hpp"
 #include "temporary_directory.hpp"
-#include "tool_error.hpp"
 
 namespace quarzel::test {
 
@@ -19,13 +19,7 @@ using tool::ReferenceCurve;
 void expectRefused(const std::string& content, const std::string& message) {
     const TemporaryDirectory directory;
     const std::string file = directory.write("ref.csv", content);
-    try {
-        readReferenceCurve(file);
-        FAIL() << content << " is not well-formed";
-    } catch (const tool::ToolError& error) {
-        EXPECT_EQ(error.what(), file + message);
-        EXPECT_EQ(error.code(), tool::ExitCode::file);
-    }
+    EXPECT_EQ(refusalOf([&] { readReferenceCurve(file); }), "quarzel: error: " + file + message + '\n');
 }
 
 const std::string columns = "; give CSV with the columns ebn0_db and ber, bler or both";

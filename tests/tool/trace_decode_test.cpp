@@ -5,7 +5,6 @@
 #include <filesystem>
 #include <nlohmann/json.hpp>
 
-#include "long_runs.hpp"
 #include "npy_data.hpp"
 #include "run_tool.hpp"
 #include "trace_cases.hpp"
@@ -13,6 +12,13 @@
 namespace quarzel::test {
 
 namespace {
+
+/// Whether a run of the tool takes long: under the address sanitizer and emulated.
+#if defined(__SANITIZE_ADDRESS__) || defined(QUARZEL_EMULATED)
+constexpr bool runsTakeLong = true;
+#else
+constexpr bool runsTakeLong = false;
+#endif
 
 using Arguments = std::vector<std::string>;
 

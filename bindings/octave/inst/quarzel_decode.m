@@ -1,10 +1,11 @@
 % SPDX-License-Identifier: MIT
 
-function [bits, details] = quarzel_decode (sys, par1, par2, iterations, options)
+function [bits, details] = quarzel_decode (varargin)
   %QUARZEL_DECODE  Decode LTE code blocks as a hardware turbo decoder core does, to the bit.
   %
   %   bits = quarzel_decode (sys, par1, par2)
   %   bits = quarzel_decode (sys, par1, par2, iterations)
+  %   bits = quarzel_decode (sys, par1, par2, iterations, name, value, ...)
   %   bits = quarzel_decode (sys, par1, par2, iterations, options)
   %   [bits, details] = quarzel_decode (...)
   %
@@ -21,7 +22,7 @@ function [bits, details] = quarzel_decode (sys, par1, par2, iterations, options)
   %
   %   iterations, 1 to 15, are 6 when they are not given; every one of them runs.
   %
-  %   options is a struct with any of these fields:
+  %   options are names with values, or a struct with any of these fields:
   %
   %     units       processing units of the core: 2 (default), 4 or 8
   %     algorithm   'max-log', 'scaled-max-log' (default) or 'max-star', or their numbers 0, 1 and 2
@@ -33,7 +34,7 @@ function [bits, details] = quarzel_decode (sys, par1, par2, iterations, options)
   %   details is a struct: tags, as they come back masked to tag_width, and trace, a text.
   %
   %   Errors have the identifiers quarzel:type, quarzel:value, quarzel:memory and quarzel:model; warnings of the
-  %   model have quarzel:warning.
+  %   model have quarzel:warning. Each call warns of its own first saturation.
   %
   %   Example
   %
@@ -43,96 +44,17 @@ function [bits, details] = quarzel_decode (sys, par1, par2, iterations, options)
   %
   %   See also quarzel_encode.
 
-  if (nargin < 3)
-    error ('quarzel:value', ['quarzel_decode: three streams are needed; ', ...
-           'call quarzel_decode (sys, par1, par2, iterations, options)']);
-  end
-  if (nargin < 4 || isempty (iterations))
-    iterations = 6;
-  end
-  if (nargin < 5)
-    options = struct ();
-  end
-  options = complete (options);
-  if (isempty (options.trace) && ~isempty (options.trace_file))
-    options.trace = 30;
-  end
-  answer = quarzel_mex ('decode', sys, par1, par2, whole (iterations, 'iterations'), ...
-                        whole (options.units, 'units'), algorithm (options.algorithm), ...
-                        whole (options.tag_width, 'tag_width'), tags (options.tags), passes (options.trace));
-  for i = 1:numel (answer.warnings)
-    warning ('quarzel:warning', '%s', answer.warnings{i});
-  end
-  if (~isempty (answer.fault))
-    error (['quarzel:', answer.fault], 'quarzel_decode: %s', answer.text);
-  end
-  if (~isempty (options.trace_file))
-    write_file (options.trace_file, answer.trace);
-  end
-  bits = answer.bits;
-  details = struct ('tags', answer.tags, 'trace', answer.trace);
-end
-
-% The options with defaults where they say nothing.
-function options = complete (given)
-  options = struct ('units', 2, 'algorithm', 'scaled-max-log', 'tag_width', 8, 'tags', [], ...
-                    'trace', [], 'trace_file', '');
-  names = fieldnames (options);
-  if (~isstruct (given) || numel (given) ~= 1)
-    error ('quarzel:type', 'quarzel_decode: options must be a struct; its fields may be %s', ...
-           strjoin (names', ', '));
-  end
-  fields = fieldnames (given);
-  for i = 1:numel (fields)
-    if (~any (strcmp (fields{i}, names)))
-      error ('quarzel:value', 'quarzel_decode: there is no option ''%s''; choose from %s', fields{i}, ...
-             strjoin (names', ', '));
+  [problem, bits, tags, trace] = quarzel_mex ('decode', varargin{:});
+  if (~isempty (problem))
+    for i = 1:numel (problem.warnings)
+      warning ('quarzel:warning', '%s', problem.warnings{i});
     end
-    options.(fields{i}) = given.(fields{i});
+    if (~isempty (problem.fault))
+      error (['quarzel:', problem.fault], 'quarzel_decode: %s', problem.text);
+    end
   end
-end
-
-% A whole number that an int holds, as double.
-function value = whole (value, name)
-  if (~isnumeric (value) || ~isscalar (value) || ~isreal (value) || value ~= fix (value) ...
-      || abs (double (value)) > 2147483647)
-    error ('quarzel:value', 'quarzel_decode: %s must be a whole number', name);
-  end
-  value = double (value);
-end
-
-function value = algorithm (value)
-  if (~ischar (value))
-    value = whole (value, 'algorithm');
-  end
-end
-
-function value = tags (value)
-  if (~isnumeric (value) || any (value(:) < 0 | value(:) > 4294967295 | value(:) ~= fix (value(:))))
-    error ('quarzel:value', 'quarzel_decode: tags must be whole numbers from 0 to 4294967295');
-  end
-  value = uint32 (value);
-end
-
-function value = passes (value)
-  if (isempty (value))
-    value = 0;
-    return
-  end
-  value = whole (value, 'trace');
-  if (value < 1)
-    error ('quarzel:value', 'quarzel_decode: trace must be 1 pass or more; there are two an iteration');
-  end
-end
-
-function write_file (name, text)
-  [file, message] = fopen (name, 'w');
-  if (file < 0)
-    error ('quarzel:value', 'quarzel_decode: %s cannot be written: %s; choose another trace_file', name, message);
-  end
-  count = fwrite (file, text);
-  if (fclose (file) ~= 0 || count ~= numel (text))
-    error ('quarzel:value', 'quarzel_decode: %s cannot be written whole; free some space', name);
+  if (nargout > 1)
+    details = struct ('tags', tags, 'trace', trace);
   end
 end
 
@@ -172,6 +94,30 @@ end
 %! decoded = quarzel_decode (scale (s), scale (p), scale (q), 3, struct ('units', 8, 'algorithm', 'max-star'));
 %! assert (decoded, {bits(:,1), long});
 
+%!test  % names with values mean what a struct does, with the iterations and without
+%! noisy = cellfun (@(x) int8 (double (x) + 9 * randn (size (x))), soft, 'UniformOutput', false);
+%! expected = quarzel_decode (noisy{:}, 6, struct ('units', 8, 'algorithm', 'max-star'));
+%! assert (quarzel_decode (noisy{:}, 6, 'units', 8, 'algorithm', 'max-star'), expected);
+%! assert (quarzel_decode (noisy{:}, 'algorithm', int8 (2), 'units', uint64 (8)), expected);
+%! assert (quarzel_decode (noisy{:}, [], 'units', single (8), 'algorithm', 2), expected);
+
+%!test  % tags of any class
+%! for convert = {@uint8, @int64, @single, @uint32}
+%!   [~, details] = quarzel_decode (soft{:}, 'tags', convert{1} (1:7));
+%!   assert (details.tags, uint32 (1:7));
+%! end
+
+%!test  % a trace is the same in every call
+%! block = {soft{1}(:,1), soft{2}(:,1), soft{3}(:,1)};
+%! [~, first] = quarzel_decode (block{:}, 2, 'trace', 2);
+%! [~, second] = quarzel_decode (block{:}, 2, 'trace', 2);
+%! assert (second.trace, first.trace);
+
+%!test  % more settings than are kept
+%! for width = [0:32, 0]
+%!   assert (quarzel_decode (soft{:}, 6, 'tag_width', width), bits);
+%! end
+
 %!test  % no cells, no blocks
 %! assert (quarzel_decode ({}, {}, {}), {});
 
@@ -187,6 +133,8 @@ end
 %! assert (details.tags, uint32 ([12 13 14 15 0 1 2]));
 
 %!warning <truncated to 4 bits> quarzel_decode (soft{:}, 6, struct ('tag_width', 4, 'tags', 12:18));
+%!warning id=quarzel:warning quarzel_decode (500 * ones (44, 1), zeros (44, 1), zeros (44, 1));
+% A core is kept from call to call; the warning comes all the same.
 %!warning id=quarzel:warning quarzel_decode (500 * ones (44, 1), zeros (44, 1), zeros (44, 1));
 %!warning <position 3 saturated negatively> quarzel_decode (int16 ([0 0 0 -200 zeros(1, 40)]), ...
 %!        zeros (1, 44, 'int16'), zeros (1, 44, 'int16'));
@@ -222,9 +170,15 @@ end
 %!error <units must be 2, 4 or 8, not 3> quarzel_decode (soft{:}, 6, struct ('units', 3))
 %!error <no algorithm 'log-map'; choose one of max-log, scaled-max-log, max-star> quarzel_decode (soft{:}, 6, struct ('algorithm', 'log-map'))
 %!error <no option 'unit'; choose from units, algorithm> quarzel_decode (soft{:}, 6, struct ('unit', 2))
-%!error <options must be a struct> quarzel_decode (soft{:}, 6, 8)
+%!error <options must be names with values, or a struct> quarzel_decode (soft{:}, 6, 8)
+%!error <the option 'units' needs a value> quarzel_decode (soft{:}, 6, 'units')
+%!error <no option 'unit'; choose from units, algorithm> quarzel_decode (soft{:}, 6, 'unit', 2)
+%!error <units must be a whole number> quarzel_decode (soft{:}, 6, 'units', '8')
+%!error <trace_file must be the name of a file> quarzel_decode (soft{:}, 6, 'trace_file', 8)
+%!error <nowhere/trace cannot be written: .*; choose another trace_file> ...
+%! quarzel_decode (soft{1}(:,1), soft{2}(:,1), soft{3}(:,1), 1, 'trace_file', '/nowhere/trace')
 %!error <6 tags for 7 blocks|one tag a block> quarzel_decode (soft{:}, 6, struct ('tags', 1:6))
 %!error <tags must be whole numbers> quarzel_decode (soft{:}, 6, struct ('tags', -1))
 %!error <a trace shows one block> quarzel_decode (soft{:}, 6, struct ('trace', 1))
 %!error <1 pass or more> quarzel_decode (soft{:}, 6, struct ('trace', 0))
-%!error <not to be called directly> answer = quarzel_mex ('x'); error (answer.text);
+%!error <not to be called directly> problem = quarzel_mex ('x'); error (problem.text);

@@ -36,13 +36,13 @@ function [sys, par1, par2] = quarzel_encode (bits)
   if (is_row)
     columns = columns';
   end
-  answer = quarzel_mex ('encode', columns);
-  if (~isempty (answer.fault))
-    error (['quarzel:', answer.fault], 'quarzel_encode: %s', answer.text);
+  [problem, code] = quarzel_mex ('encode', columns);
+  if (~isempty (problem))
+    error (['quarzel:', problem.fault], 'quarzel_encode: %s', problem.text);
   end
-  sys = stream (answer.bits, 1, is_row);
-  par1 = stream (answer.bits, 2, is_row);
-  par2 = stream (answer.bits, 3, is_row);
+  sys = stream (code, 1, is_row);
+  par1 = stream (code, 2, is_row);
+  par2 = stream (code, 3, is_row);
 end
 
 % One stream of the code bits, lying as the bits did.

@@ -138,10 +138,10 @@ std::size_t MexBlocks::count() const {
     return count;
 }
 
-bindings::Outcome MexBlocks::decode(bindings::HostCore& core, int iterations,
-                                    std::span<unsigned> tags) const {
+bindings::Outcome MexBlocks::decode(bindings::HostCore& core, int iterations, std::span<unsigned> tags,
+                                    const bindings::HostCore::Interrupted& interrupted) const {
     if (itsMatrices.size() == 1) {
-        return core.decode({itsMatrices[0].blocks, iterations, itsMatrices[0].bits, tags});
+        return core.decode({itsMatrices[0].blocks, iterations, itsMatrices[0].bits, tags}, interrupted);
     }
     // Blocks of several sizes and classes: a record for each, over ints.
     std::vector<std::vector<int>> ints;
@@ -161,7 +161,7 @@ bindings::Outcome MexBlocks::decode(bindings::HostCore& core, int iterations,
                           static_cast<int>(positions), iterations, tags[inputs.size()]});
         outputs.push_back({matrix.bits.data(), static_cast<int>(matrix.bits.size()), 0, 0});
     }
-    bindings::Outcome outcome = core.decodeBatch(inputs, outputs);
+    bindings::Outcome outcome = core.decodeBatch(inputs, outputs, interrupted);
     std::transform(outputs.begin(), outputs.end(), tags.begin(),
                    [](const vardel_ip_quarzel_outputs& output) { return output.tag; });
     return outcome;

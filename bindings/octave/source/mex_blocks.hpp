@@ -26,7 +26,8 @@ class MexBlocks {
 
     /// Decode them.
     /// @param tags  one for each block, comes back masked
-    bindings::Outcome decode(bindings::HostCore& core, int iterations, std::span<unsigned> tags) const;
+    bindings::Outcome decode(bindings::HostCore& core, int iterations, std::span<unsigned> tags,
+                             const bindings::HostCore::Interrupted& interrupted) const;
 
     /// Decode the only block with a trace, as text in the outcome.
     /// @throws bindings::BindingError when there are more or none

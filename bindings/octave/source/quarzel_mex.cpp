@@ -1,33 +1,45 @@
 // SPDX-License-Identifier: MIT
 // The function behind quarzel_decode and quarzel_encode, over the C API that Octave and MATLAB share:
 //
-//   answer = quarzel_mex('decode', sys, par1, par2, iterations, units, algorithm, tag_width, tags, passes)
-//   answer = quarzel_mex('encode', bits)
+//   [problem, bits, tags, trace] = quarzel_mex('decode', sys, par1, par2, ...)  as for quarzel_decode
+//   [problem, code] = quarzel_mex('encode', bits)                               bits of uint8
 //
-// It never raises an error, which would leave C++ by a jump: `answer.fault` names what went wrong, and the
-// functions that users call raise it. They have checked that numbers are whole and in the range of an int.
+// It never raises an error, which would leave C++ by a jump. `problem` is empty, or a struct: `fault` names
+// what went wrong, `text` says it, `warnings` are the model's. The functions that users call raise them.
 #include <mex.h>
 
 #include <algorithm>
 #include <array>
+#include <cerrno>
+#include <csignal>
 #include <cstdint>
+#include <cstdio>
+#include <cstring>
+#include <span>
 #include <string>
 #include <vector>
 
 #include "common/encoding.hpp"
 #include "common/host_core.hpp"
+#include "core_shelf.hpp"
+#include "decode_options.hpp"
 #include "mex_blocks.hpp"
+
+// Octave counts signals here until it handles them, after the call. MATLAB has no such counter.
+extern "C" __attribute__((weak)) volatile std::sig_atomic_t octave_signal_caught;
 
 namespace {
 
 using quarzel::bindings::BindingError;
 using quarzel::bindings::Fault;
 using quarzel::bindings::guarded;
-using quarzel::bindings::HostCore;
 using quarzel::bindings::Outcome;
+using quarzel::octave::CoreShelf;
+using quarzel::octave::DecodeOptions;
 using quarzel::octave::MexBlocks;
-
-constexpr std::array<const char*, 6> answerFields = {"fault", "text", "warnings", "bits", "tags", "trace"};
+using quarzel::octave::textOf;
+using Arguments = std::span<const mxArray* const>;
+using Results = std::array<mxArray*, 4>;
 
 /// The part of an error's identifier that tells its kind.
 const char* nameOf(Fault fault) {
@@ -38,6 +50,8 @@ const char* nameOf(Fault fault) {
             return "type";
         case Fault::value:
             return "value";
+        case Fault::interrupted:
+            return "interrupted";
         case Fault::memory:
             return "memory";
         default:
@@ -45,14 +59,8 @@ const char* nameOf(Fault fault) {
     }
 }
 
-int wholeNumber(const mxArray* array) {
-    return static_cast<int>(mxGetScalar(array));
-}
-
-std::string textOf(const mxArray* array) {
-    std::vector<char> text(mxGetNumberOfElements(array) + 1);
-    mxGetString(array, text.data(), static_cast<mwSize>(text.size()));
-    return text.data();
+bool isInterrupted() {
+    return &octave_signal_caught != nullptr && octave_signal_caught != 0;
 }
 
 /// Throw what went wrong inside.
@@ -62,82 +70,112 @@ void check(const Outcome& outcome) {
     }
 }
 
-/// The tags of the caller, one for each block; zeros when there are none.
-std::vector<unsigned> tagsOf(const mxArray* from, std::size_t blocks) {
-    const std::size_t count = mxGetNumberOfElements(from);
-    if (count == 0) {
-        return std::vector<unsigned>(blocks);
+void writeFile(const std::string& name, const std::string& text) {
+    std::FILE* const file = std::fopen(name.c_str(), "w");
+    if (file == nullptr) {
+        throw BindingError(Fault::value, name + " cannot be written: " + std::strerror(errno) +
+                                             "; choose another trace_file");
     }
-    if (count != blocks) {
-        throw BindingError(Fault::value, "there are " + std::to_string(count) + " tags for " +
-                                             std::to_string(blocks) + " blocks; give one tag a block");
+    const std::size_t count = std::fwrite(text.data(), 1, text.size(), file);
+    if (std::fclose(file) != 0 || count != text.size()) {
+        throw BindingError(Fault::value, name + " cannot be written whole; free some space");
     }
-    const auto* const tags = static_cast<const std::uint32_t*>(mxGetData(from));
-    return {tags, tags + count};
 }
 
-void decode(mxArray* answer, const mxArray* const* arguments, std::vector<std::string>& warnings) {
+void decode(Results& results, Arguments arguments, std::vector<std::string>& warnings) {
+    static CoreShelf shelf;
+    if (arguments.size() < 3) {
+        throw BindingError(Fault::value,
+                           "three streams are needed; call quarzel_decode (sys, par1, par2, iterations)");
+    }
+    DecodeOptions options = quarzel::octave::decodeOptions(arguments.subspan(3));
     const MexBlocks blocks({arguments[0], arguments[1], arguments[2]});
-    mxSetField(answer, 0, "bits", blocks.bits());
-    std::vector<unsigned> tags = tagsOf(arguments[7], blocks.count());
-    const int iterations = wholeNumber(arguments[3]);
-    const int algorithm = mxIsChar(arguments[5]) ? quarzel::bindings::algorithmOf(textOf(arguments[5]))
-                                                 : wholeNumber(arguments[5]);
-    HostCore core;
-    check(core.open({wholeNumber(arguments[4]), algorithm, wholeNumber(arguments[6])}));
-    const int passes = wholeNumber(arguments[8]);
-    Outcome outcome = passes == 0 ? blocks.decode(core, iterations, tags)
-                                  : blocks.trace(core, iterations, tags, static_cast<unsigned>(passes));
+    results[1] = blocks.bits();
+    std::vector<unsigned>& tags = options.tags;
+    if (!tags.empty() && tags.size() != blocks.count()) {
+        throw BindingError(Fault::value, "there are " + std::to_string(tags.size()) + " tags for " +
+                                             std::to_string(blocks.count()) +
+                                             " blocks; give one tag a block");
+    }
+    tags.resize(blocks.count());
+    Outcome outcome;
+    if (options.passes == 0) {
+        outcome = blocks.decode(shelf.take(options.settings), options.iterations, tags, isInterrupted);
+        // The next call tells of its own first saturation.
+        if (!outcome.done() || !outcome.warnings.empty()) {
+            shelf.drop();
+        }
+    } else {
+        // A trace shows what earlier blocks have left at the termination steps: nothing, in a new core.
+        quarzel::bindings::HostCore core;
+        check(core.open(options.settings));
+        outcome = blocks.trace(core, options.iterations, tags, options.passes);
+    }
     warnings.swap(outcome.warnings);
     check(outcome);
-    if (passes != 0) {
-        mxSetField(answer, 0, "trace", mxCreateString(outcome.trace.c_str()));
+    if (!options.traceFile.empty()) {
+        writeFile(options.traceFile, outcome.trace);
     }
-    mxArray* const tagsBack =
-        mxCreateNumericMatrix(1, static_cast<mwSize>(tags.size()), mxUINT32_CLASS, mxREAL);
-    std::copy(tags.begin(), tags.end(), static_cast<std::uint32_t*>(mxGetData(tagsBack)));
-    mxSetField(answer, 0, "tags", tagsBack);
+    results[2] = mxCreateNumericMatrix(1, static_cast<mwSize>(tags.size()), mxUINT32_CLASS, mxREAL);
+    std::copy(tags.begin(), tags.end(), static_cast<std::uint32_t*>(mxGetData(results[2])));
+    results[3] = mxCreateString(outcome.trace.c_str());
 }
 
 /// The columns of a uint8 matrix, encoded: (K + 4) x 3 x blocks.
-void encode(mxArray* answer, const mxArray* bits) {
+void encode(Results& results, const mxArray* bits) {
     const std::size_t K = mxGetM(bits);
     const std::size_t blocks = mxGetN(bits);
     const std::array<mwSize, 3> shape = {static_cast<mwSize>(K + quarzel::tailPositions), 3,
                                          static_cast<mwSize>(blocks)};
-    mxArray* const code = mxCreateNumericArray(3, shape.data(), mxUINT8_CLASS, mxREAL);
-    mxSetField(answer, 0, "bits", code);
+    results[1] = mxCreateNumericArray(3, shape.data(), mxUINT8_CLASS, mxREAL);
     check(quarzel::bindings::encode(static_cast<const std::uint8_t*>(mxGetData(bits)), K, blocks,
-                                    static_cast<std::uint8_t*>(mxGetData(code))));
+                                    static_cast<std::uint8_t*>(mxGetData(results[1]))));
 }
 
-mxArray* run(int count, const mxArray* const* arguments) noexcept {
-    mxArray* const answer = mxCreateStructMatrix(1, 1, static_cast<int>(answerFields.size()),
-                                                 const_cast<const char**>(answerFields.data()));
-    std::vector<std::string> warnings;
-    const Outcome outcome = guarded([&] {
-        const std::string command = count > 0 && mxIsChar(arguments[0]) ? textOf(arguments[0]) : "";
-        if (command == "decode" && count == 10) {
-            decode(answer, arguments + 1, warnings);
-        } else if (command == "encode" && count == 2 && mxIsUint8(arguments[1])) {
-            encode(answer, arguments[1]);
-        } else {
-            throw BindingError(Fault::value, "quarzel_mex is not to be called directly; see quarzel_decode");
-        }
-    });
-    mxSetField(answer, 0, "fault", mxCreateString(nameOf(outcome.fault)));
-    mxSetField(answer, 0, "text", mxCreateString(outcome.message()));
+/// What the functions that users call are to raise; an empty matrix when there is nothing.
+mxArray* problemOf(const Outcome& outcome, const std::vector<std::string>& warnings) {
+    if (outcome.done() && warnings.empty()) {
+        return mxCreateDoubleMatrix(0, 0, mxREAL);
+    }
+    std::array<const char*, 3> fields = {"fault", "text", "warnings"};
+    mxArray* const problem = mxCreateStructMatrix(1, 1, static_cast<int>(fields.size()), fields.data());
+    mxSetField(problem, 0, "fault", mxCreateString(nameOf(outcome.fault)));
+    mxSetField(problem, 0, "text", mxCreateString(outcome.message()));
     mxArray* const texts = mxCreateCellMatrix(1, static_cast<mwSize>(warnings.size()));
     for (std::size_t i = 0; i < warnings.size(); ++i) {
         mxSetCell(texts, static_cast<mwIndex>(i), mxCreateString(warnings[i].c_str()));
     }
-    mxSetField(answer, 0, "warnings", texts);
-    return answer;
+    mxSetField(problem, 0, "warnings", texts);
+    return problem;
+}
+
+Results run(Arguments arguments) noexcept {
+    Results results{};
+    std::vector<std::string> warnings;
+    const Outcome outcome = guarded([&] {
+        const std::string command = !arguments.empty() && mxIsChar(arguments[0]) ? textOf(arguments[0]) : "";
+        if (command == "decode") {
+            decode(results, arguments.subspan(1), warnings);
+        } else if (command == "encode" && arguments.size() == 2 && mxIsUint8(arguments[1])) {
+            encode(results, arguments[1]);
+        } else {
+            throw BindingError(Fault::value, "quarzel_mex is not to be called directly; see quarzel_decode");
+        }
+    });
+    results[0] = problemOf(outcome, warnings);
+    return results;
 }
 
 }  // namespace
 
-extern "C" __attribute__((visibility("default"))) void mexFunction(int /*outputs*/, mxArray* results[],
-                                                                   int count, const mxArray* arguments[]) {
-    results[0] = run(count, arguments);
+extern "C" __attribute__((visibility("default"))) void mexFunction(int outputs, mxArray* results[], int count,
+                                                                   const mxArray* arguments[]) {
+    const Results all = run({arguments, static_cast<std::size_t>(count)});
+    for (std::size_t i = 0; i < all.size(); ++i) {
+        if (static_cast<int>(i) < std::max(outputs, 1)) {
+            results[i] = all[i] != nullptr ? all[i] : mxCreateDoubleMatrix(0, 0, mxREAL);
+        } else if (all[i] != nullptr) {
+            mxDestroyArray(all[i]);
+        }
+    }
 }

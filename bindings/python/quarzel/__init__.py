@@ -12,15 +12,19 @@ three streams of K + 4 soft values (systematic, parity 1, parity 2), the last 4 
 the standard places it.
 """
 
+from ._code import Segments, block_sizes, encode, qpp, segments
 from ._core import ModelWarning
 from ._core import version as __version__
-from .code import Segments, block_sizes, encode, qpp, segments
-from .decoder import Decoder, algorithms, implementations
-from .scoreboard import Mismatch, Scoreboard
-from .simulation import Curve, Point, SweepResult, sweep
-from .trace import BlockTrace, read_trace
+from ._decoder import Decoder, algorithms, implementations
+from ._mismatch import Mismatch
+from ._scoreboard import Scoreboard
+from ._simulation import Curve, Point, SweepResult, sweep
+from ._soft import quantise
+from ._trace import BlockTrace, read_trace
+from ._types import Algorithm, Units
 
 __all__ = [
+    "Algorithm",
     "BlockTrace",
     "Curve",
     "Decoder",
@@ -30,13 +34,21 @@ __all__ = [
     "Scoreboard",
     "Segments",
     "SweepResult",
+    "Units",
     "__version__",
     "algorithms",
     "block_sizes",
     "encode",
     "implementations",
     "qpp",
+    "quantise",
     "read_trace",
     "segments",
     "sweep",
 ]
+
+# Tracebacks, pickles and help name the package, not the submodule where something happens to stand.
+for _public in (BlockTrace, Curve, Decoder, Mismatch, Point, Scoreboard, Segments, SweepResult, encode, implementations,
+                qpp, quantise, read_trace, segments, sweep):  # fmt: skip
+    _public.__module__ = __name__
+del _public

@@ -4,8 +4,10 @@ from typing import Any, Optional
 import numpy as np
 from numpy.typing import NDArray
 
+from ._types import Algorithm
+
 version: str
-algorithms: tuple[str, ...]
+algorithms: tuple[Algorithm, ...]
 
 class ModelWarning(UserWarning): ...
 
@@ -22,6 +24,9 @@ class Core:
         tags: Optional[NDArray[np.uint32]],
         every_iteration: bool,
     ) -> tuple[NDArray[np.uint8], NDArray[np.uint32]]: ...
+    def decode_plain(
+        self, systematic: object, parity1: object, parity2: object, iterations: object
+    ) -> Optional[NDArray[np.uint8]]: ...
     def trace(
         self,
         systematic: NDArray[Any],

@@ -1,5 +1,5 @@
 # SPDX-License-Identifier: MIT
-"""Soft values on their way to the extension: checked, never changed."""
+"""Soft values: made of log-likelihood ratios, and on their way to the extension checked, never changed."""
 
 from __future__ import annotations
 
@@ -9,6 +9,8 @@ from typing import Any, NamedTuple, Optional
 import numpy as np
 from numpy.typing import ArrayLike, NDArray
 
+from ._checks import array_of, real
+
 
 class SoftBlocks(NamedTuple):
     """Three streams of one type and layout, and the shape of the blocks before they became rows."""
@@ -17,6 +19,31 @@ class SoftBlocks(NamedTuple):
     """each (blocks, K + 4)"""
     shape: tuple[int, ...]
     """of the blocks; () for a single one"""
+
+
+def quantise(llr: ArrayLike, scale: float = 4.0) -> NDArray[np.int8]:
+    """Turn log-likelihood ratios into soft values: multiply, round to the nearest, clip to -128 ... 127.
+
+    Positive means bit 1, here as in the soft values: ``llr = log(P(bit = 1) / P(bit = 0))``. Change the sign first
+    where yours is the other way round.
+
+    :param llr: real numbers in an array of any shape; infinities become the ends of the range
+    :param scale: units of 1/8 for a ratio of 1; the default is that of :func:`sweep`
+    :raises TypeError: the ratios are masked, or not real numbers
+    :raises ValueError: some are not a number (NaN), or the scale is not above 0
+
+    >>> quarzel.quantise([-0.6, 0.0, 2.5, 1000.0])
+    array([ -2,   0,  10, 127], dtype=int8)
+    """
+    array = array_of("llr", llr)
+    if array.dtype.kind not in "fiu":
+        raise TypeError(f"llr must hold real numbers, not {array.dtype}")
+    scaled = array * real("scale", scale)
+    wrong = np.count_nonzero(np.isnan(scaled))
+    if wrong:
+        raise ValueError(f"{wrong} of {scaled.size} ratios are not a number (NaN); 0 says that a bit is unknown")
+    quantised: NDArray[np.int8] = np.clip(np.rint(scaled), -128, 127).astype(np.int8)
+    return quantised
 
 
 def soft_blocks(systematic: ArrayLike, parity1: Optional[ArrayLike], parity2: Optional[ArrayLike]) -> SoftBlocks:
@@ -42,13 +69,15 @@ def soft_blocks(systematic: ArrayLike, parity1: Optional[ArrayLike], parity2: Op
 
 
 def _soft_array(values: ArrayLike, name: str) -> NDArray[Any]:
-    array = np.asarray(values)
+    array = array_of(name, values)
     if array.dtype.kind != "i" or array.dtype.itemsize > 4:
         remedy = (
-            "quantise first, for instance numpy.clip(numpy.rint(8 * llr), -128, 127).astype(numpy.int8)"
+            f"quantise log-likelihood ratios first: quarzel.quantise({name})"
             if array.dtype.kind == "f"
             else f"use {name}.astype(numpy.int8), or int16 or int32 where the values need it"
         )
+        if not array.size:
+            remedy = f"it is empty: give K + 4 soft values, or numpy.zeros({array.shape}, numpy.int8) for no blocks"
         raise TypeError(f"{name} must be int8, int16 or int32, not {array.dtype}; {remedy}")
     return array
 

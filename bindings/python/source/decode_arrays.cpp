@@ -73,6 +73,21 @@ ArrayBlocks arrayBlocks(const py::array& systematic, const py::array& parity1, c
     }
 }
 
+void decodeInto(bindings::HostCore& core, const ArrayBlocks& blocks, int iterations, Bytes& bits,
+                std::span<unsigned> tags, bool everyIteration) {
+    const bindings::DecodeJob job{blocks,
+                                  iterations,
+                                  {bits.mutable_data(), static_cast<std::size_t>(bits.size())},
+                                  tags,
+                                  everyIteration};
+    bindings::Outcome outcome;
+    {
+        const py::gil_scoped_release release;
+        outcome = core.decode(job, LookForSignals());
+    }
+    raise(outcome);
+}
+
 std::tuple<Bytes, Tags> decodeArrays(bindings::HostCore& core, const py::array& systematic,
                                      const py::array& parity1, const py::array& parity2, int iterations,
                                      const std::optional<Tags>& tags, bool everyIteration) {
@@ -93,17 +108,7 @@ std::tuple<Bytes, Tags> decodeArrays(bindings::HostCore& core, const py::array& 
         }
         Bytes bits(everyIteration ? std::vector<py::ssize_t>{count, iterations, K}
                                   : std::vector<py::ssize_t>{count, K});
-        const bindings::DecodeJob job{blocks,
-                                      iterations,
-                                      {bits.mutable_data(), static_cast<std::size_t>(bits.size())},
-                                      tagSpan,
-                                      everyIteration};
-        bindings::Outcome outcome;
-        {
-            const py::gil_scoped_release release;
-            outcome = core.decode(job, LookForSignals());
-        }
-        raise(outcome);
+        decodeInto(core, blocks, iterations, bits, tagSpan, everyIteration);
         return std::tuple(bits, tagsBack);
     });
 }

@@ -5,6 +5,7 @@
 
 #include <cstdint>
 #include <optional>
+#include <span>
 #include <tuple>
 
 #include "common/host_core.hpp"
@@ -20,6 +21,13 @@ using Tags = pybind11::array_t<std::uint32_t, pybind11::array::c_style>;
 /// @throws bindings::BindingError when they do not
 bindings::ArrayBlocks arrayBlocks(const pybind11::array& systematic, const pybind11::array& parity1,
                                   const pybind11::array& parity2);
+
+/// Decode blocks into an array that is there. The GIL is released meanwhile.
+/// @param bits  (blocks, K), or (blocks, iterations, K)
+/// @param tags  one for each block, comes back masked; may be empty
+/// @throws pybind11::error_already_set when the core refuses, the user interrupts or has made warnings errors
+void decodeInto(bindings::HostCore& core, const bindings::ArrayBlocks& blocks, int iterations, Bytes& bits,
+                std::span<unsigned> tags, bool everyIteration);
 
 /// Decode blocks of one size, as for arrayBlocks. The GIL is released meanwhile.
 /// @param tags             one for each block

@@ -11,7 +11,7 @@
 #include "common/encoding.hpp"
 #include "common/host_core.hpp"
 #include "decode_arrays.hpp"
-#include "link/size_table.hpp"
+#include "plain_decode.hpp"
 #include "raise.hpp"
 #include "trace_arrays.hpp"
 
@@ -53,16 +53,8 @@ std::vector<std::uint32_t> blockSizes() {
     return sizes;
 }
 
-/// @throws pybind11::value_error naming the nearest sizes when K is not a block size
-void checkSize(std::uint32_t K) {
-    if (!quarzel::findBlockSize(K)) {
-        throw py::value_error("there is no block size of " + std::to_string(K) +
-                              " bits; the nearest: " + quarzel::link::nearestBlockSizesText(K));
-    }
-}
-
+/// @param K  a block size
 py::array_t<std::int32_t> qpp(std::uint32_t K) {
-    checkSize(K);
     const std::vector<unsigned> indices = quarzel::permutation(K);
     py::array_t<std::int32_t> permutation(static_cast<py::ssize_t>(indices.size()));
     std::copy(indices.begin(), indices.end(), permutation.mutable_data());
@@ -71,7 +63,6 @@ py::array_t<std::int32_t> qpp(std::uint32_t K) {
 
 /// The number of segments, and the lengths of the windows of one of them, from the lowest up.
 std::tuple<unsigned, std::vector<unsigned>> layout(std::uint32_t K, std::uint32_t units) {
-    checkSize(K);
     const quarzel::Layout layout = quarzel::layout(K, units);
     return {layout.segments, {layout.window_steps, layout.window_steps + layout.windows}};
 }
@@ -98,6 +89,8 @@ PYBIND11_MODULE(_core, module) {
         .def_property_readonly("implementation", &HostCore::implementation)
         .def("decode", &decodeArrays, py::arg("systematic"), py::arg("parity1"), py::arg("parity2"),
              py::arg("iterations"), py::arg("tags"), py::arg("every_iteration"))
+        .def("decode_plain", &decodePlain, py::arg("systematic"), py::arg("parity1"), py::arg("parity2"),
+             py::arg("iterations"))
         .def("trace", &traceArrays, py::arg("systematic"), py::arg("parity1"), py::arg("parity2"),
              py::arg("iterations"), py::arg("passes"))
         .def("close", [](HostCore& core) { raise(core.close()); });

@@ -54,10 +54,19 @@ def test_segments_cover_every_step_once():
     assert beta.shape == (2, 8, 2)
 
 
+def test_refuses_sizes_and_units_that_are_no_numbers_of_the_core():
+    for K in (40.0, "40", None):
+        with pytest.raises(TypeError, match="K must be a block size, not .*; quarzel.block_sizes lists them"):
+            quarzel.qpp(K)
+    for units in (3, 2**40):
+        with pytest.raises(ValueError, match=f"units must be 2, 4 or 8, not {units}"):
+            quarzel.segments(40, units)
+
+
 @pytest.mark.parametrize("K, nearest", [(41, "40, 48"), (-1, "40"), (10**12, "6144")])
 def test_names_the_nearest_sizes(K, nearest):
     for call in (quarzel.qpp, lambda size: quarzel.segments(size, 2)):
-        with pytest.raises(ValueError, match=f"nearest: {nearest}$"):
+        with pytest.raises(ValueError, match=f"no block size of {K} bits; the nearest: {nearest}$"):
             call(K)
 
 
@@ -87,6 +96,9 @@ def test_encode_takes_batches_and_booleans(rng):
         (np.full(40, -1), ValueError, "a bit must be 0 or 1"),
         (np.zeros(41, np.uint8), ValueError, "nearest: 40, 48"),
         (np.uint8(1), ValueError, "array of K bits"),
+        (np.zeros(0, np.uint8), ValueError, "no block size of 0 bits; the nearest: 40$"),
+        (np.ma.zeros(40, np.uint8), TypeError, r"bits is a masked array, .* use bits\.filled\(0\)"),
+        ([[0, 1], [1]], ValueError, "bits is not an array: its rows must have the same length"),
     ],
 )
 def test_encode_refuses_what_are_no_bits(bits, error, text):

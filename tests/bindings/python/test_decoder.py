@@ -2,11 +2,15 @@
 """Decoding: bits, shapes, types, and what is refused."""
 
 import contextlib
+import copy
 import gc
+import multiprocessing
+import pickle
 import signal
 import threading
 import time
 import warnings
+from pathlib import Path
 
 import numpy as np
 import pytest
@@ -139,7 +143,7 @@ def test_the_first_saturation_is_a_warning_that_names_the_line_of_the_user(capfd
 @pytest.mark.parametrize(
     "soft, error, text",
     [
-        (np.zeros((3, 44)), TypeError, r"must be int8, int16 or int32, not float64; .*numpy\.rint\(8 \* llr\)"),
+        (np.zeros((3, 44)), TypeError, r"must be int8, int16 or int32, not float64; .*quarzel\.quantise\(systematic\)"),
         (np.zeros((3, 44), np.int64), TypeError, r"not int64; use systematic\.astype\(numpy\.int8\)"),
         (np.zeros((3, 44), np.uint8), TypeError, "not uint8"),
         (np.zeros((3, 45), np.int8), ValueError, r"of 45 soft values; .* 44 \(K = 40\), 52 \(K = 48\)"),
@@ -147,6 +151,11 @@ def test_the_first_saturation_is_a_warning_that_names_the_line_of_the_user(capfd
         (np.zeros((3, 0), np.int8), ValueError, r"nearest that have one: 44 \(K = 40\)"),
         (np.zeros((2, 44), np.int8), ValueError, r"shape \(2, 44\) does not hold three streams"),
         (np.int8(1), ValueError, "does not hold three streams"),
+        ([], TypeError, r"not float64; it is empty: give K \+ 4 soft values"),
+        (np.zeros(0, np.int8), ValueError, r"shape \(0,\) does not hold three streams"),
+        (np.ma.masked_less(np.zeros((3, 44), np.int8), 0), TypeError, r"masked array, .* use systematic\.filled\(0\)"),
+        ([[1, 2], [3]], ValueError, "systematic is not an array: its rows must have the same length"),
+        ("soft", TypeError, "not <U4"),
     ],
 )
 def test_refuses_soft_values_with_a_remedy(soft, error, text):
@@ -162,18 +171,29 @@ def test_refuses_streams_that_do_not_fit_together():
         quarzel.Decoder().decode(stream, stream)
     with pytest.raises(ValueError, match="tags have the shape"):
         quarzel.Decoder().decode(stream, stream, stream, tags=[1])
+    with pytest.raises(TypeError, match="parity2 is a masked array"):
+        quarzel.Decoder().decode(stream, stream, np.ma.zeros(44, np.int8))
+    for tag, error in ((2**32, ValueError), (-1, ValueError), (10**30, TypeError), (1.0, TypeError)):
+        with pytest.raises(error, match="tags must be .*from 0 to 4294967295"):
+            quarzel.Decoder().decode(stream, stream, stream, tags=tag)
 
 
 @pytest.mark.parametrize(
     "arguments, error, text",
     [
         ({"units": 3}, ValueError, "units must be 2, 4 or 8, not 3"),
-        ({"units": 2.0}, TypeError, "float"),
+        ({"units": 10**30}, ValueError, "units must be 2, 4 or 8, not 10{30}"),
+        ({"units": 2.0}, TypeError, "units must be 2, 4 or 8, not float"),
+        ({"units": "4"}, TypeError, "units must be 2, 4 or 8, not '4'"),
         ({"algorithm": "log-map"}, ValueError, "choose one of max-log, scaled-max-log, max-star"),
         ({"algorithm": 3}, ValueError, "algorithm must be 0, 1 or 2"),
-        ({"tag_width": 33}, ValueError, "tag width must be a number from 0 to 32"),
-        ({"implementation": "abacus"}, ValueError, "no implementation 'abacus'; choose one of .*literal$"),
-        ({"implementation": ""}, ValueError, "implementation must not be empty"),
+        ({"algorithm": None}, TypeError, "algorithm must be 0, 1 or 2, not NoneType"),
+        ({"tag_width": 33}, ValueError, "tag_width must be a number from 0 to 32, not 33"),
+        ({"tag_width": -(2**40)}, ValueError, "tag_width must be a number from 0 to 32, not -1099511627776"),
+        ({"implementation": 3}, ValueError, "no implementation 3; .* choose one of .*literal$"),
+        ({"implementation": "\ud800"}, ValueError, "choose one of .*literal$"),
+        ({"implementation": "abacus"}, ValueError, "no implementation 'abacus'; leave it out .* choose one of .*literal$"),
+        ({"implementation": ""}, ValueError, "no implementation ''; leave it out for the fastest one"),
     ],
 )
 def test_refuses_cores_that_there_are_not(arguments, error, text):
@@ -181,11 +201,90 @@ def test_refuses_cores_that_there_are_not(arguments, error, text):
         quarzel.Decoder(**arguments)
 
 
-@pytest.mark.parametrize("iterations, error", [(0, ValueError), (16, ValueError), (6.0, TypeError)])
-def test_refuses_iterations_that_the_core_does_not_have(iterations, error):
-    stream = np.zeros(44, np.int8)
-    with pytest.raises(error):
-        quarzel.Decoder().decode(stream, stream, stream, iterations)
+@pytest.mark.parametrize(
+    "iterations, error, text",
+    [
+        (0, ValueError, "a number from 1 to 15, not 0"),
+        (16, ValueError, "a number from 1 to 15, not 16"),
+        (10**30, ValueError, "a number from 1 to 15, not 10{30}"),
+        (6.0, TypeError, "a whole number, not float"),
+        (None, TypeError, "a whole number, not NoneType"),
+    ],
+)
+def test_refuses_iterations_that_the_core_does_not_have(iterations, error, text):
+    soft = np.zeros((3, 44), np.int8)
+    decoder = quarzel.Decoder()
+    for call in (decoder.decode, decoder.decode_every_iteration, decoder.trace):
+        with pytest.raises(error, match=f"iterations must be {text}"):
+            call(soft, iterations=iterations)
+
+
+@pytest.mark.parametrize("again", [copy.copy, copy.deepcopy, lambda decoder: pickle.loads(pickle.dumps(decoder))])
+def test_a_copy_has_the_settings_and_a_fresh_core(rng, again):
+    soft = noisy(rng, (3,), 64)
+    decoder = quarzel.Decoder(8, "max-star", tag_width=3, implementation="literal")
+    expected = decoder.decode(soft)
+    decoder.close()
+    other = again(decoder)
+    assert repr(other) == repr(decoder)
+    assert other.implementation == "literal"
+    assert np.array_equal(other.decode(soft), expected)
+    assert again(other).trace(soft[0]).block == 0
+
+
+def test_process_pools_take_decoders(rng):
+    soft = noisy(rng, (4,), 64)
+    decoder = quarzel.Decoder(4)
+    context = multiprocessing.get_context("spawn")
+    with context.Pool(1) as pool:
+        decided = pool.map(decoder.decode, soft)
+    assert np.array_equal(decided, decoder.decode(soft))
+
+
+def test_settings_cannot_be_set():
+    decoder = quarzel.Decoder()
+    for name in ("units", "algorithm", "tag_width", "implementation", "iterations"):
+        with pytest.raises(AttributeError, match=f"^{name} cannot be set: .* make another one with Decoder"):
+            setattr(decoder, name, 4)
+
+    class Named(quarzel.Decoder):
+        pass
+
+    named = Named()
+    named.label = "mine"
+    with pytest.raises(AttributeError, match="units cannot be set"):
+        named.units = 4
+
+
+def test_the_package_is_the_only_public_module():
+    package = Path(quarzel.__file__).parent
+    sources = (Path(__file__).parents[3] / "bindings/python/quarzel").glob("*.py")
+    assert all((package / source.name).exists() and source.name.startswith("_") for source in sources)
+    for name in quarzel.__all__:
+        assert getattr(getattr(quarzel, name), "__module__", "quarzel") in ("quarzel", "typing")
+
+
+def test_quantise_rounds_and_clips():
+    assert quarzel.quantise([[0.1, -0.2], [31.8, -40]]).tolist() == [[0, -1], [127, -128]]
+    ratios = np.array([np.inf, -np.inf, 0.375], dtype=np.float32)
+    assert quarzel.quantise(ratios, scale=8).tolist() == [127, -128, 3]
+    assert quarzel.quantise([]).dtype == np.int8
+
+
+@pytest.mark.parametrize(
+    "ratios, scale, error, text",
+    [
+        ([1.0, float("nan")], 4, ValueError, r"1 of 2 ratios are not a number \(NaN\)"),
+        ([1.0], 0, ValueError, "scale must be above 0 and finite, not 0"),
+        ([1.0], float("inf"), ValueError, "scale must be above 0 and finite, not inf"),
+        ([1.0], "4", TypeError, "scale must be a number, not str"),
+        ([1j], 4, TypeError, "llr must hold real numbers, not complex128"),
+        (np.ma.zeros(3), 4, TypeError, r"llr is a masked array, .* use llr\.filled\(0\)"),
+    ],
+)
+def test_quantise_refuses_what_has_no_soft_value(ratios, scale, error, text):
+    with pytest.raises(error, match=text):
+        quarzel.quantise(ratios, scale)
 
 
 def test_a_closed_decoder_says_so():

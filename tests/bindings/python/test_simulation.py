@@ -2,6 +2,7 @@
 """Sweeps: the same file as the tool's, callbacks, interruptions, refusals, pictures."""
 
 import subprocess
+import sys
 
 import numpy as np
 import pytest
@@ -76,21 +77,27 @@ def test_errors_after_each_iteration():
     [
         ({"block_size": 41}, "block size 41 is not possible; give one of the 188 sizes"),
         ({"algorithm": "log-map"}, "choose one of max-log"),
-        ({"algorithm": 3}, "algorithm 3 is not possible"),
+        ({"algorithm": 3}, "algorithm must be 0, 1 or 2, not 3"),
         ({"units": []}, "units"),
         ({"max_blocks": 0}, "number of blocks"),
-        ({"seed": -1}, "seed must be from 0"),
-        ({"seed": 2**64}, "seed must be from 0"),
+        ({"seed": -1}, "seed must be a number from 0 to 18446744073709551615, not -1"),
+        ({"seed": 2**64}, "seed must be a number from 0"),
         ({"llr": 8, "scale": 8}, "give one of them"),
-        ({"scale": 0}, "scale of the quantiser"),
-        ({"threads": 0}, "threads must be 1 or more"),
+        ({"scale": 0}, "scale must be above 0 and finite, not 0"),
+        ({"threads": 0}, "threads must be a number from 1 to 1024, not 0"),
+        ({"threads": 2**40}, "threads must be a number from 1 to 1024"),
+        ({"block_size": 10**30}, "block_size must be a number from 40 to 6144"),
+        ({"units": 3}, "units must be 2, 4 or 8, not 3"),
+        ({"iterations": [4, 16]}, "iterations must be a number from 1 to 15, not 16"),
+        ({"ebn0_db": [[1.0], [1.0, 2.0]]}, "ebn0_db is not an array"),
+        ({"scale": "8"}, "scale must be a number, not str"),
         ({"ebn0_db": []}, "no Eb/N0"),
         ({"ebn0_db": [100]}, "outside -20 to 40 dB"),
         ({"ebn0_db": [float("nan")]}, "finite"),
     ],
 )
 def test_refuses_what_is_not_possible(arguments, text):
-    with pytest.raises(ValueError, match=text):
+    with pytest.raises((ValueError, TypeError), match=text):
         quarzel.sweep(**{"ebn0_db": 1.0, **arguments})
 
 
@@ -109,3 +116,23 @@ def test_plots_the_rates_with_their_intervals(result):
     assert axes.get_yscale() == "log"
     with pytest.raises(ValueError, match="choose 'ber' or 'bler'"):
         result.plot(rate="wer")
+
+
+def test_a_table_has_a_row_for_each_point(result):
+    pandas = pytest.importorskip("pandas")
+    table = result.to_dataframe()
+    assert isinstance(table, pandas.DataFrame)
+    points = [(curve, point) for curve in result.curves for point in curve.points]
+    assert len(table) == len(points) == 8
+    for (curve, point), row in zip(points, table.itertuples()):
+        assert (row.block_size, row.algorithm, row.ebn0_db) == (curve.block_size, curve.algorithm, point.ebn0_db)
+        assert (row.bit_errors, row.bler, row.bler_low, row.bler_high) == (
+            point.bit_errors, point.bler, *point.bler_interval
+        )  # fmt: skip
+    assert "per_iteration" not in table
+
+
+def test_a_table_without_pandas_says_what_it_needs(result, monkeypatch):
+    monkeypatch.setitem(sys.modules, "pandas", None)
+    with pytest.raises(ImportError, match="to_dataframe needs pandas; install it"):
+        result.to_dataframe()

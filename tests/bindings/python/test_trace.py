@@ -1,8 +1,10 @@
 # SPDX-License-Identifier: MIT
 """Traces as arrays and as text."""
 
+import copy
 import ctypes
 import os
+import pickle
 import subprocess
 
 import numpy as np
@@ -97,6 +99,21 @@ def test_text_is_that_of_the_tool(soft, captures, tool, tmp_path):
     ours = tmp_path / "ours.txt"
     trace.save(ours)
     assert subprocess.run([tool, "trace-diff", model, ours], capture_output=True).returncode == 0
+
+
+def test_traces_compare_by_their_arrays_and_have_a_short_repr(soft):
+    decoder = quarzel.Decoder()
+    first = decoder.trace(soft[0], iterations=2)
+    assert repr(first) == "<BlockTrace: block 0, K = 40, 4 passes>"
+    assert first == quarzel.Decoder().trace(soft[0], iterations=2)
+    assert first == pickle.loads(pickle.dumps(first))
+    assert first != decoder.trace(soft[0], iterations=2), "another block of the decoder"
+    assert first != quarzel.Decoder().trace(soft[0], iterations=3)
+    assert first != quarzel.Decoder().trace(soft[1], iterations=2)
+    assert first != "a trace"
+    other = copy.deepcopy(first)
+    other.passes[3]["b"][42, 7] += 1
+    assert first != other
 
 
 def test_blocks_are_counted_on(soft):

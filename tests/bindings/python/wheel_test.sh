@@ -9,6 +9,7 @@ shift 3
 work=$(mktemp -d)
 trap 'rm -rf "$work"' EXIT
 
+"$python" "$source/tests/bindings/python/look_into_wheel.py" "$dist"/quarzel-*.whl
 "$python" -m pip install --quiet --disable-pip-version-check --root-user-action=ignore --no-index --no-deps \
     --no-compile --target "$work/packages" "$dist"/quarzel-*.whl
 export PYTHONPATH=$work/packages PYTHONDONTWRITEBYTECODE=1 MPLCONFIGDIR=$work

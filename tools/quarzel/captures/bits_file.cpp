@@ -9,7 +9,6 @@
 #include <xtensor/xnpy.hpp>
 
 #include "captures/npy_header.hpp"
-#include "files/input_file.hpp"
 #include "files/output_file.hpp"
 #include "tool_error.hpp"
 
@@ -25,8 +24,8 @@ void PackedBits::set(std::size_t block, const unsigned char* bits) {
     }
 }
 
-PackedBits readBits(const std::string& file, std::size_t blocks, std::size_t bytesPerBlock) {
-    std::ifstream stream = openInput(file);
+PackedBits readBits(std::istream& stream, const std::string& file, std::size_t blocks,
+                    std::size_t bytesPerBlock) {
     const NpyHeader header = readNpyHeader(stream, file);
     if (header.type != "|u1") {
         throw fileError(file, fmt::format("holds values of type '{}'", header.type),

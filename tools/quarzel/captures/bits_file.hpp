@@ -3,6 +3,7 @@
 
 #include <cstddef>
 #include <cstdint>
+#include <istream>
 #include <string>
 #include <vector>
 
@@ -25,8 +26,10 @@ struct PackedBits {
 };
 
 /// Read an npy file of uint8 values of shape (blocks, bytesPerBlock).
-/// @throws ToolError when the file cannot be read, is not well-formed or has another type or shape
-PackedBits readBits(const std::string& file, std::size_t blocks, std::size_t bytesPerBlock);
+/// @param file  the name for error messages
+/// @throws ToolError when it is not well-formed or has another type or shape
+PackedBits readBits(std::istream& stream, const std::string& file, std::size_t blocks,
+                    std::size_t bytesPerBlock);
 
 /// The bytes of an npy file of uint8 values of shape (blocks, bytesPerBlock).
 std::string npyOf(const PackedBits& bits);

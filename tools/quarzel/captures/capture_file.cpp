@@ -3,12 +3,10 @@
 
 #include "captures/capture_readers.hpp"
 #include "captures/npy_header.hpp"
-#include "files/input_file.hpp"
 
 namespace quarzel::tool {
 
-Capture readCapture(const std::string& file) {
-    std::ifstream stream = openInput(file);
+Capture readCapture(std::istream& stream, const std::string& file) {
     Capture capture = isNpy(stream, file) ? readNpyCapture(stream, file) : readCsvCapture(stream, file);
     capture.file = file;
     return capture;

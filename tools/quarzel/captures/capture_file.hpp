@@ -3,6 +3,7 @@
 
 #include <cstddef>
 #include <cstdint>
+#include <istream>
 #include <span>
 #include <string>
 #include <vector>
@@ -31,8 +32,8 @@ struct Capture {
 /// Read a capture: an npy file of int8, int16 or int32 values of shape (blocks, 3, K + 4), or CSV. Memory
 /// grows with what the file holds, not with what its header claims.
 ///
-/// @throws ToolError when the file cannot be read, is not well-formed, holds no block or has a K that LTE
-///                   does not have
-Capture readCapture(const std::string& file);
+/// @param file  its name, also for error messages; one that ends with .npy tells the format
+/// @throws ToolError when it is not well-formed, holds no block or has a K that LTE does not have
+Capture readCapture(std::istream& stream, const std::string& file);
 
 }  // namespace quarzel::tool

@@ -16,6 +16,7 @@
 #include "decode/decode_report.hpp"
 #include "decode/decode_together.hpp"
 #include "decode/progress.hpp"
+#include "files/input_file.hpp"
 #include "files/output_file.hpp"
 #include "options/core_options.hpp"
 #include "options/threads_option.hpp"
@@ -150,10 +151,12 @@ PackedBits decodeBlocks(const Capture& capture, const DecodeOptions& options, Tr
 
 void decode(const DecodeOptions& options, std::ostream& results) {
     checkOutputs(options);
-    const Capture capture = readCapture(options.capture);
+    std::ifstream soft = openInput(options.capture);
+    const Capture capture = readCapture(soft, options.capture);
     std::optional<PackedBits> reference;
     if (options.reference) {
-        reference = readBits(*options.reference, capture.blocks(), capture.blockSize / 8);
+        std::ifstream bits = openInput(*options.reference);
+        reference = readBits(bits, *options.reference, capture.blocks(), capture.blockSize / 8);
     }
     const std::unique_ptr<TraceFile> trace = openTrace(capture, options, results);
 

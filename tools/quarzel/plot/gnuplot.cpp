@@ -1,7 +1,6 @@
 // SPDX-License-Identifier: MIT
 #include "plot/gnuplot.hpp"
 
-#include <fcntl.h>
 #include <fmt/format.h>
 #include <spawn.h>
 #include <sys/mman.h>
@@ -10,11 +9,11 @@
 
 #include <array>
 #include <cerrno>
+#include <cstdio>
 #include <cstring>
+#include <memory>
 
 #include "tool_error.hpp"
-
-extern char** environ;
 
 namespace quarzel::tool {
 
@@ -25,52 +24,32 @@ ToolError gnuplotError(const std::string& problem, const std::string& remedy) {
 }
 
 /// A file in memory. Files instead of pipes: neither side ever waits for the other.
-class MemoryFile {
-  public:
-    MemoryFile() : itsDescriptor(::memfd_create("quarzel-plot", MFD_CLOEXEC)) {
-        if (itsDescriptor < 0) {
-            throw gnuplotError(fmt::format("has no memory: {}", std::strerror(errno)), "free some");
-        }
+using MemoryFile = std::unique_ptr<std::FILE, int (*)(std::FILE*)>;
+
+MemoryFile memoryFile() {
+    const int descriptor = ::memfd_create("quarzel-plot", MFD_CLOEXEC);
+    if (descriptor < 0) {
+        throw gnuplotError(fmt::format("has no memory: {}", std::strerror(errno)), "free some");
     }
-    MemoryFile(const MemoryFile&) = delete;
-    MemoryFile& operator=(const MemoryFile&) = delete;
-    ~MemoryFile() { ::close(itsDescriptor); }
+    return {::fdopen(descriptor, "w+"), &std::fclose};
+}
 
-    int descriptor() const { return itsDescriptor; }
-
-    void put(const std::string& text) {
-        for (std::size_t done = 0; done < text.size();) {
-            const ssize_t count =
-                ::pwrite(itsDescriptor, text.data() + done, text.size() - done, static_cast<off_t>(done));
-            if (count < 0) {
-                throw gnuplotError(fmt::format("cannot be given its script: {}", std::strerror(errno)),
-                                   "free some memory");
-            }
-            done += static_cast<std::size_t>(count);
-        }
+std::string contentOf(const MemoryFile& file) {
+    std::string text;
+    std::rewind(file.get());
+    for (int c = 0; (c = std::getc(file.get())) != EOF;) {
+        text += static_cast<char>(c);
     }
-
-    std::string content() const {
-        std::string text;
-        std::array<char, 65536> buffer{};
-        for (ssize_t count = 0; (count = ::pread(itsDescriptor, buffer.data(), buffer.size(),
-                                                 static_cast<off_t>(text.size()))) > 0;) {
-            text.append(buffer.data(), static_cast<std::size_t>(count));
-        }
-        return text;
-    }
-
-  private:
-    int itsDescriptor;
-};
+    return text;
+}
 
 /// Start gnuplot on these three standard streams.
 pid_t start(const MemoryFile& in, const MemoryFile& out, const MemoryFile& err) {
     posix_spawn_file_actions_t actions;
     ::posix_spawn_file_actions_init(&actions);
-    ::posix_spawn_file_actions_adddup2(&actions, in.descriptor(), STDIN_FILENO);
-    ::posix_spawn_file_actions_adddup2(&actions, out.descriptor(), STDOUT_FILENO);
-    ::posix_spawn_file_actions_adddup2(&actions, err.descriptor(), STDERR_FILENO);
+    ::posix_spawn_file_actions_adddup2(&actions, ::fileno(in.get()), STDIN_FILENO);
+    ::posix_spawn_file_actions_adddup2(&actions, ::fileno(out.get()), STDOUT_FILENO);
+    ::posix_spawn_file_actions_adddup2(&actions, ::fileno(err.get()), STDERR_FILENO);
     std::array<char, 8> program = {"gnuplot"};
     // Without the settings of the user, which would make another picture.
     std::array<char, 3> noSettings = {"-d"};
@@ -89,17 +68,21 @@ pid_t start(const MemoryFile& in, const MemoryFile& out, const MemoryFile& err) 
 }  // namespace
 
 std::string runGnuplot(const std::string& script) {
-    MemoryFile in;
-    MemoryFile out;
-    MemoryFile err;
-    in.put(script);
+    const MemoryFile in = memoryFile();
+    const MemoryFile out = memoryFile();
+    const MemoryFile err = memoryFile();
+    if (std::fputs(script.c_str(), in.get()) == EOF || std::fflush(in.get()) != 0) {
+        throw gnuplotError(fmt::format("cannot be given its script: {}", std::strerror(errno)),
+                           "free some memory");
+    }
+    std::rewind(in.get());
     const pid_t child = start(in, out, err);
     int status = 0;
     while (::waitpid(child, &status, 0) < 0 && errno == EINTR) {
     }
-    std::string picture = out.content();
+    std::string picture = contentOf(out);
     if (!WIFEXITED(status) || WEXITSTATUS(status) != 0 || picture.empty()) {
-        throw gnuplotError(fmt::format("failed: {}", err.content()), "check that it can draw this format");
+        throw gnuplotError(fmt::format("failed: {}", contentOf(err)), "check that it can draw this format");
     }
     return picture;
 }

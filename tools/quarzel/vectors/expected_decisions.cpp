@@ -133,7 +133,8 @@ ExpectedDecisions readPacked(std::istream& stream, const std::string& file) {
             "expected bits have shape (blocks, K/8), 8 to a byte, as 'quarzel decode -o' makes them");
     }
     const auto bytes = static_cast<std::size_t>(header.shape[1]);
-    const PackedBits packed = readBits(file, header.shape[0], bytes);
+    stream.seekg(0);
+    const PackedBits packed = readBits(stream, file, header.shape[0], bytes);
     ExpectedDecisions expected{file, {}, {}};
     for (std::size_t block = 0; block < packed.blocks(); ++block) {
         expected.blocks.push_back({static_cast<std::uint32_t>(8 * bytes), block * 8 * bytes, "", ""});

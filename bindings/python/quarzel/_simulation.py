@@ -5,15 +5,19 @@ from __future__ import annotations
 
 import importlib
 import json
-import operator
 import os
 from dataclasses import dataclass, field
-from typing import Any, Callable, Iterable, Optional, Union
+from typing import Any, Callable, Iterable, Literal, Optional, Union
 
 import numpy as np
 from numpy.typing import ArrayLike, NDArray
 
-from .decoder import algorithm_number, algorithms
+from ._checks import array_of, choice, real, whole
+from ._decoder import algorithm_number, algorithms
+from ._types import Algorithm, AlgorithmOrNumber, Units
+
+_MAX_COUNT = 2**64 - 1
+_MAX_THREADS = 1024
 
 
 @dataclass(frozen=True)
@@ -43,8 +47,8 @@ class Curve:
     """The points of one core and block size."""
 
     block_size: int
-    units: int
-    algorithm: str
+    units: Units
+    algorithm: Algorithm
     iterations: int
     points: list[Point] = field(default_factory=list)
 
@@ -68,7 +72,11 @@ class Curve:
 
 
 class SweepResult:
-    """The result of a sweep, as in the files of the tool: ``quarzel sweep``, ``plot`` and ``verify-result``."""
+    """The result of a sweep, as in the files of the tool: ``quarzel sweep``, ``plot`` and ``verify-result``.
+
+    >>> quarzel.sweep([0.4, 0.8], block_size=40, iterations=[2, 4], max_blocks=20)
+    <SweepResult: 2 curves of 2 points>
+    """
 
     def __init__(self, text: str) -> None:
         document = json.loads(text)
@@ -84,6 +92,10 @@ class SweepResult:
         """Read a result file.
 
         :raises ValueError: it is not a whole, unaltered result
+
+        >>> quarzel.sweep(1.0, block_size=40, max_blocks=20).save("result.json")
+        >>> quarzel.SweepResult.read("result.json").configuration["max_blocks"]
+        20
         """
         with open(path, encoding="utf-8", newline="") as file:
             text = file.read()
@@ -91,25 +103,44 @@ class SweepResult:
         return cls(text)
 
     def save(self, path: Union[str, os.PathLike[str]]) -> None:
-        """Write the result file; the tool writes the same bytes for the same configuration."""
+        """Write the result file; the tool writes the same bytes for the same configuration.
+
+        >>> quarzel.sweep(1.0, block_size=40, max_blocks=20).save("result.json")
+        """
         with open(path, "w", encoding="utf-8", newline="") as file:
             file.write(self.text)
 
-    def plot(self, axes: Any = None, rate: str = "bler") -> Any:
+    def to_dataframe(self) -> Any:
+        """The points as a pandas DataFrame, a row each. Needs pandas.
+
+        The columns are those of a curve, then those of a point, with the ends of the intervals in ``ber_low``,
+        ``ber_high``, ``bler_low`` and ``bler_high``. Counts after each iteration are left out.
+
+        :raises ImportError: pandas is not installed
+
+        >>> quarzel.sweep([0.4, 0.8], block_size=40, max_blocks=20).to_dataframe()[["iterations", "ebn0_db", "blocks"]]
+           iterations  ebn0_db  blocks
+        0           6      0.4      20
+        1           6      0.8      20
+        """
+        pandas = _optional("pandas", "to_dataframe needs pandas; install it, or read the points of SweepResult.curves")
+        return pandas.DataFrame([_row(curve, point) for curve in self.curves for point in curve.points])
+
+    def plot(self, axes: Any = None, rate: Literal["ber", "bler"] = "bler") -> Any:
         """Draw the curves with their 95 % intervals; points without an error are left out. Needs Matplotlib.
 
         :param axes: Matplotlib axes to draw into; new ones when not given
         :param rate: ``"bler"`` or ``"ber"``
         :returns: the axes
+        :raises ImportError: Matplotlib is not installed
+
+        >>> axes = quarzel.sweep(1.0, block_size=40, max_blocks=20).plot(rate="ber")
         """
         if rate not in ("ber", "bler"):
             raise ValueError(f"there is no rate {rate!r}; choose 'ber' or 'bler'")
         if axes is None:
-            try:
-                import matplotlib.pyplot as plt
-            except ImportError as error:
-                raise ImportError("plot needs Matplotlib; install it, or use 'quarzel plot'") from error
-            axes = plt.figure(layout="constrained").add_subplot()
+            pyplot = _optional("matplotlib.pyplot", "plot needs Matplotlib; install it, or use 'quarzel plot'")
+            axes = pyplot.figure(layout="constrained").add_subplot()
         for curve in self.curves:
             seen = [point for point in curve.points if getattr(point, rate) > 0]
             rates = np.array([getattr(point, rate) for point in seen])
@@ -130,8 +161,8 @@ def sweep(
     ebn0_db: ArrayLike,
     *,
     block_size: Union[int, Iterable[int]] = 1024,
-    units: Union[int, Iterable[int]] = 2,
-    algorithm: Union[str, int, Iterable[Union[str, int]]] = "scaled-max-log",
+    units: Union[Units, Iterable[Units]] = 2,
+    algorithm: Union[AlgorithmOrNumber, Iterable[AlgorithmOrNumber]] = "scaled-max-log",
     iterations: Union[int, Iterable[int]] = 6,
     llr: Optional[float] = None,
     scale: Optional[float] = None,
@@ -159,33 +190,32 @@ def sweep(
         it raises ends the sweep
     :raises ValueError: the sweep is not possible; the text says why
     :raises ImportError: this build or this machine lacks what sweeps need; the text says what
+
+    >>> (curve,) = quarzel.sweep([0.0, 6.0], block_size=40, max_blocks=50).curves
+    >>> bool(curve.ber[1] < curve.ber[0])
+    True
     """
     if llr is not None and scale is not None:
         raise ValueError("llr and scale are two quantisers; give one of them")
-    count = len(os.sched_getaffinity(0)) if threads is None else operator.index(threads)
-    if count < 1:
-        raise ValueError(f"threads must be 1 or more, not {count}")
+    kind = "llr" if scale is None else "scale"
+    units_of_one = scale if scale is not None else llr if llr is not None else 4
+    count = len(os.sched_getaffinity(0)) if threads is None else whole("threads", threads, 1, _MAX_THREADS)
     configuration = {
-        "seed": operator.index(seed),
-        "max_blocks": operator.index(max_blocks),
-        "max_block_errors": operator.index(max_block_errors),
-        "max_seconds": operator.index(max_seconds),
+        "seed": whole("seed", seed, 0, _MAX_COUNT),
+        "max_blocks": whole("max_blocks", max_blocks, 0, _MAX_COUNT),
+        "max_block_errors": whole("max_block_errors", max_block_errors, 0, _MAX_COUNT),
+        "max_seconds": whole("max_seconds", max_seconds, 0, _MAX_COUNT),
         "per_iteration": bool(per_iteration),
         "quantiser": {
-            "kind": "llr" if scale is None else "scale",
-            "scale": float(scale if scale is not None else llr if llr is not None else 4),
+            "kind": kind,
+            "scale": real(kind, units_of_one),
         },
-        "block_size": [operator.index(value) for value in _listed(block_size)],
-        "units": [operator.index(value) for value in _listed(units)],
+        "block_size": [whole("block_size", value, 40, 6144) for value in _listed(block_size)],
+        "units": [choice("units", value, (2, 4, 8)) for value in _listed(units)],
         "algorithm": [algorithm_number(value) for value in _listed(algorithm)],
-        "iterations": [operator.index(value) for value in _listed(iterations)],
-        "ebn0_db": [round(float(value), 6) for value in np.asarray(ebn0_db, dtype=np.float64).reshape(-1)],
+        "iterations": [whole("iterations", value, 1, 15) for value in _listed(iterations)],
+        "ebn0_db": _decibels(ebn0_db),
     }
-    if not np.isfinite(configuration["ebn0_db"]).all():
-        raise ValueError("every Eb/N0 must be finite")
-    for name in ("seed", "max_blocks", "max_block_errors", "max_seconds"):
-        if not 0 <= configuration[name] < 2**64:
-            raise ValueError(f"{name} must be from 0 to 2^64 - 1, not {configuration[name]}")
     heads = _heads(configuration)
 
     def tell(curve: int, point: str) -> None:
@@ -208,15 +238,31 @@ def _extension() -> Any:
         raise ImportError(f"sweeps need a library that is not installed: {error}") from error
 
 
+def _optional(name: str, needs: str) -> Any:
+    """A module that only a few functions need."""
+    try:
+        return importlib.import_module(name)
+    except ImportError as error:
+        raise ImportError(needs) from error
+
+
+def _decibels(ebn0_db: ArrayLike) -> list[float]:
+    array = array_of("ebn0_db", ebn0_db)
+    if array.size and array.dtype.kind not in "fiu":
+        raise TypeError(f"ebn0_db must hold real numbers in dB, not {array.dtype}")
+    if array.size and not np.isfinite(array).all():
+        raise ValueError("every Eb/N0 must be finite")
+    return [round(float(value), 6) for value in array.reshape(-1)]
+
+
 def _listed(values: Any) -> list[Any]:
     return list(values) if isinstance(values, Iterable) and not isinstance(values, str) else [values]
 
 
 def _heads(configuration: dict[str, Any]) -> list[Curve]:
-    """The curves in the order of the engine, which checks the values later."""
-    names = dict(enumerate(algorithms))
+    """The curves in the order of the engine, without points."""
     return [
-        Curve(block_size, units, names.get(algorithm, str(algorithm)), iterations)
+        Curve(block_size, units, algorithms[algorithm], iterations)
         for block_size in configuration["block_size"]
         for units in configuration["units"]
         for algorithm in configuration["algorithm"]
@@ -234,3 +280,15 @@ def _curve(head: dict[str, Any], points: list[dict[str, Any]]) -> Curve:
 def _point(values: dict[str, Any]) -> Point:
     intervals = {name: tuple(values[name]) for name in ("ber_interval", "bler_interval")}
     return Point(**{**values, **intervals})
+
+
+def _row(curve: Curve, point: Point) -> dict[str, Any]:
+    """A point as a row of a table."""
+    row = {name: value for name, value in vars(curve).items() if name != "points"}
+    for name, value in vars(point).items():
+        if name.endswith("_interval"):
+            rate = name.removesuffix("_interval")
+            row[f"{rate}_low"], row[f"{rate}_high"] = value
+        elif name != "per_iteration":
+            row[name] = value
+    return row

@@ -3,6 +3,8 @@
 
 from __future__ import annotations
 
+import bisect
+import math
 import operator
 from typing import NamedTuple
 
@@ -10,6 +12,8 @@ import numpy as np
 from numpy.typing import ArrayLike, NDArray
 
 from . import _core
+from ._checks import array_of, choice
+from ._types import Units
 
 block_sizes: tuple[int, ...] = tuple(_core.block_sizes())
 """The 188 block sizes K of LTE in ascending order, 40 to 6144 (3GPP TS 36.212, Table 5.1.3-3)."""
@@ -26,23 +30,37 @@ class Segments(NamedTuple):
 
 
 def _size(K: int) -> int:
-    """K as the extension takes it; the extension names the nearest sizes when K is not one."""
-    return min(max(operator.index(K), 0), 2**32 - 1)
+    """K, when it is a block size."""
+    try:
+        number = operator.index(K)
+    except TypeError:
+        raise TypeError(f"K must be a block size, not {type(K).__name__}; quarzel.block_sizes lists them") from None
+    place = bisect.bisect_left(block_sizes, number)
+    if number not in block_sizes[place : place + 1]:
+        nearest = ", ".join(map(str, block_sizes[max(place - 1, 0) : place + 1]))
+        raise ValueError(f"there is no block size of {number} bits; the nearest: {nearest}")
+    return number
 
 
 def qpp(K: int) -> NDArray[np.int32]:
     """The interleaver of block size K.
 
-    Returns (K,) indices: the second constituent code takes information bit ``qpp(K)[i]`` at step i.
+    :returns: (K,) indices: the second constituent code takes information bit ``qpp(K)[i]`` at step i
+    :raises ValueError: K is not a block size; the text names the nearest ones
+
+    >>> quarzel.qpp(40)[:6].tolist()
+    [0, 13, 6, 19, 12, 25]
     """
     return _core.qpp(_size(K))
 
 
-def segments(K: int, units: int) -> Segments:
-    """How a core with 2, 4 or 8 processing units cuts a block of K information bits."""
-    if units not in (2, 4, 8):
-        raise ValueError(f"units must be 2, 4 or 8, not {units}")
-    count, windows = _core.layout(_size(K), operator.index(units))
+def segments(K: int, units: Units) -> Segments:
+    """How a core with 2, 4 or 8 processing units cuts a block of K information bits.
+
+    >>> quarzel.segments(1024, units=2).alpha[:2].tolist()
+    [[0, 128], [128, 256]]
+    """
+    count, windows = _core.layout(_size(K), choice("units", units, (2, 4, 8)))
     lengths = np.array(windows, dtype=np.int32)
     tops = np.cumsum(lengths, dtype=np.int32)
     starts = np.arange(count, dtype=np.int32) * tops[-1]
@@ -57,9 +75,13 @@ def encode(bits: ArrayLike) -> NDArray[np.uint8]:
 
     :param bits: (..., K) information bits, integers or booleans of value 0 or 1
     :returns: (..., 3, K + 4) code bits: systematic, parity 1, parity 2, each with its four tail positions
+    :raises TypeError: the bits are not integers or booleans, or are masked
     :raises ValueError: K is not a block size; the text names the nearest ones
+
+    >>> quarzel.encode(np.ones((5, 40), dtype=np.uint8)).shape
+    (5, 3, 44)
     """
-    array = np.asarray(bits)
+    array = array_of("bits", bits)
     if array.dtype.kind not in "biu":
         raise TypeError(f"bits must be integers or booleans, not {array.dtype}; use bits.astype(numpy.uint8)")
     if array.ndim == 0:
@@ -67,5 +89,6 @@ def encode(bits: ArrayLike) -> NDArray[np.uint8]:
     if array.dtype != np.uint8:
         # What does not fit a byte must not become a bit by losing its upper part.
         array = np.where((array == 0) | (array == 1), array, 2).astype(np.uint8)
-    code = _core.encode(np.ascontiguousarray(array.reshape(-1, array.shape[-1])))
+    rows = array.reshape(math.prod(array.shape[:-1]), _size(array.shape[-1]))
+    code = _core.encode(np.ascontiguousarray(rows))
     return code.reshape(*array.shape[:-1], *code.shape[1:])

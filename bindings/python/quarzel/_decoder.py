@@ -3,20 +3,21 @@
 
 from __future__ import annotations
 
-import operator
 from types import TracebackType
-from typing import Any, Literal, Optional, Union, overload
+from typing import Any, Callable, Literal, Optional, overload
 
 import numpy as np
 from numpy.typing import ArrayLike, NDArray
 
 from . import _core
+from ._checks import array_of, choice, whole
 from ._soft import soft_blocks
-from .trace import BlockTrace, trace_of_arrays
+from ._trace import BlockTrace, trace_of_arrays
+from ._types import Algorithm, AlgorithmOrNumber, Units
 
-_MAX_PASSES = 30
+_MAX_ITERATIONS = 15
 
-algorithms: tuple[str, ...] = _core.algorithms
+algorithms: tuple[Algorithm, ...] = _core.algorithms
 """The arithmetics of the core, in the order of their numbers 0, 1 and 2."""
 
 
@@ -25,6 +26,9 @@ def implementations() -> tuple[str, ...]:
 
     They are named by the instruction set in whose SIMD lanes they decode; the last one, ``"literal"``, decodes
     step by step. All give the same bits, tags and warnings.
+
+    >>> quarzel.implementations()[-1]
+    'literal'
     """
     return tuple(_core.implementations())
 
@@ -43,29 +47,51 @@ class Decoder:
     at a time may use a decoder, a second one gets a RuntimeError. Threads that have a decoder each run side by
     side, since the GIL is released while blocks are decoded. The model warns of the first soft value that it
     saturates and of the first tag that it truncates: see :class:`ModelWarning`.
+
+    The settings are fixed. A copy, and a decoder that was pickled, has the same settings and a fresh core, which
+    has not decoded or warned before.
+
+    >>> quarzel.Decoder(units=8, algorithm="max-star")
+    Decoder(units=8, algorithm='max-star', tag_width=8)
     """
 
     def __init__(
         self,
-        units: int = 2,
-        algorithm: Union[str, int] = "scaled-max-log",
+        units: Units = 2,
+        algorithm: AlgorithmOrNumber = "scaled-max-log",
         tag_width: int = 8,
         implementation: Optional[str] = None,
     ) -> None:
-        self._units = operator.index(units)
+        self._units: Units = choice("units", units, (2, 4, 8))
         self._algorithm = algorithm_number(algorithm)
-        self._tag_width = operator.index(tag_width)
-        if implementation == "":
-            raise ValueError("implementation must not be empty; leave it out for the fastest one")
+        self._tag_width = whole("tag_width", tag_width, 0, 32)
+        if implementation is not None and implementation not in implementations():
+            names = ", ".join(implementations())
+            raise ValueError(
+                f"there is no implementation {implementation!r}; leave it out for the fastest one, or choose one of {names}"
+            )
+        self._wanted = implementation
         self._core = _core.Core(self._units, self._algorithm, self._tag_width, implementation or "")
+        self._decode_plain = self._core.decode_plain
+
+    def __setattr__(self, name: str, value: object) -> None:
+        if not name.startswith("_") and (type(self) is Decoder or hasattr(Decoder, name)):
+            raise AttributeError(
+                f"{name} cannot be set: a decoder keeps its settings; make another one with Decoder(units, algorithm, "
+                "tag_width, implementation)"
+            )
+        super().__setattr__(name, value)
+
+    def __reduce__(self) -> tuple[Callable[..., Decoder], tuple[Any, ...]]:
+        return type(self), (self.units, self.algorithm, self.tag_width, self._wanted)
 
     @property
-    def units(self) -> int:
+    def units(self) -> Units:
         """Processing units."""
         return self._units
 
     @property
-    def algorithm(self) -> str:
+    def algorithm(self) -> Algorithm:
         """The name of the arithmetic."""
         return algorithms[self._algorithm]
 
@@ -127,10 +153,21 @@ class Decoder:
         :raises TypeError: a stream is not int8, int16 or int32
         :raises ValueError: shapes differ, there is no block size K, or the decoder is closed
         :raises RuntimeError: another thread is using the decoder
+
+        >>> bits = np.random.default_rng(1).integers(0, 2, (10, 40), dtype=np.uint8)
+        >>> soft = np.where(quarzel.encode(bits), 8, -8).astype(np.int8)
+        >>> bool((quarzel.Decoder().decode(soft) == bits).all())
+        True
         """
+        if tags is None and not packed:
+            # One block costs so little that the checks below would take half of the time.
+            plain = self._decode_plain(systematic, parity1, parity2, iterations)
+            if plain is not None:
+                return plain
         blocks = soft_blocks(systematic, parity1, parity2)
         tag_array = None if tags is None else _tag_array(tags, blocks.shape)
-        bits, tags_back = self._core.decode(*blocks.streams, operator.index(iterations), tag_array, False)
+        count = whole("iterations", iterations, 1, _MAX_ITERATIONS)
+        bits, tags_back = self._core.decode(*blocks.streams, count, tag_array, False)
         if packed:
             bits = np.packbits(bits, axis=-1)
         bits = bits.reshape(*blocks.shape, bits.shape[-1])
@@ -146,9 +183,13 @@ class Decoder:
         """Decode as :meth:`decode` does, and give the decisions after every iteration.
 
         :returns: (..., iterations, K) uint8 of 0 and 1; index i - 1 holds what ``decode(..., iterations=i)`` gives
+
+        >>> quarzel.Decoder().decode_every_iteration(np.full((3, 44), -8, dtype=np.int8), iterations=4).shape
+        (4, 40)
         """
         blocks = soft_blocks(systematic, parity1, parity2)
-        bits, _ = self._core.decode(*blocks.streams, operator.index(iterations), None, True)
+        count = whole("iterations", iterations, 1, _MAX_ITERATIONS)
+        bits, _ = self._core.decode(*blocks.streams, count, None, True)
         return bits.reshape(*blocks.shape, *bits.shape[1:])
 
     def trace(
@@ -164,18 +205,28 @@ class Decoder:
 
         :param passes: how many, two an iteration; all of them when it is not given
         :returns: the trace, with the bits
+
+        >>> quarzel.Decoder().trace(np.full((3, 44), -8, dtype=np.int8), iterations=2)
+        <BlockTrace: block 0, K = 40, 4 passes>
         """
         blocks = soft_blocks(systematic, parity1, parity2)
         if blocks.shape != ():
             raise ValueError(f"a trace shows one block, not blocks of shape {blocks.shape}; pick one of them")
-        count = _MAX_PASSES if passes is None else min(operator.index(passes), _MAX_PASSES)
-        if count < 1:
-            raise ValueError(f"passes must be 1 or more, not {count}; there are two an iteration")
-        bits, block, inputs, signals = self._core.trace(*blocks.streams, operator.index(iterations), count)
+        all_passes = 2 * whole("iterations", iterations, 1, _MAX_ITERATIONS)
+        count = all_passes if passes is None else min(whole("passes", passes, 1), all_passes)
+        bits, block, inputs, signals = self._core.trace(*blocks.streams, all_passes // 2, count)
         return trace_of_arrays(block, inputs, signals, bits[0])
 
     def close(self) -> None:
-        """Free the model. It may be called again."""
+        """Free the model. It may be called again.
+
+        >>> decoder = quarzel.Decoder()
+        >>> decoder.close()
+        >>> decoder.decode(np.full((3, 44), -8, dtype=np.int8))
+        Traceback (most recent call last):
+            ...
+        ValueError: the decoder has been closed; make a new one
+        """
         self._core.close()
 
     def __enter__(self) -> Decoder:
@@ -194,22 +245,23 @@ class Decoder:
         return f"Decoder(units={self.units}, algorithm={self.algorithm!r}, tag_width={self.tag_width})"
 
 
-def algorithm_number(algorithm: Union[str, int]) -> int:
-    """The number of an algorithm that is given by name or number; the model checks numbers.
+def algorithm_number(algorithm: AlgorithmOrNumber) -> int:
+    """The number of an algorithm that is given by name or number.
 
-    :raises ValueError: there is no algorithm of that name
+    :raises TypeError: it is neither
+    :raises ValueError: there is no such algorithm
     """
     if not isinstance(algorithm, str):
-        return operator.index(algorithm)
+        return choice("algorithm", algorithm, (0, 1, 2))
     if algorithm not in algorithms:
         raise ValueError(f"there is no algorithm {algorithm!r}; choose one of {', '.join(algorithms)}")
     return algorithms.index(algorithm)
 
 
 def _tag_array(tags: ArrayLike, shape: tuple[int, ...]) -> NDArray[np.uint32]:
-    array = np.asarray(tags)
-    if array.dtype.kind not in "iu":
-        raise TypeError(f"tags must be whole numbers, not {array.dtype}")
+    array = array_of("tags", tags)
+    if array.size and array.dtype.kind not in "iu":
+        raise TypeError(f"tags must be whole numbers from 0 to 4294967295, not {array.dtype}")
     if array.shape != shape:
         raise ValueError(f"tags have the shape {array.shape}, the blocks {shape}; give one tag a block")
     if array.size and (array.min() < 0 or array.max() > 0xFFFFFFFF):

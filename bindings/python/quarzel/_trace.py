@@ -27,15 +27,24 @@ _INPUTS = {
 _SIGNALS = _core.signals()
 _BEFORE_A_GAP = ("a", "b", "g", "llr")
 _RULER = re.compile(r"^-{20,}\n", re.MULTILINE)
+_TERMINATION_STEPS = 3
 _WORDS_A_UNIT = 16
 _UNITS_A_REAL = 8
 
 
-@dataclass
+@dataclass(eq=False, repr=False)
 class BlockTrace:
     """Every value of the passes of a block, in units of 1/8.
 
-    State metrics wrap around at 12 bits; only their differences within a step mean something.
+    State metrics wrap around at 12 bits; only their differences within a step mean something. Two traces are equal
+    when their block numbers, inputs and passes are; the bits do not count, since a file does not hold them.
+
+    >>> soft = np.full((3, 44), -8, dtype=np.int8)
+    >>> trace = quarzel.Decoder().trace(soft)
+    >>> trace == quarzel.Decoder(units=8).trace(soft)
+    True
+    >>> trace.passes[-1]["a"].shape
+    (43, 8)
     """
 
     block: int
@@ -47,6 +56,19 @@ class BlockTrace:
     ``int``, ``llr`` and ``ext`` (K + 3,), ``a`` and ``b`` (K + 3, 8) by encoder state, ``g`` (K + 3, 4)"""
     bits: Optional[NDArray[np.uint8]] = None
     """(K,) hard decisions; None for a trace that was read from a file"""
+
+    def __repr__(self) -> str:
+        K = len(self.inputs["code1_sys"]) - _TERMINATION_STEPS
+        return f"<BlockTrace: block {self.block}, K = {K}, {len(self.passes)} passes>"
+
+    def __eq__(self, other: object) -> bool:
+        if not isinstance(other, BlockTrace):
+            return NotImplemented
+        return (
+            self.block == other.block
+            and len(self.passes) == len(other.passes)
+            and all(map(_alike, [self.inputs, *self.passes], [other.inputs, *other.passes]))
+        )
 
     @functools.cached_property
     def text(self) -> str:
@@ -60,7 +82,10 @@ class BlockTrace:
         return "".join(["-" * 120 + "\n", *lines, *tables])
 
     def save(self, path: Union[str, os.PathLike[str]]) -> None:
-        """Write the text form to a file, for ``quarzel trace-diff``."""
+        """Write the text form to a file, for ``quarzel trace-diff``.
+
+        >>> quarzel.Decoder().trace(np.full((3, 44), -8, dtype=np.int8), passes=1).save("model.txt")
+        """
         with open(path, "w", encoding="ascii", newline="\n") as file:
             file.write(self.text)
 
@@ -77,6 +102,11 @@ def read_trace(path: Union[str, os.PathLike[str]]) -> list[BlockTrace]:
     """The blocks of a file in the text form, from ``quarzel decode --trace`` or :meth:`BlockTrace.save`.
 
     :raises ValueError: the file is not a trace of the model
+
+    >>> trace = quarzel.Decoder().trace(np.full((3, 44), -8, dtype=np.int8))
+    >>> trace.save("model.txt")
+    >>> quarzel.read_trace("model.txt") == [trace]
+    True
     """
     with open(path, encoding="ascii") as file:
         before, *tables = _RULER.split(file.read())
@@ -93,6 +123,10 @@ def read_trace(path: Union[str, os.PathLike[str]]) -> list[BlockTrace]:
         else:
             raise ValueError(f"not a trace of the model: {table[:40]!r} follows a ruler")
     return blocks
+
+
+def _alike(ours: Signals, theirs: Signals) -> bool:
+    return ours.keys() == theirs.keys() and all(np.array_equal(ours[name], theirs[name]) for name in ours)
 
 
 def _input_line(line: str) -> tuple[str, NDArray[np.int16]]:

@@ -1,0 +1,31 @@
+// SPDX-License-Identifier: MIT
+#pragma once
+
+#include <mex.h>
+
+#include <span>
+#include <string>
+#include <vector>
+
+#include "quarzel/core.hpp"
+
+namespace quarzel::octave {
+
+/// What a call of quarzel_decode asks for besides its streams.
+struct DecodeOptions {
+    int iterations = 6;
+    CoreSettings settings;
+    std::vector<unsigned> tags;  ///< one for each block; empty: none are given
+    unsigned passes = 0;         ///< of the trace
+    std::string traceFile;       ///< empty: none
+};
+
+/// Read them from the arguments after the streams: the iterations, which may be left out or empty, then names
+/// with values or a struct of them.
+/// @throws bindings::BindingError when there is something that no option is
+DecodeOptions decodeOptions(std::span<const mxArray* const> arguments);
+
+/// Text of a char array.
+std::string textOf(const mxArray* array);
+
+}  // namespace quarzel::octave
