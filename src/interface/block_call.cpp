@@ -38,6 +38,11 @@ void decoderError(const Messages& messages, std::string_view text) noexcept {
     messages.error({"ERROR:decoder:", text});
 }
 
+int refuse(const Messages& messages, std::string_view text) noexcept {
+    decoderError(messages, text);
+    return 1;
+}
+
 int unhandledException(const Messages& messages) noexcept {
     decoderError(messages, "Unhandled exception has occurred");
     return 99;
@@ -83,8 +88,7 @@ Outcome decodeLiterally(vardel_ip_quarzel_state& state, const BlockCall& call) {
         return {2, 0};
     }
     if (!hasRoom(call, hard.size())) {
-        decoderError(state.messages, "Insufficient allocated space for output array");
-        return {1, 0};
+        return {refuse(state.messages, "Insufficient allocated space for output array"), 0};
     }
     literal.writeIterations(call);
     std::copy(hard.begin(), hard.end(), call.dout + (call.iterations - 1) * call.iterationStride);

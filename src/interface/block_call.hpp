@@ -33,6 +33,10 @@ const char* findFault(const BlockCall& call);
 /// Write "ERROR:decoder:" and a text.
 void decoderError(const Messages& messages, std::string_view text) noexcept;
 
+/// The error of a wrong argument.
+/// @return its status
+int refuse(const Messages& messages, std::string_view text) noexcept;
+
 /// The error of a call that an exception ended, because memory ran out for instance.
 /// @return its status
 int unhandledException(const Messages& messages) noexcept;
@@ -68,8 +72,7 @@ template <class Source>
 int simulateBlock(vardel_ip_quarzel_state& state, const Source& source, int index) {
     const BlockCall call = source.block(index);
     if (const char* fault = findFault(call)) {
-        decoderError(state.messages, fault);
-        return 1;
+        return refuse(state.messages, fault);
     }
     const Outcome outcome = decodeBlock(state, call);
     if (outcome.status == 0) {

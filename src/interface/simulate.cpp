@@ -4,12 +4,10 @@
 int vardel_ip_quarzel_bitacc_simulate(vardel_ip_quarzel_state* state, vardel_ip_quarzel_outputs* outputs,
                                       vardel_ip_quarzel_inputs inputs) {
     if (state == nullptr) {
-        quarzel::decoderError(quarzel::standardStreams, "Simulate called with null state structure");
-        return 1;
+        return quarzel::refuse(quarzel::standardStreams, "Simulate called with null state structure");
     }
     if (outputs == nullptr) {
-        quarzel::decoderError(state->messages, "Simulate called with null output structure");
-        return 1;
+        return quarzel::refuse(state->messages, "Simulate called with null output structure");
     }
     return quarzel::simulateBlock(*state, quarzel::RecordSource(outputs, &inputs), 0);
 }

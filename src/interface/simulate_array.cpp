@@ -46,10 +46,7 @@ class ArraySource {
 int vardel_ip_quarzel_bitacc_simulate_array(vardel_ip_quarzel_state* state,
                                             const vardel_ip_quarzel_array_outputs* outputs,
                                             const vardel_ip_quarzel_array_inputs* inputs, int* statuses) {
-    const auto refuse = [](const quarzel::Messages& messages, const char* text) {
-        quarzel::decoderError(messages, text);
-        return 1;
-    };
+    using quarzel::refuse;
     if (state == nullptr) {
         return refuse(quarzel::standardStreams, "Simulate array called with null state structure");
     }

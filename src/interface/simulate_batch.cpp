@@ -5,10 +5,7 @@ int vardel_ip_quarzel_bitacc_simulate_batch(vardel_ip_quarzel_state* state,
                                             vardel_ip_quarzel_outputs* outputs,
                                             const vardel_ip_quarzel_inputs* inputs, int count,
                                             int* statuses) {
-    const auto refuse = [](const quarzel::Messages& messages, const char* text) {
-        quarzel::decoderError(messages, text);
-        return 1;
-    };
+    using quarzel::refuse;
     if (state == nullptr) {
         return refuse(quarzel::standardStreams, "Simulate batch called with null state structure");
     }
