@@ -39,6 +39,19 @@ class CMakeBuild(build_ext):
         needed = subprocess.run(["ldd", extension], check=True, capture_output=True, text=True).stdout
         for name, path in re.findall(r"(lib(?:fmt|gmp|mpfr)\.so\S*) => (\S+)", needed):
             shutil.copy2(path, package / name)
+            self.copy_licence(name, package / "licences")
+
+    def copy_licence(self, name, folder):
+        """Lay beside a library what Debian says of its licence, with the texts that this names."""
+        found = subprocess.run(["dpkg-query", "--search", f"*/{name}"], capture_output=True, text=True)
+        if found.returncode != 0:
+            self.warn(f"lay the licence of {name} beside the wheel before you hand it on: no Debian package holds it")
+            return
+        folder.mkdir(exist_ok=True)
+        copyright = Path("/usr/share/doc", found.stdout.split(":")[0], "copyright")
+        shutil.copy2(copyright, folder / f"{name}.txt")
+        for text in re.findall(r"/usr/share/common-licenses/[\w.-]*\w", copyright.read_text(encoding="utf-8")):
+            shutil.copy2(text, folder)
 
     def build_by_cmake(self):
         # A pybind11 that pip has installed brings its CMake files along; Debian's stand where CMake looks.
@@ -49,7 +62,7 @@ class CMakeBuild(build_ext):
         except ImportError:
             options = []
         build = Path(self.build_temp).resolve()
-        parts = ["TOOL=OFF", "TESTS=OFF", "INSTALL=OFF", "BINDINGS=ON", f"PYTHON={sys.executable}"]
+        parts = ["TOOL=OFF", "TESTS=OFF", "INSTALL=OFF", "WERROR=OFF", "BINDINGS=ON", f"PYTHON={sys.executable}"]
         options += [f"-DQUARZEL_{part}" for part in parts]
         # The old kind of run path also serves the libraries that the libraries need. OpenSSL's is linked in, since
         # Python itself may load another version of it.

@@ -12,6 +12,7 @@
 #include <vector>
 
 #include "bench/support.hpp"
+#include "link/chain/link_run.hpp"
 #include "link/encoder.hpp"
 #include "link/quantised_channel.hpp"
 #include "quarzel/core.hpp"
@@ -38,24 +39,27 @@ std::vector<std::uint64_t> octetsOf(std::uint64_t K) {
 }
 
 void sweepAndDecoder(benchmark::State& bench) {
-    sweep::Configuration configuration;
-    sweep::Channels channels(configuration.quantiser);
-    sweep::BlockSimulator simulator(configuration, channels);
-    const sweep::Curve curve{static_cast<std::uint32_t>(bench.range(0)), static_cast<int>(bench.range(1)),
-                             static_cast<int>(bench.range(2)), sweepIterations};
-    const std::vector<std::uint64_t> octets = octetsOf(curve.blockSize);
+    sweep::Channels channels;
+    sweep::BlockSimulator simulator(1, channels);
+    const sweep::Setup setup{static_cast<std::uint32_t>(bench.range(0)),
+                             static_cast<int>(bench.range(1)),
+                             static_cast<int>(bench.range(2)),
+                             sweepIterations,
+                             {},
+                             ebN0};
+    const std::vector<std::uint64_t> octets = octetsOf(setup.blockSize);
 
-    Core core(CoreSettings{curve.units, curve.algorithm});
-    bench::Blocks blocks(curve.blockSize, octets.size() * 8);
+    Core core(CoreSettings{setup.units, setup.algorithm});
+    bench::Blocks blocks(setup.blockSize, octets.size() * 8);
     const std::vector<std::int8_t> soft(blocks.soft.begin(), blocks.soft.end());
     double sweepSeconds = 0;
     double decoderSeconds = 0;
-    simulator.simulate(curve, ebN0, octets);
+    simulator.simulate(setup, 1, octets);
     for (auto _ : bench) {
         const double start = threadSeconds();
-        benchmark::DoNotOptimize(simulator.simulate(curve, ebN0, octets));
+        benchmark::DoNotOptimize(simulator.simulate(setup, 1, octets));
         const double middle = threadSeconds();
-        core.decode(softBlocks(std::span(soft), curve.blockSize + tailPositions), sweepIterations,
+        core.decode(softBlocks(std::span(soft), setup.blockSize + tailPositions), sweepIterations,
                     blocks.bits);
         sweepSeconds += middle - start;
         decoderSeconds += threadSeconds() - middle;
@@ -66,28 +70,66 @@ void sweepAndDecoder(benchmark::State& bench) {
     bench.counters["decoder ns/bit"] = decoderSeconds / bits * 1e9;
 }
 
-void everyIteration(benchmark::State& bench) {
-    const sweep::Configuration onlyLast;
-    sweep::Configuration every;
-    every.perIteration = true;
-    sweep::Channels channels(onlyLast.quantiser);
-    sweep::BlockSimulator simulatorOfLast(onlyLast, channels);
-    sweep::BlockSimulator simulatorOfEvery(every, channels);
-    const sweep::Curve curve{static_cast<std::uint32_t>(bench.range(0)), 8, 1,
-                             static_cast<int>(bench.range(1))};
-    const std::vector<std::uint64_t> octets = octetsOf(curve.blockSize);
-    const auto secondsOf = [&](sweep::BlockSimulator& simulator) {
+link::CodedLink codedLink(std::uint32_t K, link::ChannelSetup channel = {}) {
+    return link::CodedLink({K, 0, 2 * std::size_t{K}, 1, {0, 2}, channel});
+}
+
+/// The whole chain at rate 1/2 next to the decoder alone, in turns.
+void chainAndDecoder(benchmark::State& bench) {
+    const auto K = static_cast<std::uint32_t>(bench.range(0));
+    const CoreSettings settings{static_cast<int>(bench.range(1)), 1};
+    const std::vector<std::uint64_t> octets = octetsOf(K);
+    const link::CodedLink link = codedLink(K);
+    const auto channel = link::makeChannel(link.setup().channel, ebN0, link.rate());
+    link::LinkRun run(link, 1);
+    Core core(settings);
+    Core alone(settings);
+    bench::Blocks blocks(K, octets.size() * 8);
+    const std::vector<std::int8_t> soft(blocks.soft.begin(), blocks.soft.end());
+    double chainSeconds = 0;
+    double decoderSeconds = 0;
+    const auto simulate = [&] {
+        run.begin(ebN0, octets, octets.size() * 8);
+        run.transmit(*channel, 0);
+        run.decode(core, sweepIterations, false);
+        for (std::size_t i = 0; i < run.size(); ++i) {
+            benchmark::DoNotOptimize(run.verdict(i, 0));
+        }
+    };
+    simulate();
+    for (auto _ : bench) {
         const double start = threadSeconds();
-        benchmark::DoNotOptimize(simulator.simulate(curve, ebN0, octets));
+        simulate();
+        const double middle = threadSeconds();
+        alone.decode(softBlocks(std::span(soft), K + tailPositions), sweepIterations, blocks.bits);
+        chainSeconds += middle - start;
+        decoderSeconds += threadSeconds() - middle;
+    }
+    const double bits = blocks.informationBits() * static_cast<double>(bench.iterations());
+    bench.counters["share"] = decoderSeconds / chainSeconds;
+    bench.counters["chain ns/bit"] = chainSeconds / bits * 1e9;
+    bench.counters["decoder ns/bit"] = decoderSeconds / bits * 1e9;
+}
+
+void everyIteration(benchmark::State& bench) {
+    sweep::Channels channels;
+    sweep::BlockSimulator simulator(1, channels);
+    const sweep::Setup setup{static_cast<std::uint32_t>(bench.range(0)), 8,  1,
+                             static_cast<int>(bench.range(1)),           {}, ebN0};
+    const std::vector<std::uint64_t> octets = octetsOf(setup.blockSize);
+    const auto secondsOf = [&](std::size_t counts) {
+        const double start = threadSeconds();
+        benchmark::DoNotOptimize(simulator.simulate(setup, counts, octets));
         return threadSeconds() - start;
     };
+    const auto every = static_cast<std::size_t>(setup.iterations);
     double secondsOfLast = 0;
     double secondsOfEvery = 0;
     for (auto _ : bench) {
-        secondsOfLast += secondsOf(simulatorOfLast);
-        secondsOfEvery += secondsOf(simulatorOfEvery);
-        secondsOfEvery += secondsOf(simulatorOfEvery);  // the second finds the caches warm
-        secondsOfLast += secondsOf(simulatorOfLast);
+        secondsOfLast += secondsOf(1);
+        secondsOfEvery += secondsOf(every);
+        secondsOfEvery += secondsOf(every);  // the second finds the caches warm
+        secondsOfLast += secondsOf(1);
     }
     bench.counters["cost"] = secondsOfEvery / secondsOfLast;
 }
@@ -131,9 +173,61 @@ void channel(benchmark::State& bench) {
     perBit(bench, K);
 }
 
+void drawAndEncode(benchmark::State& bench) {
+    const link::CodedLink link = codedLink(static_cast<std::uint32_t>(bench.range(0)));
+    link::LinkRun run(link, 1);
+    for (auto _ : bench) {
+        run.begin(ebN0, std::vector<std::uint64_t>{0}, 8);
+    }
+    perBit(bench, 8 * static_cast<double>(link.informationBits()));
+}
+
+/// A transmission at rate 1/2, the first one or a second one that is combined with it.
+void transmission(benchmark::State& bench) {
+    const auto modulation = static_cast<link::Modulation>(bench.range(1));
+    const auto fading = static_cast<link::Fading>(bench.range(2));
+    const link::CodedLink link = codedLink(6144, {modulation, fading, link::Demapping::maxLog, {}});
+    const auto channel = link::makeChannel(link.setup().channel, ebN0, link.rate());
+    link::LinkRun run(link, 1);
+    run.begin(ebN0, std::vector<std::uint64_t>{0}, 8);
+    for (auto _ : bench) {
+        run.transmit(*channel, static_cast<std::uint32_t>(bench.range(0)));
+    }
+    perBit(bench, 8 * static_cast<double>(link.informationBits()));
+}
+
+void transportBlocks(benchmark::State& bench) {
+    const link::CodedLink link({0,
+                                static_cast<std::uint32_t>(bench.range(0)),
+                                2 * static_cast<std::size_t>(bench.range(0)),
+                                1,
+                                {0},
+                                {}});
+    const auto channel = link::makeChannel(link.setup().channel, ebN0, link.rate());
+    link::LinkRun run(link, 1);
+    for (auto _ : bench) {
+        run.begin(ebN0, std::vector<std::uint64_t>{0}, 8);
+        run.transmit(*channel, 0);
+    }
+    perBit(bench, 8 * static_cast<double>(link.informationBits()));
+}
+
+void channelTables(benchmark::State& bench) {
+    const auto modulation = static_cast<link::Modulation>(bench.range(0));
+    const auto demapping = static_cast<link::Demapping>(bench.range(1));
+    for (auto _ : bench) {
+        benchmark::DoNotOptimize(
+            link::makeChannel({modulation, link::Fading::none, demapping, {}}, {5000000}, {}));
+    }
+}
+
 BENCHMARK(sweepAndDecoder)
     ->ArgNames({"K", "units", "algorithm"})
     ->ArgsProduct({{40, 1024, 6144}, {2, 8}, {0, 1, 2}})
+    ->Unit(benchmark::kMicrosecond);
+BENCHMARK(chainAndDecoder)
+    ->ArgNames({"K", "units"})
+    ->ArgsProduct({{40, 1024, 6144}, {2, 8}})
     ->Unit(benchmark::kMicrosecond);
 BENCHMARK(everyIteration)
     ->ArgNames({"K", "iterations"})
@@ -142,5 +236,15 @@ BENCHMARK(everyIteration)
 BENCHMARK(informationBits)->Arg(40)->Arg(1024)->Arg(6144);
 BENCHMARK(encoder)->Arg(40)->Arg(1024)->Arg(6144);
 BENCHMARK(channel)->Arg(40)->Arg(1024)->Arg(6144);
+BENCHMARK(drawAndEncode)->Arg(40)->Arg(1024)->Arg(6144);
+BENCHMARK(transmission)
+    ->ArgNames({"number", "Qm", "fading"})
+    ->ArgsProduct({{0, 1}, {2, 4, 6, 8}, {0, 1}})
+    ->Unit(benchmark::kMicrosecond);
+BENCHMARK(transportBlocks)->ArgName("A")->Arg(4264)->Arg(75376)->Unit(benchmark::kMicrosecond);
+BENCHMARK(channelTables)
+    ->ArgNames({"Qm", "exact"})
+    ->ArgsProduct({{2, 4, 6, 8}, {0, 1}})
+    ->Unit(benchmark::kMillisecond);
 
 }  // namespace

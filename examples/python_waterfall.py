@@ -26,11 +26,11 @@ bits = rng.integers(0, 2, (chosen.blocks, K), dtype=np.uint8)
 symbols = 2.0 * quarzel.encode(bits) - 1.0
 
 
-# %% The channel, and the quantiser: 8-bit log-likelihood ratios in units of 1/8
+# %% The channel, and the quantiser of log-likelihood ratios
 def received(ebn0_db):
     variance = 1 / (2 * (1 / 3) * 10 ** (ebn0_db / 10))
     noisy = symbols + rng.normal(0, np.sqrt(variance), symbols.shape)
-    return np.clip(np.rint(8 * 2 * noisy / variance), -128, 127).astype(np.int8)
+    return quarzel.quantise(2 * noisy / variance)
 
 
 # %% Decode the same noise with each number of iterations

@@ -9,6 +9,7 @@
  *   3. vardel_ip_quarzel_bitacc_simulate        decode one code block; call it as often as needed
  *      vardel_ip_quarzel_bitacc_simulate_batch  decode many code blocks, faster
  *      vardel_ip_quarzel_bitacc_simulate_array  decode the blocks of one array of integers
+ *      vardel_ip_quarzel_bitacc_quantise        make soft values of real numbers first
  *      vardel_ip_quarzel_bitacc_dump_config     (C++ or GNU C) print a trace of the next passes
  *   4. vardel_ip_quarzel_destroy_state          free the model
  *
@@ -24,8 +25,9 @@
  * Soft values. A soft value is a signed integer in units of 1/8, so 8 stands for 1.0. Its sign is the
  * decision: POSITIVE MEANS BIT 1, negative means bit 0. The core has 8-bit inputs, -128 to 127; what lies
  * outside is saturated, with one warning in the life of a state. The core neither knows nor needs the noise
- * variance: a log-likelihood ratio ln(P(1)/P(0)) times 8, or any other scale, may be given. Algorithm type 2
- * does best with a log-likelihood ratio times 4.
+ * variance, but it decodes best at one scale: a log-likelihood ratio ln(P(1)/P(0)) times 4, as
+ * vardel_ip_quarzel_bitacc_quantise makes it. With larger soft values the metrics clip, with smaller ones
+ * rounding costs, and the correction table of algorithm type 2 stands for this scale.
  *
  * Code blocks. A code block of K information bits (188 sizes from 40 to 6144; 3GPP TS 36.212, Table 5.1.3-3)
  * comes as three streams of K + 4 soft values: systematic, parity of the first constituent code, parity of
@@ -45,7 +47,9 @@
  * of both streams (see "Messages" below).
  *
  * Threads. The library starts no threads and has no global mutable data. Use a state from one thread at a
- * time; different states are independent.
+ * time; different states are independent. They share the standard streams, though: after a program has called
+ * std::ios::sync_with_stdio(false), threads whose states write to these at the same time race there. Take the
+ * messages with a receiver then.
  */
 #ifndef VARDEL_IP_QUARZEL_H
 #define VARDEL_IP_QUARZEL_H
@@ -246,6 +250,31 @@ typedef struct vardel_ip_quarzel_array_outputs {
 VARDEL_IP_QUARZEL_API int vardel_ip_quarzel_bitacc_simulate_array(
     vardel_ip_quarzel_state* state, const vardel_ip_quarzel_array_outputs* outputs,
     const vardel_ip_quarzel_array_inputs* inputs, int* statuses);
+
+/** The scale that turns log-likelihood ratios into soft values; docs/quantiser.md has the measurements. */
+#define VARDEL_IP_QUARZEL_LLR_SCALE 4.0
+
+/**
+ * Turn real numbers into soft values: round(scale * value), saturated to -128..127. Halves are rounded to the
+ * even number. The product is that of doubles, so a float gives what the double of the same value does.
+ *
+ * @param values  log-likelihood ratios ln(P(1)/P(0)), or samples, positive for bit 1. Infinite ones are
+ *                saturated
+ * @param count   values
+ * @param scale   units of 1/8 for a value of 1. For log-likelihood ratios VARDEL_IP_QUARZEL_LLR_SCALE; for
+ *                samples +-1 + noise of the variance v that times 2 / v
+ * @param soft    receives `count` soft values. They must not overlap the values
+ * @return        0; or 1, with nothing written, when the scale is not above 0 and finite, or a value is not a
+ *                number
+ *
+ * It needs no state and may be called from any thread.
+ */
+VARDEL_IP_QUARZEL_API int vardel_ip_quarzel_bitacc_quantise(const double* values, size_t count, double scale,
+                                                            int8_t* soft);
+
+/** The same for floats. */
+VARDEL_IP_QUARZEL_API int vardel_ip_quarzel_bitacc_quantise_float(const float* values, size_t count,
+                                                                  double scale, int8_t* soft);
 
 /** Free a model and all it owns. Null is allowed and does nothing. */
 VARDEL_IP_QUARZEL_API void vardel_ip_quarzel_destroy_state(vardel_ip_quarzel_state* state);

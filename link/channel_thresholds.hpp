@@ -2,9 +2,11 @@
 #pragma once
 
 #include <array>
+#include <compare>
 #include <cstdint>
 
 #include "link/decibels.hpp"
+#include "quarzel/quantise.hpp"
 
 namespace quarzel::link {
 
@@ -16,11 +18,11 @@ struct Quantiser {
         llr,        ///< scale * 2 y / sigma^2: `scale` units for a log-likelihood ratio of 1
     };
     Kind kind = Kind::llr;
-    double scale = 4;  ///< above 0, at most highestScale
+    double scale = llrScale;  ///< above 0, at most highestScale
 
     static constexpr double highestScale = 1e6;
 
-    bool operator==(const Quantiser&) const = default;
+    auto operator<=>(const Quantiser&) const = default;
 };
 
 /// The bits of a random number that decides a channel output.
@@ -34,11 +36,19 @@ constexpr int highestOutput = 128;
 /// nearest whole number.
 using ChannelThresholds = std::array<std::uint64_t, highestOutput - lowestOutput>;
 
-/// The variance of the noise, 1 / (2 R Eb/N0) at an amplitude of 1, with R = 1/3.
-double noiseVariance(Decibels ebN0);
+/// The code rate, by which the energy of an information bit is shared out among the coded bits.
+struct CodeRate {
+    std::uint32_t informationBits = 1;
+    std::uint32_t codedBits = 3;
+
+    bool operator==(const CodeRate&) const = default;
+};
+
+/// The variance of the noise, 1 / (2 R Eb/N0) at an amplitude of 1.
+double noiseVariance(Decibels ebN0, CodeRate rate = {});
 
 /// The thresholds of a channel: bit 1 is sent as +1, bit 0 as -1, noise of that variance is added, the sum
 /// is quantised. Every step is correctly rounded to 128 bits, so they are the same on every machine.
-ChannelThresholds channelThresholds(const Quantiser& quantiser, Decibels ebN0);
+ChannelThresholds channelThresholds(const Quantiser& quantiser, Decibels ebN0, CodeRate rate = {});
 
 }  // namespace quarzel::link

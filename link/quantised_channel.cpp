@@ -4,34 +4,14 @@
 #include <algorithm>
 #include <cstring>
 
+#include "link/refinement.hpp"
+
 namespace quarzel::link {
 
 namespace {
 
-constexpr unsigned refinementBits = 32;
 constexpr std::size_t groupsAtOnce = 8;
 constexpr std::size_t valuesAtOnce = groupsAtOnce * wordsPerGroup * 2;
-
-/// The further random bits of a block, for one undecided value after another.
-class Refinement {
-  public:
-    explicit Refinement(const RandomSource& source) : itsSource(source) {}
-
-    std::uint32_t next() {
-        const std::size_t place = itsUsed % wordsPerGroup;
-        if (place == 0) {
-            itsSource.words(Purpose::refinement, static_cast<std::uint32_t>(itsUsed / wordsPerGroup), 1,
-                            itsWords.data());
-        }
-        ++itsUsed;
-        return itsWords[place];
-    }
-
-  private:
-    const RandomSource& itsSource;
-    std::array<std::uint32_t, wordsPerGroup> itsWords;  // drawn when the first is needed
-    std::size_t itsUsed = 0;
-};
 
 /// The 16 random bits of a value, as the look-up takes them.
 std::uint32_t halfWordOf(const std::uint32_t* words, std::size_t value) {
@@ -42,8 +22,8 @@ std::uint32_t halfWordOf(const std::uint32_t* words, std::size_t value) {
 
 }  // namespace
 
-QuantisedChannel::QuantisedChannel(const Quantiser& quantiser, Decibels ebN0)
-    : itsThresholds(channelThresholds(quantiser, ebN0)) {
+QuantisedChannel::QuantisedChannel(const Quantiser& quantiser, Decibels ebN0, CodeRate rate)
+    : itsThresholds(channelThresholds(quantiser, ebN0, rate)) {
     makeCells();
 }
 
@@ -90,7 +70,7 @@ void QuantisedChannel::transmit(const RandomSource& source, const std::uint8_t* 
     std::array<std::uint8_t, valuesAtOnce> isUndecided;
     std::array<std::uint8_t, valuesPerLookUp> lastBits{};
     std::array<std::int8_t, valuesPerLookUp> lastSoft;
-    Refinement refinement(source);
+    Refinement refinement(source, Purpose::refinement);
     for (std::size_t start = 0; start < count; start += valuesAtOnce) {
         const std::size_t size = std::min(valuesAtOnce, count - start);
         source.words(Purpose::noise, static_cast<std::uint32_t>(start / (2 * wordsPerGroup)),

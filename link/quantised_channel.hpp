@@ -5,19 +5,20 @@
 #include <cstddef>
 #include <cstdint>
 
+#include "link/channel/channel.hpp"
 #include "link/channel_thresholds.hpp"
 #include "link/random_source.hpp"
 
 namespace quarzel::link {
 
-/// BPSK (bit 1 is sent as +1, bit 0 as -1) over additive white Gaussian noise, quantised to the 8-bit inputs
-/// of the core, as one discrete channel: its output is drawn from the exact distribution, to 2^-48, by a
-/// table look-up.
+/// BPSK (bit 1 is sent as +1, bit 0 as -1) or a component of QPSK over additive white Gaussian noise,
+/// quantised to the 8-bit inputs of the core, as one discrete channel: its output is drawn from the exact
+/// distribution, to 2^-48, by a table look-up.
 ///
 /// Thread rule: `transmit` may be called from several threads at once.
-class QuantisedChannel {
+class QuantisedChannel : public Channel {
   public:
-    QuantisedChannel(const Quantiser& quantiser, Decibels ebN0);
+    QuantisedChannel(const Quantiser& quantiser, Decibels ebN0, CodeRate rate = {});
 
     /// Send the code bits of a block.
     /// @param source    the block's random numbers; value i depends on them and on code bit i alone
@@ -25,7 +26,7 @@ class QuantisedChannel {
     /// @param count     code bits, at most 3 (6144 + 4)
     /// @param soft      receives `count` soft values; positive means bit 1
     void transmit(const RandomSource& source, const std::uint8_t* codeBits, unsigned lane, std::size_t count,
-                  std::int8_t* soft) const;
+                  std::int8_t* soft) const override;
 
     /// The probability of a soft value given the code bit, as `transmit` draws it.
     double probability(int soft, bool codeBit) const;

@@ -9,9 +9,27 @@ namespace quarzel::link {
 
 namespace {
 
-// The first word of the counter: index in bits 0 to 15, purpose in 16 to 18, K in 19 to 31.
+// The first word of the counter: index in bits 0 to 15, purpose in 16 to 18, K in 19 to 31, or for the code
+// blocks of a transport block a number that is no K.
 constexpr unsigned purposeShift = 16;
 constexpr unsigned blockSizeShift = 19;
+constexpr std::uint32_t firstCodeBlock = 7168;
+
+// The third word: Eb/N0, whose bits 26 to 31 are alike, and the transmission over its bits 27 to 31.
+constexpr unsigned transmissionShift = 27;
+
+// The fourth word: the upper bits of the block's number, the repetition in 8 to 12, A in 13 to 31.
+constexpr unsigned repetitionShift = 8;
+constexpr unsigned transportBlockShift = 13;
+
+PhiloxInput inputOf(const BlockName& name) {
+    const std::uint32_t size = name.transportBlock != 0 ? firstCodeBlock + name.codeBlock : name.blockSize;
+    return {{size << blockSizeShift, static_cast<std::uint32_t>(name.block),
+             static_cast<std::uint32_t>(name.ebN0.micro) ^ name.transmission << transmissionShift,
+             static_cast<std::uint32_t>(name.block >> 32) | name.repetition << repetitionShift |
+                 name.transportBlock << transportBlockShift},
+            {static_cast<std::uint32_t>(name.seed), static_cast<std::uint32_t>(name.seed >> 32)}};
+}
 
 /// For each byte the 8 bytes that hold its bits, the lowest first.
 using SpreadTable = std::array<std::array<std::uint8_t, 8>, 256>;
@@ -43,11 +61,13 @@ void spreadBits(const std::uint32_t* words, unsigned lane, std::size_t count, st
 
 }  // namespace
 
-RandomSource::RandomSource(const BlockName& name)
-    : itsInput{{name.blockSize << blockSizeShift, static_cast<std::uint32_t>(name.block),
-                static_cast<std::uint32_t>(name.ebN0.micro), static_cast<std::uint32_t>(name.block >> 32)},
-               {static_cast<std::uint32_t>(name.seed), static_cast<std::uint32_t>(name.seed >> 32)}},
-      itsBlockSize(name.blockSize) {}
+RandomSource::RandomSource(const BlockName& name) : itsName(name), itsInput(inputOf(name)) {}
+
+RandomSource RandomSource::ofTransmission() const {
+    BlockName name = itsName;
+    name.codeBlock = 0;
+    return RandomSource(name);
+}
 
 PhiloxInput RandomSource::input(Purpose purpose, std::uint32_t index) const {
     PhiloxInput input = itsInput;
@@ -64,9 +84,10 @@ void RandomSource::words(Purpose purpose, std::uint32_t firstGroup, std::size_t 
 void RandomSource::informationBits(unsigned lane, std::uint8_t* bits) const {
     constexpr std::uint32_t bitsPerGroup = 32 * wordsPerGroup;
     std::array<std::uint32_t, wordsPerGroup> words;
-    for (std::uint32_t at = 0; at < itsBlockSize; at += bitsPerGroup) {
+    const std::uint32_t size = itsName.transportBlock != 0 ? itsName.transportBlock : itsName.blockSize;
+    for (std::uint32_t at = 0; at < size; at += bitsPerGroup) {
         this->words(Purpose::informationBits, at / bitsPerGroup, 1, words.data());
-        const std::size_t count = std::min<std::size_t>(bitsPerGroup, itsBlockSize - at);
+        const std::size_t count = std::min<std::size_t>(bitsPerGroup, size - at);
         spreadBits(words.data(), lane, count, bits + at);
     }
 }

@@ -9,14 +9,19 @@
 
 namespace quarzel::link {
 
-/// The name of the random numbers of a code block. Equal names give equal numbers on every machine, different
-/// names independent ones. The core and the quantiser are not part of it, so they are compared on the same
-/// bits and the same noise.
+/// The name of the random numbers of a code block in a transmission. Equal names give equal numbers on every
+/// machine, different names independent ones. The core, the quantiser and the modulation are not part of it,
+/// so they are compared on the same bits and the same noise.
 struct BlockName {
     std::uint64_t seed;
-    std::uint32_t blockSize;  ///< K
-    Decibels ebN0;
-    std::uint64_t block;  ///< number of the block at its point, below 2^48
+    std::uint32_t blockSize;  ///< K; of no meaning in a transport block
+    Decibels ebN0;            ///< within 67 dB of 0
+    std::uint64_t block;      ///< number of the block at its point, below 2^40
+
+    std::uint32_t transmission = 0;    ///< below 32; the first one has the information bits
+    std::uint32_t repetition = 0;      ///< below 32: how often the code bits were sent in it before
+    std::uint32_t transportBlock = 0;  ///< A, below 2^19; 0 for code blocks alone
+    std::uint32_t codeBlock = 0;       ///< number in the transport block, below 1024
 };
 
 /// The purpose of random numbers. Numbers for different purposes are independent.
@@ -24,6 +29,8 @@ enum class Purpose : std::uint32_t {
     informationBits = 0,
     noise = 1,
     refinement = 2,  ///< further bits of noise where the first ones do not decide
+    fading = 3,
+    fadingRefinement = 4,
 };
 
 /// The random numbers of one code block, from the counter-based generator Philox4x32-10. The key is the seed;
@@ -34,7 +41,10 @@ class RandomSource {
   public:
     explicit RandomSource(const BlockName& name);
 
-    std::uint32_t blockSize() const { return itsBlockSize; }
+    std::uint32_t blockSize() const { return itsName.blockSize; }
+
+    /// The numbers that all code blocks of a transport block share in a transmission: those of its first.
+    RandomSource ofTransmission() const;
 
     /// Draw random words, in groups of wordsPerGroup.
     /// @param firstGroup  number of the first group, from 0
@@ -43,14 +53,14 @@ class RandomSource {
 
     /// Draw the information bits.
     /// @param lane  which bit, 0 to 7, of each byte they go to: bytes can hold the bits of 8 blocks
-    /// @param bits  K bytes, whose other bits are kept
+    /// @param bits  K bytes, or A and up to the next multiple of 8, whose other bits are kept
     void informationBits(unsigned lane, std::uint8_t* bits) const;
 
   private:
     PhiloxInput input(Purpose purpose, std::uint32_t index) const;
 
+    BlockName itsName;
     PhiloxInput itsInput;
-    std::uint32_t itsBlockSize;
 };
 
 }  // namespace quarzel::link

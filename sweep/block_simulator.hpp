@@ -12,8 +12,8 @@
 #include "link/encoder.hpp"
 #include "link/quantised_channel.hpp"
 #include "quarzel/core.hpp"
-#include "sweep/configuration.hpp"
 #include "sweep/point_state.hpp"
+#include "sweep/setup.hpp"
 
 namespace quarzel::sweep {
 
@@ -22,14 +22,12 @@ namespace quarzel::sweep {
 /// Thread rule: `at` may be called from several threads at once.
 class Channels {
   public:
-    explicit Channels(const link::Quantiser& quantiser) : itsQuantiser(quantiser) {}
-
-    std::shared_ptr<const link::QuantisedChannel> at(link::Decibels ebN0);
+    std::shared_ptr<const link::QuantisedChannel> of(const Setup& setup);
 
   private:
-    link::Quantiser itsQuantiser;
     std::mutex itsMutex;
-    std::map<link::Decibels, std::shared_ptr<const link::QuantisedChannel>> itsChannels;
+    std::map<std::pair<link::Quantiser, link::Decibels>, std::shared_ptr<const link::QuantisedChannel>>
+        itsChannels;
 };
 
 /// Sends blocks through encoder, channel and core, and counts the errors.
@@ -37,28 +35,29 @@ class Channels {
 /// Thread rule: one thread at a time; each thread has a simulator of its own.
 class BlockSimulator {
   public:
+    /// @param seed      of bits and noise
     /// @param channels  not owned, must outlive the simulator
-    BlockSimulator(const Configuration& configuration, Channels& channels)
-        : itsConfiguration(configuration), itsChannels(channels) {}
+    BlockSimulator(std::uint64_t seed, Channels& channels) : itsSeed(seed), itsChannels(channels) {}
 
     /// Simulate octets of blocks of a point.
+    /// @param counts  how many times the errors of a block are counted: after every iteration, or once, after
+    ///                the last one
     /// @param octets  their numbers, ascending
     /// @return        the blocks in error
     /// @throws quarzel::Error when the library refuses
-    ErrorList simulate(const Curve& curve, link::Decibels ebN0, const std::vector<std::uint64_t>& octets);
+    ErrorList simulate(const Setup& setup, std::size_t counts, const std::vector<std::uint64_t>& octets);
 
   private:
-    Core& coreOf(const Curve& curve);
+    Core& coreOf(const Setup& setup);
     const link::Encoder& encoderOf(std::uint32_t blockSize);
-    void send(const Curve& curve, link::Decibels ebN0, const std::vector<std::uint64_t>& octets);
-    void decode(const Curve& curve);
-    ErrorList count(const Curve& curve) const;
+    void send(const Setup& setup, const std::vector<std::uint64_t>& octets);
+    void decode(const Setup& setup, std::size_t counts, std::size_t blocks);
+    ErrorList count(std::size_t K, std::size_t counts, const std::vector<std::uint64_t>& octets) const;
 
-    const Configuration& itsConfiguration;
+    std::uint64_t itsSeed;
     Channels& itsChannels;
     std::map<std::pair<int, int>, Core> itsCores;  ///< by units and algorithm
     std::map<std::uint32_t, link::Encoder> itsEncoders;
-    std::vector<std::uint64_t> itsBlocks;  ///< numbers of the blocks that are being simulated
     std::vector<std::uint8_t>
         itsBits;  ///< information bits: K bytes an octet, a bit of each byte for each block
     std::vector<std::uint8_t> itsCodeBits;

@@ -4,8 +4,6 @@
 #include <algorithm>
 #include <utility>
 
-#include "sweep/part.hpp"
-
 namespace quarzel::sweep {
 
 namespace {
@@ -13,11 +11,6 @@ namespace {
 /// Information bits of a task: enough to fill the lanes of the decoder many times over, but few enough to
 /// stay in the second-level cache and to waste little where a point ends.
 constexpr std::uint64_t bitsPerTask = 32768;
-
-const Configuration& checked(const Configuration& configuration) {
-    configuration.check();
-    return configuration;
-}
 
 }  // namespace
 
@@ -29,21 +22,35 @@ std::vector<std::uint64_t> octetNumbers(const Task& task, const Shard& shard) {
     return numbers;
 }
 
-Dispatcher::Dispatcher(Plan plan) : itsPlan(std::move(plan)), itsCurves(checked(configuration()).curves()) {
-    const std::vector<PointState> start =
-        itsPlan.start.empty() ? freshPart(configuration(), shard()).points : itsPlan.start;
-    itsPoints.reserve(start.size());
-    for (std::size_t p = 0; p < start.size(); ++p) {
-        const std::uint64_t end = itsPlan.timedOut.empty() ? 0 : itsPlan.timedOut[p];
-        PointProgress progress(configuration(), shard(), end != 0 ? end : configuration().maxBlocks,
-                               start[p]);
+Dispatcher::Dispatcher(Plan plan) : itsPlan(std::move(plan)) {
+    itsPoints.reserve(itsPlan.points.size());
+    for (const PlannedPoint& point : itsPlan.points) {
+        PointProgress progress(point.rule, itsPlan.shard, point.start);
         const std::uint64_t nextOctet = progress.octetsDone();
         itsPoints.push_back({std::move(progress), nextOctet, std::nullopt});
+    }
+    for (std::size_t i = 0; i < itsPoints.size(); ++i) {
+        endCurveBelowTarget(i);
+    }
+}
+
+/// Leave out what comes after a point with a block error rate below the target. It may have begun already.
+void Dispatcher::endCurveBelowTarget(std::size_t point) {
+    const PointState& state = itsPoints[point].progress.state();
+    if (itsPoints[point].isLeftOut || !state.stoppedBy ||
+        static_cast<double>(state.last().blockErrors) >=
+            itsPlan.targetBler * static_cast<double>(state.blocks)) {
+        return;
+    }
+    const std::vector<PlannedPoint>& planned = itsPlan.points;
+    for (std::size_t i = point + 1; i < planned.size() && isSameCurve(planned[i].setup, planned[point].setup);
+         ++i) {
+        itsPoints[i].isLeftOut = true;
     }
 }
 
 std::uint64_t Dispatcher::usualOctets(std::size_t point) const {
-    const std::uint64_t K = itsCurves[point / configuration().ebN0.size()].blockSize;
+    const std::uint64_t K = itsPlan.points[point].setup.blockSize;
     return std::max<std::uint64_t>(bitsPerTask / (K * blocksPerOctet), 1);
 }
 
@@ -54,7 +61,7 @@ std::optional<Task> Dispatcher::next(unsigned size) {
     }
     for (; itsFirstWithWork < itsPoints.size(); ++itsFirstWithWork) {
         Point& point = itsPoints[itsFirstWithWork];
-        if (point.progress.hasStopped() || point.nextOctet == point.progress.octets()) {
+        if (point.isOver() || point.nextOctet == point.progress.octets()) {
             continue;
         }
         if (!point.since) {
@@ -72,16 +79,11 @@ std::optional<Task> Dispatcher::next(unsigned size) {
 void Dispatcher::complete(const Task& task, ErrorList errors) {
     const std::lock_guard lock(itsMutex);
     Point& point = itsPoints[task.point];
-    if (point.progress.hasStopped()) {
+    if (point.isOver()) {
         return;  // it ended before these blocks
     }
     point.progress.complete(task.firstOctet, task.octets, std::move(errors));
-    const bool isRepetition = !itsPlan.timedOut.empty();
-    if (isRepetition && itsPlan.timedOut[task.point] != 0 &&
-        point.progress.state().stoppedBy == StopReason::blocks) {
-        point.progress.stop(StopReason::time);
-    }
-    const std::uint64_t limit = isRepetition ? 0 : configuration().maxSeconds;
+    const std::uint64_t limit = itsPlan.points[task.point].rule.maxSeconds;
     const double seconds = secondsOf(point);
     if (limit != 0 && seconds >= static_cast<double>(limit) && !point.progress.hasStopped()) {
         point.progress.stop(StopReason::time);
@@ -89,6 +91,7 @@ void Dispatcher::complete(const Task& task, ErrorList errors) {
     if (point.progress.hasStopped()) {
         point.progress.setSeconds(seconds);
         point.since.reset();
+        endCurveBelowTarget(task.point);
     }
 }
 
@@ -116,32 +119,42 @@ void Dispatcher::rethrow() const {
 }
 
 bool Dispatcher::hasFinished() const {
-    return firstUnfinished() == configuration().points();
+    return firstUnfinished() == itsPoints.size();
 }
 
 std::size_t Dispatcher::firstUnfinished() const {
     const std::lock_guard lock(itsMutex);
-    const auto found = std::find_if(itsPoints.begin(), itsPoints.end(),
-                                    [](const Point& point) { return !point.progress.hasStopped(); });
+    const auto found =
+        std::find_if(itsPoints.begin(), itsPoints.end(), [](const Point& point) { return !point.isOver(); });
     return static_cast<std::size_t>(found - itsPoints.begin());
 }
 
-std::vector<PointState> Dispatcher::states() const {
-    const std::lock_guard lock(itsMutex);
-    std::vector<PointState> states;
-    for (const Point& point : itsPoints) {
-        states.push_back(point.progress.state());
-        states.back().seconds = secondsOf(point);
-    }
-    return states;
-}
-
-PointState Dispatcher::stateOf(std::size_t index) const {
-    const std::lock_guard lock(itsMutex);
-    const Point& point = itsPoints.at(index);
-    PointState state = point.progress.summary();
+PointState Dispatcher::stateOf(const Point& point) const {
+    PointState state = point.progress.state();
     state.seconds = secondsOf(point);
     return state;
+}
+
+Points Dispatcher::points() const {
+    const std::lock_guard lock(itsMutex);
+    Points points;
+    for (std::size_t i = 0; i < itsPoints.size(); ++i) {
+        const PointState& state = itsPoints[i].progress.state();
+        if (!itsPoints[i].isLeftOut && (state.blocks != 0 || state.stoppedBy)) {
+            points.emplace(itsPlan.points[i].setup, stateOf(itsPoints[i]));
+        }
+    }
+    return points;
+}
+
+bool Dispatcher::isLeftOut(std::size_t point) const {
+    const std::lock_guard lock(itsMutex);
+    return itsPoints.at(point).isLeftOut;
+}
+
+PointState Dispatcher::stateOf(std::size_t point) const {
+    const std::lock_guard lock(itsMutex);
+    return stateOf(itsPoints.at(point));
 }
 
 }  // namespace quarzel::sweep

@@ -9,6 +9,7 @@
 #include <optional>
 #include <vector>
 
+#include "sweep/plan.hpp"
 #include "sweep/point_progress.hpp"
 
 namespace quarzel::sweep {
@@ -23,15 +24,6 @@ struct Task {
 /// The octets of a task, by their numbers in the point.
 std::vector<std::uint64_t> octetNumbers(const Task& task, const Shard& shard);
 
-/// A sweep that is to be run.
-struct Plan {
-    Configuration configuration;
-    Shard shard = {};
-    std::vector<PointState> start = {};        ///< where each point goes on; empty: all from the beginning
-    std::vector<std::uint64_t> timedOut = {};  ///< to run a finished sweep again: for each point the blocks
-                                               ///< after which time ended it, or 0
-};
-
 /// Hands out the tasks of a sweep and collects the blocks in error. Tasks are handed out in the order of
 /// points and blocks, and may be completed in any order.
 ///
@@ -40,14 +32,11 @@ class Dispatcher {
   public:
     using Clock = std::chrono::steady_clock;
 
-    /// @throws Error when the configuration is not possible
     explicit Dispatcher(Plan plan);
     Dispatcher(const Dispatcher&) = delete;
     Dispatcher& operator=(const Dispatcher&) = delete;
 
-    const Configuration& configuration() const { return itsPlan.configuration; }
-    const Shard& shard() const { return itsPlan.shard; }
-    const std::vector<Curve>& curves() const { return itsCurves; }
+    const Plan& plan() const { return itsPlan; }
 
     /// The next task.
     /// @param size  of the task, as a multiple of the usual one
@@ -66,16 +55,19 @@ class Dispatcher {
     /// Throw the exception with which a task has failed, if one has.
     void rethrow() const;
 
-    /// Whether every point has ended.
+    /// Whether every point has ended or is left out.
     bool hasFinished() const;
 
-    /// The state of every point.
-    std::vector<PointState> states() const;
+    /// The points that have begun and are not left out.
+    Points points() const;
 
-    /// The state of one point, without its list of errors.
+    /// Whether a point is left out, since its curve has ended before it.
+    bool isLeftOut(std::size_t point) const;
+
+    /// The state of one point.
     PointState stateOf(std::size_t point) const;
 
-    /// The first point that has not ended; the number of points when all have.
+    /// The first point that has not ended and is not left out; the number of points when there is none.
     std::size_t firstUnfinished() const;
 
   private:
@@ -83,13 +75,17 @@ class Dispatcher {
         PointProgress progress;
         std::uint64_t nextOctet;
         std::optional<Clock::time_point> since;  ///< when this run began it
+        bool isLeftOut = false;
+
+        bool isOver() const { return isLeftOut || progress.hasStopped(); }
     };
 
     std::uint64_t usualOctets(std::size_t point) const;
+    void endCurveBelowTarget(std::size_t point);
     double secondsOf(const Point& point) const;
+    PointState stateOf(const Point& point) const;
 
     const Plan itsPlan;
-    const std::vector<Curve> itsCurves;
     mutable std::mutex itsMutex;  ///< guards what follows
     std::vector<Point> itsPoints;
     std::size_t itsFirstWithWork = 0;

@@ -6,17 +6,22 @@
 
 namespace quarzel::sweep {
 
-PointProgress::PointProgress(const Configuration& configuration, const Shard& shard, std::uint64_t maxBlocks,
-                             PointState state)
-    : itsMaxBlockErrors(configuration.maxBlockErrors),
+PointProgress::PointProgress(const StopRule& rule, const Shard& shard, PointState state)
+    : itsRule(rule),
       itsShard(shard),
-      itsMaxBlocks(maxBlocks),
-      itsOctetsDone((state.blocks + blocksPerOctet - 1) / blocksPerOctet),
+      itsOctetsDone(state.blocks / blocksPerOctet),
+      itsFirstBlock(state.blocks),
       itsState(std::move(state)) {
-    const std::uint64_t all = (maxBlocks + blocksPerOctet - 1) / blocksPerOctet;
+    const std::uint64_t all = (rule.maxBlocks + blocksPerOctet - 1) / blocksPerOctet;
     itsOctets = all > shard.index ? (all - shard.index - 1) / shard.count + 1 : 0;
-    if (itsOctets == 0 && !hasStopped()) {
-        stop(StopReason::blocks);
+    const bool hasBlocks = itsState.blocks >= blocksIn(itsOctets);
+    const bool hasErrors = rule.maxBlockErrors != 0 && itsState.last().blockErrors >= rule.maxBlockErrors;
+    const bool hasTime = rule.maxSeconds != 0 && itsState.stoppedBy == StopReason::time &&
+                         itsState.seconds >= static_cast<double>(rule.maxSeconds);
+    if (!hasBlocks && !hasErrors && !hasTime) {
+        itsState.stoppedBy.reset();
+    } else if (!hasStopped()) {
+        stop(StopReason::blocks);  // its last block need not be the one with the last error
     }
 }
 
@@ -25,17 +30,8 @@ std::uint64_t PointProgress::blocksIn(std::uint64_t octets) const {
     if (octets == 0) {
         return 0;
     }
-    const std::uint64_t last = octetNumber(octets - 1) * blocksPerOctet;
-    return (octets - 1) * blocksPerOctet + std::min(blocksPerOctet, itsMaxBlocks - last);
-}
-
-PointState PointProgress::summary() const {
-    PointState summary(itsState.counts.size());
-    summary.blocks = itsState.blocks;
-    summary.counts = itsState.counts;
-    summary.bitErrorSquares = itsState.bitErrorSquares;
-    summary.stoppedBy = itsState.stoppedBy;
-    return summary;
+    const std::uint64_t last = ((octets - 1) * itsShard.count + itsShard.index) * blocksPerOctet;
+    return (octets - 1) * blocksPerOctet + std::min(blocksPerOctet, itsRule.maxBlocks - last);
 }
 
 void PointProgress::complete(std::uint64_t firstOctet, std::uint64_t octets, ErrorList errors) {
@@ -53,14 +49,13 @@ void PointProgress::add(const Piece& piece) {
     const std::size_t counts = itsState.counts.size();
     for (std::size_t i = 0; i < piece.errors.size(); ++i) {
         const std::uint64_t block = piece.errors.blocks[i];
+        if (block < itsFirstBlock || block >= itsRule.maxBlocks) {
+            continue;
+        }
         const std::uint32_t* const row = piece.errors.row(i, counts);
         itsState.add(row);
-        if (!itsShard.isWhole()) {
-            itsState.errors.append(block, row, counts);
-        }
-        if (row[counts - 1] != 0 && itsState.last().blockErrors == itsMaxBlockErrors) {
-            const std::uint64_t octet = block / blocksPerOctet / itsShard.count;
-            itsState.blocks = blocksIn(octet) + block % blocksPerOctet + 1;
+        if (row[counts - 1] != 0 && itsState.last().blockErrors == itsRule.maxBlockErrors) {
+            itsState.blocks = block + 1;
             stop(StopReason::blockErrors);
             return;
         }

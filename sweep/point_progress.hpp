@@ -4,8 +4,8 @@
 #include <cstdint>
 #include <map>
 
-#include "sweep/configuration.hpp"
 #include "sweep/point_state.hpp"
+#include "sweep/shard.hpp"
 
 namespace quarzel::sweep {
 
@@ -13,15 +13,14 @@ namespace quarzel::sweep {
 /// at blocks in order, so a point ends at the same block whoever simulates it and whenever.
 class PointProgress {
   public:
-    /// @param maxBlocks  blocks of the point in all shards
-    /// @param state      where to go on
-    PointProgress(const Configuration& configuration, const Shard& shard, std::uint64_t maxBlocks,
-                  PointState state);
+    /// @param shard  whole, unless the rule knows no limit of errors
+    /// @param state  where to go on; a point that has ended goes on if the rule says so
+    PointProgress(const StopRule& rule, const Shard& shard, PointState state);
 
     /// Octets in the shard.
     std::uint64_t octets() const { return itsOctets; }
 
-    /// The first octet of the shard that is not done.
+    /// The first octet of the shard that is not done to its end.
     std::uint64_t octetsDone() const { return itsOctetsDone; }
 
     /// Take in the blocks in error of some octets, which may be ahead of the next ones.
@@ -33,9 +32,6 @@ class PointProgress {
 
     const PointState& state() const { return itsState; }
 
-    /// The state without its list of errors.
-    PointState summary() const;
-
     void setSeconds(double seconds) { itsState.seconds = seconds; }
 
   private:
@@ -45,14 +41,13 @@ class PointProgress {
     };
 
     void add(const Piece& piece);
-    std::uint64_t octetNumber(std::uint64_t octet) const { return octet * itsShard.count + itsShard.index; }
     std::uint64_t blocksIn(std::uint64_t octets) const;
 
-    std::uint64_t itsMaxBlockErrors;
+    StopRule itsRule;
     Shard itsShard;
-    std::uint64_t itsMaxBlocks;
     std::uint64_t itsOctets;
     std::uint64_t itsOctetsDone;
+    std::uint64_t itsFirstBlock;  ///< those before it are counted already
     PointState itsState;
     std::map<std::uint64_t, Piece> itsWaiting;  ///< by first octet: ahead of the next ones
 };

@@ -37,17 +37,18 @@ struct ErrorList {
 struct ErrorCount {
     std::uint64_t bitErrors = 0;
     std::uint64_t blockErrors = 0;
+
+    bool operator==(const ErrorCount&) const = default;
 };
 
 /// How far a point has come, and the errors of its blocks so far.
 struct PointState {
-    std::uint64_t blocks = 0;        ///< done, without a gap; in a shard only its own
-    std::vector<ErrorCount> counts;  ///< after each iteration at which errors are counted
+    std::uint64_t blocks = 0;        ///< done, without a gap; in a shard that divides them only its own
+    std::vector<ErrorCount> counts;  ///< after each iteration, or after the last one only
     std::uint64_t bitErrorSquares =
         0;  ///< sum over the blocks of the squared bit errors after the last iteration
     std::optional<StopReason> stoppedBy;  ///< none: it has not ended
     double seconds = 0;                   ///< time spent on it
-    ErrorList errors;                     ///< only in shards: where the errors are
 
     explicit PointState(std::size_t countsPerBlock = 1) : counts(countsPerBlock) {}
 

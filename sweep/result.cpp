@@ -1,107 +1,121 @@
 // SPDX-License-Identifier: MIT
 #include "sweep/result.hpp"
 
+#include <stdexcept>
+
 #include "sweep/document.hpp"
 #include "sweep/error.hpp"
-#include "sweep/statistics.hpp"
+#include "sweep/point_json.hpp"
+#include "sweep/sha256.hpp"
 
 namespace quarzel::sweep {
 
 namespace {
 
-Json intervalJson(const Interval& interval) {
-    return Json::array({interval.low, interval.high});
+constexpr std::string_view resultFormat = "quarzel sweep result";
+constexpr std::string_view partFormat = "quarzel sweep part";
+
+Json curvesJson(const Points& points) {
+    Json curves = Json::array();
+    const Setup* last = nullptr;
+    for (const auto& [setup, point] : points) {
+        if (last == nullptr || !isSameCurve(setup, *last)) {
+            curves.push_back(curveJson(setup));
+            curves.back()["points"] = Json::array();
+        }
+        curves.back()["points"].push_back(pointJson(setup, point));
+        last = &setup;
+    }
+    return curves;
 }
 
-Json pointJson(const PointState& point, link::Decibels ebN0, const Curve& curve, bool perIteration) {
-    const Rates rates = ratesOf(point, curve.blockSize);
-    Json json = {
-        {"ebn0_db", ebN0.value()},
-        {"blocks", point.blocks},
-        {"bits", point.blocks * curve.blockSize},
-        {"bit_errors", point.last().bitErrors},
-        {"block_errors", point.last().blockErrors},
-        {"bit_error_squares", point.bitErrorSquares},
-        {"ber", rates.ber},
-        {"bler", rates.bler},
-        {"ber_interval", intervalJson(rates.berInterval)},
-        {"bler_interval", intervalJson(rates.blerInterval)},
-        {"stopped_by", nameOf(point.stoppedBy.value())},
-    };
-    if (perIteration) {
-        json["per_iteration"] = Json::array();
-        for (const ErrorCount& count : point.counts) {
-            json["per_iteration"].push_back(
-                {{"bit_errors", count.bitErrors}, {"block_errors", count.blockErrors}});
+/// Version 1 had one quantiser for all curves, in the configuration of its sweep.
+void upgrade(Json& document) {
+    const Json& configuration = document.at("configuration");
+    const Json quantiser = configuration.at("quantiser");
+    document["seed"] = configuration.at("seed");
+    for (Json& curve : document.at("curves")) {
+        curve["quantiser"] = quantiser.at("kind");
+        curve["scale"] = quantiser.at("scale");
+    }
+}
+
+Result resultFrom(Json document) {
+    if (document.at("version") == 1) {
+        upgrade(document);
+    }
+    Result result;
+    document.at("seed").get_to(result.seed);
+    document.at("quarzel").get_to(result.quarzel);
+    for (const Json& curve : document.at("curves")) {
+        for (const Json& json : curve.at("points")) {
+            auto [setup, point] = pointFrom(curve, json);
+            if (!result.points.emplace(setup, std::move(point)).second) {
+                throw std::runtime_error("it holds a point twice: " + setupText(setup));
+            }
         }
     }
-    return json;
-}
-
-ErrorCount countFrom(const Json& json) {
-    return {json.at("bit_errors").get<std::uint64_t>(), json.at("block_errors").get<std::uint64_t>()};
-}
-
-PointState pointFrom(const Json& json) {
-    PointState point;
-    point.blocks = json.at("blocks").get<std::uint64_t>();
-    point.bitErrorSquares = json.at("bit_error_squares").get<std::uint64_t>();
-    point.stoppedBy = stopReasonOf(json.at("stopped_by").get<std::string>()).value();
-    point.counts = {countFrom(json)};
-    if (json.contains("per_iteration")) {
-        point.counts.clear();
-        for (const Json& count : json.at("per_iteration")) {
-            point.counts.push_back(countFrom(count));
+    if (document.contains("part")) {
+        const Json& part = document.at("part");
+        result.part = {{part.at("index").get<std::uint64_t>() - 1, part.at("count").get<std::uint64_t>()},
+                       part.at("sweep").get<std::string>()};
+        if (result.part->shard.index >= result.part->shard.count ||
+            result.part->shard.count > Shard::highestCount) {
+            throw std::runtime_error("its part is not one of a sweep");
         }
     }
-    return point;
+    return result;
+}
+
+Result read(std::string_view text, std::string_view format) {
+    // Parts of version 1 divided blocks, with a list of those in error.
+    Json document = readDocument(text, format, format == partFormat ? 2 : 1);
+    try {
+        return resultFrom(std::move(document));
+    } catch (const std::exception& error) {
+        throw Error(std::string("is not understood: ") + error.what(), "use another copy of it");
+    }
 }
 
 }  // namespace
 
-std::string pointText(const Configuration& configuration, std::size_t number, const PointState& point) {
-    const std::size_t points = configuration.ebN0.size();
-    return pointJson(point, configuration.ebN0.at(number % points),
-                     configuration.curves().at(number / points), configuration.perIteration)
-        .dump();
+std::optional<Part> partOf(const Configuration& configuration, const Shard& shard) {
+    if (shard.isWhole()) {
+        return std::nullopt;
+    }
+    Json json = {configuration.seed, configuration.perIteration, configuration.stopRule.maxBlocks,
+                 configuration.stopRule.maxBlockErrors};
+    for (const Setup& setup : configuration.setups()) {
+        json.push_back({curveJson(setup), setup.ebN0.micro});
+    }
+    return Part{shard, sha256(json.dump())};
 }
 
 std::string resultText(const Result& result) {
-    const Configuration& configuration = result.configuration;
-    Json document = newDocument(resultFormat, result.quarzel);
-    document["configuration"] = toJson(configuration);
-    document["curves"] = Json::array();
-    std::size_t next = 0;
-    for (const Curve& curve : configuration.curves()) {
-        Json points = Json::array();
-        for (const link::Decibels& ebN0 : configuration.ebN0) {
-            points.push_back(pointJson(result.points.at(next++), ebN0, curve, configuration.perIteration));
-        }
-        document["curves"].push_back({{"block_size", curve.blockSize},
-                                      {"units", curve.units},
-                                      {"algorithm", curve.algorithm},
-                                      {"iterations", curve.iterations},
-                                      {"points", std::move(points)}});
+    Json document = newDocument(result.part ? partFormat : resultFormat, result.quarzel);
+    document["seed"] = result.seed;
+    if (result.part) {
+        document["part"] = {{"index", result.part->shard.index + 1},
+                            {"count", result.part->shard.count},
+                            {"sweep", result.part->sweep}};
     }
-    return textOf(std::move(document), resultIndent);
+    document["curves"] = curvesJson(result.points);
+    return textOf(std::move(document));
+}
+
+std::string pointText(const Setup& setup, const PointState& point) {
+    return curvesJson({{setup, point}}).front().dump();
 }
 
 Result readResult(std::string_view text) {
-    const Json document = readDocument(text, resultFormat, resultIndent);
-    try {
-        Result result{configurationFrom(document.at("configuration")), {}, document.at("quarzel")};
-        for (const Json& curve : document.at("curves")) {
-            for (const Json& point : curve.at("points")) {
-                result.points.push_back(pointFrom(point));
-            }
-        }
-        if (result.points.size() != result.configuration.points()) {
-            throw Error("does not hold the points of its configuration", "use another copy of it");
-        }
-        return result;
-    } catch (const std::exception& error) {
-        throw Error(std::string("is not understood: ") + error.what(), "use another copy of it");
+    if (isOfFormat(text, partFormat)) {
+        throw Error("is a part of a sweep", "join all its parts with 'quarzel merge'");
     }
+    return read(text, resultFormat);
+}
+
+Result readResultOrPart(std::string_view text) {
+    return read(text, isOfFormat(text, partFormat) ? partFormat : resultFormat);
 }
 
 }  // namespace quarzel::sweep

@@ -1,40 +1,50 @@
 // SPDX-License-Identifier: MIT
 #pragma once
 
+#include <cstdint>
+#include <optional>
 #include <string>
 #include <string_view>
-#include <vector>
 
-#include "sweep/configuration.hpp"
-#include "sweep/point_state.hpp"
+#include "sweep/points.hpp"
+#include "sweep/shard.hpp"
 #include "vardel_ip_quarzel.h"
 
 namespace quarzel::sweep {
 
-/// The format that a result file names.
-constexpr std::string_view resultFormat = "quarzel sweep result";
+/// Which part of which sweep a result is.
+struct Part {
+    Shard shard;
+    std::string sweep;  ///< digest of all that the sweep asks for
 
-/// Its indentation, in blanks a level.
-constexpr int resultIndent = 1;
+    bool operator==(const Part&) const = default;
+};
 
-/// The result of a sweep. It depends on the configuration alone: not on threads, shards or interruptions.
-/// (With a time limit the clock decides how many blocks a point has.)
+/// @return  none when the shard is the whole sweep
+std::optional<Part> partOf(const Configuration& configuration, const Shard& shard);
+
+/// A set of points. What is counted at a point depends on the seed, its setup and the number of its blocks
+/// alone: not on threads, shards, interruptions or the machine. In the checkpoint of a sweep some points have
+/// not ended.
 struct Result {
-    Configuration configuration;
-    std::vector<PointState> points;                   ///< every one has ended
+    std::uint64_t seed = 1;
+    Points points;
+    std::optional<Part> part;                         ///< only in parts, which have to be joined
     std::string quarzel = VARDEL_IP_QUARZEL_VERSION;  ///< the version that wrote the file
 };
 
-/// The result file.
+/// The file of a result.
 std::string resultText(const Result& result);
 
-/// A point as it is in the result file, a JSON object in one line.
-/// @param number  of the point, see Configuration::points
-/// @param point   one that has ended
-std::string pointText(const Configuration& configuration, std::size_t number, const PointState& point);
+/// The JSON of a curve that has this point alone, in one line.
+std::string pointText(const Setup& setup, const PointState& point);
 
-/// Read a result file.
-/// @throws Error when it is not a whole, unaltered result in this version of the format
+/// Read the file of a result.
+/// @throws Error when it is a part, or not a whole, unaltered result
 Result readResult(std::string_view text);
+
+/// Read the file of a result or a part.
+/// @throws Error when it is not a whole, unaltered one
+Result readResultOrPart(std::string_view text);
 
 }  // namespace quarzel::sweep

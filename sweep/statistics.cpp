@@ -8,9 +8,6 @@ namespace quarzel::sweep {
 
 namespace {
 
-constexpr double deviations =
-    1.959963984540054;  // within which a normal distribution lies in 95 % of all cases
-
 Interval wilsonInterval(double errors, double trials) {
     constexpr double square = deviations * deviations;
     const double rate = errors / trials;
@@ -20,19 +17,35 @@ Interval wilsonInterval(double errors, double trials) {
     return {errors == 0 ? 0 : (centre - width) / whole, errors == trials ? 1 : (centre + width) / whole};
 }
 
-Interval berInterval(const PointState& point, double K, double ber, double blerHigh) {
+/// The variance of the bit errors of a block, of which there are at least 2.
+double varianceOf(const PointState& point) {
     const auto blocks = static_cast<double>(point.blocks);
+    const auto errors = static_cast<double>(point.last().bitErrors);
+    const double squares = static_cast<double>(point.bitErrorSquares) - errors * (errors / blocks);
+    return std::max(squares / (blocks - 1), 0.0);
+}
+
+Interval berInterval(const PointState& point, double K, double ber, double blerHigh) {
     if (point.last().bitErrors == 0 || point.blocks < 2) {
         return {0, blerHigh};
     }
-    const auto errors = static_cast<double>(point.last().bitErrors);
-    const double variance =  // of the bit errors of a block
-        (static_cast<double>(point.bitErrorSquares) - errors * (errors / blocks)) / (blocks - 1);
-    const double width = deviations * std::sqrt(std::max(variance, 0.0) / blocks) / K;
+    const double width = deviations * std::sqrt(varianceOf(point) / static_cast<double>(point.blocks)) / K;
     return {std::max(ber - width, 0.0), std::min(ber + width, 1.0)};
 }
 
 }  // namespace
+
+Interval berScoreInterval(const PointState& point, std::uint32_t blockSize) {
+    const Rates rates = ratesOf(point, blockSize);
+    if (point.last().bitErrors == 0 || point.blocks < 2) {
+        return rates.berInterval;
+    }
+    const auto errors = static_cast<double>(point.last().bitErrors);
+    const double square =  // (z times the relative deviation of the rate) squared
+        deviations * deviations * varianceOf(point) * static_cast<double>(point.blocks) / (errors * errors);
+    const double factor = 1 + square / 2 + std::sqrt(square * (1 + square / 4));
+    return {rates.ber / factor, std::min(rates.ber * factor, 1.0)};
+}
 
 Rates ratesOf(const PointState& point, std::uint32_t blockSize) {
     if (point.blocks == 0) {

@@ -17,13 +17,12 @@ constexpr std::chrono::milliseconds tickPeriod{50};
 /// Do tasks until there are none.
 void work(Dispatcher& dispatcher, Channels& channels) {
     try {
-        const Configuration& configuration = dispatcher.configuration();
-        BlockSimulator simulator(configuration, channels);
+        const Plan& plan = dispatcher.plan();
+        BlockSimulator simulator(plan.seed, channels);
         while (const auto task = dispatcher.next()) {
-            dispatcher.complete(
-                *task, simulator.simulate(dispatcher.curves()[task->point / configuration.ebN0.size()],
-                                          configuration.ebN0[task->point % configuration.ebN0.size()],
-                                          octetNumbers(*task, dispatcher.shard())));
+            const PlannedPoint& point = plan.points[task->point];
+            dispatcher.complete(*task, simulator.simulate(point.setup, point.start.counts.size(),
+                                                          octetNumbers(*task, plan.shard)));
         }
     } catch (...) {
         dispatcher.fail(std::current_exception());
@@ -33,7 +32,7 @@ void work(Dispatcher& dispatcher, Channels& channels) {
 }  // namespace
 
 void ThreadWorkers::run(Dispatcher& dispatcher, Observer& observer) {
-    Channels channels(dispatcher.configuration().quantiser);
+    Channels channels;
     const auto workers = std::async(std::launch::async, [&] {
         link::forEachOnThreads(itsThreads, itsThreads,
                                [&] { return [&](std::size_t) { work(dispatcher, channels); }; });

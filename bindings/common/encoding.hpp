@@ -3,10 +3,14 @@
 
 #include <cstddef>
 #include <cstdint>
+#include <span>
 
 #include "outcome.hpp"
 
 namespace quarzel::bindings {
+
+/// @throws BindingError unless all bits are 0 or 1
+void requireBits(std::span<const std::uint8_t> bits);
 
 /// Encode blocks of one size.
 /// @param bits    K information bits a block, each 0 or 1

@@ -4,6 +4,7 @@
 #include <algorithm>
 #include <vector>
 
+#include "link/choice.hpp"
 #include "link/size_table.hpp"
 
 namespace quarzel::bindings {
@@ -25,22 +26,6 @@ void checkSettings(const CoreSettings& settings) {
     if (settings.tagWidth < 0 || settings.tagWidth > 32) {
         refuse("tag width", "a number from 0 to 32", settings.tagWidth);
     }
-}
-
-/// The place of a name in a list.
-/// @throws BindingError listing the names when it is none of them
-template <class Names>
-std::size_t find(const Names& names, std::string_view name, const char* what) {
-    const auto found = std::find(names.begin(), names.end(), name);
-    if (found != names.end()) {
-        return static_cast<std::size_t>(found - names.begin());
-    }
-    std::string choices;
-    for (const std::string_view choice : names) {
-        choices.append(choices.empty() ? "" : ", ").append(choice);
-    }
-    throw BindingError(Fault::value, "there is no " + std::string(what) + " '" + std::string(name) +
-                                         "'; choose one of " + choices);
 }
 
 /// Keeps a core to the thread that is using it.
@@ -135,7 +120,7 @@ void decodeJob(Core& core, const DecodeJob& job, const HostCore::Interrupted& in
 }  // namespace
 
 int algorithmOf(std::string_view name) {
-    return static_cast<int>(find(algorithmNames, name, "algorithm"));
+    return static_cast<int>(link::placeOf(algorithmNames, name, "algorithm"));
 }
 
 std::uint32_t blockSizeOf(std::size_t positions) {
@@ -179,7 +164,7 @@ Outcome HostCore::open(const CoreSettings& settings, const std::string& implemen
         const Use inUse(itsBusy);
         checkSettings(settings);
         if (!implementation.empty()) {
-            find(implementations(), implementation, "implementation");
+            link::placeOf(implementations(), implementation, "implementation");
         }
         itsCore.emplace(settings);
         if (!implementation.empty()) {

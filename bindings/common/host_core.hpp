@@ -75,7 +75,7 @@ class HostCore {
 };
 
 /// The number of an algorithm type that is given by its name.
-/// @throws BindingError listing the names when it is none of them
+/// @throws std::invalid_argument listing the names when it is none of them
 int algorithmOf(std::string_view name);
 
 /// K of a block with this many positions.

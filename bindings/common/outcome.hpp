@@ -67,6 +67,9 @@ void guard(Outcome& outcome, Work&& work) noexcept {
             outcome.text = error.what();
         } catch (const std::bad_alloc&) {
             throw;
+        } catch (const std::invalid_argument& error) {
+            outcome.fault = Fault::value;
+            outcome.text = error.what();
         } catch (const std::exception& error) {
             outcome.fault = Fault::model;
             outcome.text = error.what();
@@ -76,6 +79,14 @@ void guard(Outcome& outcome, Work&& work) noexcept {
         }
     } catch (...) {
         outcome.fault = Fault::memory;
+    }
+}
+
+/// Pass on what went wrong in a call inside another one.
+/// @throws BindingError unless the call has done its work
+inline void requireDone(const Outcome& outcome) {
+    if (!outcome.done()) {
+        throw BindingError(outcome.fault, outcome.message());
     }
 }
 

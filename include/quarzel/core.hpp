@@ -19,6 +19,7 @@
 #include <vector>
 
 #include "quarzel/code.hpp"
+#include "quarzel/quantise.hpp"
 #include "vardel_ip_quarzel.h"
 
 /// The model for C++: a class over vardel_ip_quarzel.h, which tells what a soft value and a code block are.

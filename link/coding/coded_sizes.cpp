@@ -5,6 +5,7 @@
 #include <stdexcept>
 #include <string>
 
+#include "link/coding/require.hpp"
 #include "link/coding/sub_block_interleaver.hpp"
 #include "quarzel/code.hpp"
 
@@ -38,12 +39,7 @@ std::vector<std::size_t> codedSizes(std::size_t C, std::size_t G, unsigned layer
         throw std::invalid_argument("the code blocks need at least " + std::to_string(C * unit) +
                                     " coded bits, not " + std::to_string(G));
     }
-    if (G % unit != 0) {
-        const std::size_t below = G - G % unit;
-        throw std::invalid_argument("coded bits must be a multiple of " + std::to_string(unit) + ", not " +
-                                    std::to_string(G) + "; the nearest: " + std::to_string(below) + ", " +
-                                    std::to_string(below + unit));
-    }
+    requireMultiple("coded bits", G, unit);
     const std::size_t symbols = G / unit;
     std::vector<std::size_t> sizes(C, unit * (symbols / C));
     for (std::size_t r = C - symbols % C; r < C; ++r) {

@@ -49,6 +49,23 @@ std::uint32_t byteOf(const std::uint8_t* bits) {
     return static_cast<std::uint32_t>(word * 0x8040201008040201U >> 56);
 }
 
+/// Eight bits of 8 blocks as a byte for each block, that of block i from bit 8 i on, the first bit highest: a
+/// matrix of 8 by 8 bits transposed.
+std::uint64_t bytesOf(const std::uint8_t* bits) {
+    std::uint64_t word = 0;
+    for (unsigned i = 0; i < 8; ++i) {
+        word |= std::uint64_t{bits[i]} << 8 * (7 - i);
+    }
+    const auto swap = [&word](unsigned distance, std::uint64_t mask) {
+        const std::uint64_t change = (word ^ word >> distance) & mask;
+        word ^= change ^ change << distance;
+    };
+    swap(7, 0x00aa00aa00aa00aa);
+    swap(14, 0x0000cccc0000cccc);
+    swap(28, 0x00000000f0f0f0f0);
+    return word;
+}
+
 }  // namespace
 
 unsigned crcLength(Crc crc) {
@@ -70,9 +87,28 @@ std::uint32_t crcOf(Crc crc, std::span<const std::uint8_t> bits) {
 
 void writeCrc(Crc crc, std::span<const std::uint8_t> bits, std::span<std::uint8_t> parity) {
     requireSize("parity bits", parity.size(), crcLength(crc));
-    const std::uint32_t remainder = crcOf(crc, bits);
-    for (std::size_t i = 0; i < parity.size(); ++i) {
-        parity[i] = remainder >> (parity.size() - 1 - i) & 1U;
+    const Generator& generator = generatorOf(crc);
+    std::array<std::uint32_t, 8> remainders{};
+    std::size_t i = 0;
+    for (; i < bits.size() % 8; ++i) {
+        for (unsigned block = 0; block < remainders.size(); ++block) {
+            remainders[block] =
+                generator.shifted(remainders[block] ^ (std::uint32_t{bits[i]} >> block & 1U) << 31);
+        }
+    }
+    for (; i < bits.size(); i += 8) {
+        const std::uint64_t bytes = bytesOf(&bits[i]);
+        for (unsigned block = 0; block < remainders.size(); ++block) {
+            remainders[block] = remainders[block] << 8 ^
+                                generator.remainders[remainders[block] >> 24 ^ (bytes >> 8 * block & 0xffU)];
+        }
+    }
+    for (std::size_t power = 0; power < parity.size(); ++power) {
+        std::uint32_t together = 0;
+        for (unsigned block = 0; block < remainders.size(); ++block) {
+            together |= (remainders[block] >> (31 - power) & 1U) << block;
+        }
+        parity[power] = static_cast<std::uint8_t>(together);
     }
 }
 

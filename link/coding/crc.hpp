@@ -16,8 +16,8 @@ unsigned crcLength(Crc crc);
 /// The parity bits p_0 to p_(L-1) of some bits, as a number whose highest bit, of L, is p_0.
 std::uint32_t crcOf(Crc crc, std::span<const std::uint8_t> bits);
 
-/// The same as bits.
-/// @param parity  receives L bits
+/// The same as bits, for one block or for 8 blocks together: bit i of every byte belongs to block i.
+/// @param parity  receives L bits of the same form
 /// @throws std::invalid_argument when it is not of that size
 void writeCrc(Crc crc, std::span<const std::uint8_t> bits, std::span<std::uint8_t> parity);
 

@@ -17,4 +17,16 @@ inline void requireSize(const char* what, std::size_t size, std::size_t fitting)
     }
 }
 
+/// Refuse a number that is not a multiple of another one.
+/// @param what  is counted, in the plural
+/// @throws std::invalid_argument that names the multiples next to it
+inline void requireMultiple(const char* what, std::size_t number, std::size_t unit) {
+    if (number % unit != 0) {
+        const std::size_t below = number - number % unit;
+        throw std::invalid_argument(std::string(what) + " must be a multiple of " + std::to_string(unit) +
+                                    ", not " + std::to_string(number) + "; the nearest: " +
+                                    std::to_string(below) + ", " + std::to_string(below + unit));
+    }
+}
+
 }  // namespace quarzel::link

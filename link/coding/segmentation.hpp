@@ -37,8 +37,10 @@ struct Segmentation {
 Segmentation segmentationOf(std::size_t B);
 
 /// Cut bits into code blocks, each with a CRC24B when there are several.
-/// @param bits    B bits
-/// @param blocks  receives the blocks one after another, `totalSize` values: bits, and nullBit for filler
+/// @param bits    B bits, of one transport block or of 8 together: bit i of every byte belongs to block i
+/// @param blocks  receives the blocks one after another, `totalSize` values: bits of the same form, and
+/// nullBit for
+///                filler
 /// @throws std::invalid_argument when a size does not fit
 void segment(const Segmentation& segmentation, std::span<const std::uint8_t> bits,
              std::span<std::uint8_t> blocks);

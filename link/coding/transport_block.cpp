@@ -83,7 +83,6 @@ void TransportBlockCode::encode(std::span<const std::uint8_t> bits, const Transm
     }
 }
 
-/// The streams of all code blocks, with a new transmission in them.
 std::vector<std::int8_t> TransportBlockCode::combine(std::span<const std::int16_t> soft,
                                                      const Transmission& transmission,
                                                      SoftBuffers& buffers) const {
@@ -122,7 +121,10 @@ TransportDecisions TransportBlockCode::decode(std::span<const std::int16_t> soft
     };
     decodeGroup(itsSegmentation.Cminus, itsSegmentation.Kminus);
     decodeGroup(itsSegmentation.Cplus, itsSegmentation.Kplus);
+    return decide(decisions);
+}
 
+TransportDecisions TransportBlockCode::decide(std::span<const std::uint8_t> decisions) const {
     std::vector<std::uint8_t> bits(itsSegmentation.B);
     std::vector<bool> blocksOk = desegment(itsSegmentation, decisions, bits);
     const bool ok = crcHolds(transportCrc, bits);

@@ -63,6 +63,19 @@ class TransportBlockCode {
     void encode(std::span<const std::uint8_t> bits, const Transmission& transmission,
                 std::span<std::uint8_t> coded) const;
 
+    /// Add a transmission to the soft buffers.
+    /// @param soft     G values
+    /// @param buffers  receive the sums
+    /// @return         the three streams of each code block as a core takes them, block after block
+    /// @throws std::invalid_argument when a size does not fit or there is no such transmission
+    std::vector<std::int8_t> combine(std::span<const std::int16_t> soft, const Transmission& transmission,
+                                     SoftBuffers& buffers) const;
+
+    /// Make a transport block of what a core has decided.
+    /// @param decisions  on the bits of each code block, filler and CRC included, block after block
+    /// @throws std::invalid_argument when a size does not fit
+    TransportDecisions decide(std::span<const std::uint8_t> decisions) const;
+
     /// Add a transmission to the soft buffers and decode them.
     /// @param soft        G values
     /// @param iterations  of the core, for each code block
@@ -81,8 +94,6 @@ class TransportBlockCode {
     };
 
     const Kind& kindOf(std::size_t r) const { return itsKinds[itsKindOfBlock[r]]; }
-    std::vector<std::int8_t> combine(std::span<const std::int16_t> soft, const Transmission& transmission,
-                                     SoftBuffers& buffers) const;
 
     std::size_t itsSize;  ///< A
     Segmentation itsSegmentation;

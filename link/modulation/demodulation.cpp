@@ -8,6 +8,7 @@
 #include <stdexcept>
 #include <string>
 
+#include "link/choice.hpp"
 #include "link/coding/require.hpp"
 
 namespace quarzel::link {
@@ -136,6 +137,11 @@ void demodulateComponents(std::span<const std::complex<double>> symbols, Modulat
 }
 
 }  // namespace
+
+Demapping demappingOf(std::string_view name) {
+    constexpr std::array<std::string_view, 2> names = {"exact", "maxlog"};
+    return static_cast<Demapping>(placeOf(names, name, "method of demodulation"));
+}
 
 void demodulate(std::span<const std::complex<double>> symbols, Modulation modulation,
                 std::span<const double> noiseVariances, std::span<double> ratios, Demapping demapping) {

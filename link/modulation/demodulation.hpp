@@ -3,6 +3,7 @@
 
 #include <complex>
 #include <span>
+#include <string_view>
 
 #include "link/modulation/modulation.hpp"
 
@@ -12,6 +13,10 @@ namespace quarzel::link {
 /// How a log-likelihood ratio is computed: from all symbols, or from the nearest one for each value of the
 /// bit.
 enum class Demapping { exact, maxLog };
+
+/// The method of a name: maxlog or exact.
+/// @throws std::invalid_argument listing them when it is none of them
+Demapping demappingOf(std::string_view name);
 
 /// The log-likelihood ratios ln P(1) / P(0) of the bits of received symbols, which are equally likely and
 /// have passed a channel that adds complex Gaussian noise.

@@ -4,6 +4,7 @@
 #include <array>
 #include <cmath>
 
+#include "link/choice.hpp"
 #include "link/coding/require.hpp"
 
 namespace quarzel::link {
@@ -17,7 +18,15 @@ constexpr std::array<std::int8_t, 8> amplitudes8 = {3, 1, 5, 7, -3, -1, -5, -7};
 constexpr std::array<std::int8_t, 16> amplitudes16 = {5,  7,  3,  1,  11,  9,  13,  15,
                                                       -5, -7, -3, -1, -11, -9, -13, -15};
 
+constexpr std::array<std::string_view, 5> names = {"bpsk", "qpsk", "16qam", "64qam", "256qam"};
+constexpr std::array<Modulation, 5> schemes = {Modulation::bpsk, Modulation::qpsk, Modulation::qam16,
+                                               Modulation::qam64, Modulation::qam256};
+
 }  // namespace
+
+Modulation modulationOf(std::string_view name) {
+    return schemes.at(placeOf(names, name, "modulation"));
+}
 
 std::span<const std::int8_t> amplitudes(Modulation modulation) {
     switch (modulation) {

@@ -5,6 +5,7 @@
 #include <cstddef>
 #include <cstdint>
 #include <span>
+#include <string_view>
 
 /// Modulation of 3GPP TS 36.211, section 7.1. Bits are bytes of 0 or 1. All functions are pure, but for what
 /// they write.
@@ -17,6 +18,10 @@ enum class Modulation : unsigned { bpsk = 1, qpsk = 2, qam16 = 4, qam64 = 6, qam
 constexpr unsigned bitsOfSymbol(Modulation modulation) {
     return static_cast<unsigned>(modulation);
 }
+
+/// The scheme of a name: bpsk, qpsk, 16qam, 64qam or 256qam.
+/// @throws std::invalid_argument listing them when it is none of them
+Modulation modulationOf(std::string_view name);
 
 /// The amplitudes that a component of a symbol, I or Q, may have, in units of `amplitudeUnit`: entry i for
 /// the bits of i that decide it, the first one highest. BPSK has one component, on the diagonal.

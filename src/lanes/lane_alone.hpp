@@ -1,9 +1,7 @@
 // SPDX-License-Identifier: MIT
 #pragma once
 
-#include <algorithm>
 #include <cassert>
-#include <type_traits>
 
 #include "lanes/lane_boundaries.hpp"
 #include "lanes/lane_rules.hpp"
@@ -15,12 +13,6 @@
 // is why it does not share the text of a step, only the table of the trellis and the rules of the maximum.
 namespace quarzel::lanes {
 namespace {
-
-/// Whether the plain maximum may compare paths over these metrics.
-inline bool statesWithinBounds(Lanes<8> m) {
-    const auto [least, most] = std::minmax({m.v[0], m.v[1], m.v[2], m.v[3], m.v[4], m.v[5], m.v[6], m.v[7]});
-    return least >= most - maxSpread && most >= 0 && most <= maxMetric;
-}
 
 /// Decodes one block of one segment. Rows of its group are single words.
 template <int Algorithm>
@@ -100,14 +92,13 @@ class BlockDecoder {
                 forward<Code, 8>(stored[t / stepsAtOnce], bottom + t, alpha, firstIteration);
             }
             Word beta = Word::load(starts + w * states);
-            const bool half = t < length;
-            if (half) {
+            if (t < length) {
                 forward<Code, 4>(stored[t / stepsAtOnce], bottom + t, alpha, firstIteration);
                 backward<Code, 4>(stored[t / stepsAtOnce], bottom + t, beta, bits, MaxLog<Word>());
             }
             while (t > 0) {
-                // Where the spread of the metrics is not bounded yet.
-                const bool nearStart = (t == length && !half) || (t == stepsAtOnce && w == 0);
+                // Where a path may leave 16 bits.
+                const bool nearStart = t == length;
                 t -= stepsAtOnce;
                 if (nearStart) {
                     backward<Code, 8>(stored[t / stepsAtOnce], bottom + t, beta, bits, MaxLog<Word>());
@@ -147,9 +138,6 @@ class BlockDecoder {
         Squares<8> minus{};
         unrolled<Count>([&](auto number) {
             constexpr std::size_t i = Count - 1 - number;
-            if constexpr (std::is_same_v<LlrRule, PlainMaxLog<Word>>) {
-                assert(statesWithinBounds(beta) && statesWithinBounds(stored.alpha[i]));
-            }
             const Word metric = shuffled(stored.metrics[i / 4], trellisShuffles.leaving[i % 4]);
             const Word plusEnd = add(shuffled(beta, trellisShuffles.plusTarget), metric);
             const Word minusEnd = sub(shuffled(beta, trellisShuffles.minusTarget), metric);
@@ -158,7 +146,11 @@ class BlockDecoder {
             beta = max(plusEnd, minusEnd);
         });
         normalise(beta);
-        const Word llr = sub(bestOfEight(plus, llrRule), bestOfEight(minus, llrRule));
+        const auto ratio = [&](const auto& rule) {
+            return sub(bestOfEight(plus, rule), bestOfEight(minus, rule));
+        };
+        const Word llr = ratio(llrRule);
+        assert(same(llr, ratio(MaxLog<Word>())));
         // Of four steps, more is stored than there is: the next window covers it, or nobody reads it.
         const Word extrinsic = halfExtrinsic<Rules>(llr, stored.channel);
         if constexpr (Code == 1) {

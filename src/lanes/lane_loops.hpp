@@ -5,7 +5,6 @@
 // includes it and names the widths.
 
 #include <cassert>
-#include <type_traits>
 #include <utility>
 
 #include "engine/steps.hpp"
@@ -17,23 +16,10 @@
 namespace quarzel::lanes {
 namespace {
 
-/// Rows after which the metrics are normalised, and rows after a start for which their spread is not bounded.
+/// Rows after which the metrics are normalised, and rows after a backward start in which a path of the ratio
+/// may leave 16 bits: a tail's metrics lie that far apart.
 constexpr std::size_t normalisedRows = 8;
-constexpr std::size_t unboundedRows = 3;
-
-/// Whether the plain maximum may compare paths over these metrics.
-template <std::size_t W>
-inline bool withinBounds(const Metrics<W>& m) {
-    const Lanes<W> top = largest<W>(m);
-    Lanes<W> bottom = m[0];
-    unrolled<states>([&](auto state) { bottom = min(bottom, m[state]); });
-    for (std::size_t lane = 0; lane < W; ++lane) {
-        if (top.v[lane] < 0 || top.v[lane] > maxMetric || top.v[lane] - bottom.v[lane] > maxSpread) {
-            return false;
-        }
-    }
-    return true;
-}
+constexpr std::size_t unboundedRows = 1;
 
 /// Decodes one group at one width. `AcrossSlices` tells whether a vector holds slices of one bundle rather
 /// than one slice of several bundles.
@@ -55,9 +41,6 @@ class GroupDecoder {
     /// Vectors that a step keeps: the forward metrics before it, twice the intrinsic value, branch metrics.
     static constexpr std::size_t stepVectors = states + 1 + (keepsBranchMetrics ? 2 : 0);
     static_assert(stepVectors <= maxStepVectors);
-
-    template <class Rule>
-    static constexpr bool plainMaximum = std::is_same_v<std::decay_t<Rule>, PlainMaxLog<Word>>;
 
   public:
     explicit GroupDecoder(const LaneGroup& group)
@@ -137,10 +120,6 @@ class GroupDecoder {
         const auto step = [&](std::size_t t, const auto& llrRule) {
             const std::size_t row = window.bottom + t;
             const std::int16_t* const stored = here.itsGroup.stepRows + t * stepVectors * W;
-            if constexpr (plainMaximum<decltype(llrRule)>) {
-                assert(withinBounds<W>(words(state)));
-                assert(withinBounds<W>(loadMetrics<W>(stored, W)));
-            }
             const Word channel = Word::load(stored + states * W);
             BranchMetrics<Word> metrics;
             if constexpr (keepsBranchMetrics) {
@@ -152,10 +131,10 @@ class GroupDecoder {
             }
             const auto alpha = [stored](std::size_t i) { return Word::load(stored + i * W); };
             const auto result = backwardStep(state, metrics, alpha, rule, llrRule);
+            assert(same(result.llr, backwardStep(state, metrics, alpha, rule, Rules::llrNearStart()).llr));
             assign(state, result.beta);
             here.output<Code>(row, column, result.llr, channel, lastPass);
         };
-        const std::size_t floor = window.first ? unboundedRows : 0;
         std::size_t t = window.length;
         for (std::size_t i = 0; i < normalisedRows; ++i) {
             --t;
@@ -166,17 +145,14 @@ class GroupDecoder {
             }
         }
         normalise(state);
-        while (t >= floor + normalisedRows) {
+        while (t >= normalisedRows) {
             for (std::size_t i = 0; i < normalisedRows; ++i) {
                 step(--t, Rules::llr());
             }
             normalise(state);
         }
-        while (t > floor) {
-            step(--t, Rules::llr());
-        }
         while (t > 0) {
-            step(--t, Rules::llrNearStart());
+            step(--t, Rules::llr());
         }
         here.storeBoundary(state, end);
     }

@@ -11,11 +11,6 @@ namespace {
 constexpr std::int16_t lowest = -2048;
 constexpr std::int16_t highest = 2032;
 
-/// Bounds that docs/lanes.md derives: of the spread of the metrics once that many rows have passed, and of
-/// the largest metric where ratios use it.
-constexpr std::int16_t maxSpread = 12288;
-constexpr std::int16_t maxMetric = 127 + 7 * 2048;
-
 /// Max-log with the plain maximum, for metrics that are kept from wrapping.
 template <class WordType>
 struct PlainMaxLog : MaxLog<WordType> {
@@ -70,9 +65,9 @@ struct LaneRules {
     static constexpr bool normalised = true;  ///< metrics are kept from wrapping
     static constexpr bool scaled = Algorithm == 1;
     static Recursion recursion() { return {}; }
-    /// Where the spread of the metrics is bounded ...
+    /// Where the paths of a ratio stay inside 16 bits ...
     static PlainMaxLog<Word> llr() { return {}; }
-    /// ... and where it is not yet.
+    /// ... and where they may leave them.
     static MaxLog<Word> llrNearStart() { return {}; }
 };
 

@@ -89,6 +89,12 @@ inline Lanes<W> min(Lanes<W> x, Lanes<W> y) {
     return {x.v < y.v ? x.v : y.v};
 }
 
+/// Whether all lanes are equal.
+template <std::size_t W>
+inline bool same(Lanes<W> x, Lanes<W> y) {
+    return std::memcmp(&x.v, &y.v, sizeof x.v) == 0;
+}
+
 /// What x lacks of a limit, 0 where it lacks nothing; neither is negative. Machines have it as one operation
 /// on unsigned words, which GCC does not find by itself.
 template <std::size_t W>

@@ -53,9 +53,13 @@ int main(void) {
     vardel_ip_quarzel_outputs out;
     vardel_ip_quarzel_inputs in = {soft, soft, soft, 44, 3, 0x1FF};
     vardel_ip_quarzel_state* state;
+    const float ratio = -0.625F;
+    int8_t quantised = 0;
     int i;
 
     expect_layout();
+    EXPECT(vardel_ip_quarzel_bitacc_quantise_float(&ratio, 1, VARDEL_IP_QUARZEL_LLR_SCALE, &quantised) == 0);
+    EXPECT(quantised == -2);
     for (i = 0; i < 44; ++i) {
         soft[i] = -8;
     }

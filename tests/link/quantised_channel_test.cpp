@@ -10,13 +10,14 @@
 #include <random>
 #include <vector>
 
+#include "link/soft_counts.hpp"
 #include "support/random.hpp"
 
 namespace {
 
 using namespace quarzel::link;
-
-using Counts = std::array<double, 256>;  ///< of the soft values -128 to 127
+using quarzel::test::Counts;
+using quarzel::test::deviation;
 
 struct Channel {
     Quantiser quantiser;
@@ -45,38 +46,10 @@ Counts drawn(const Channel& channel, bool codeBit, std::uint64_t seed, std::size
         quantised.transmit(RandomSource({seed, K, channel.ebN0, block}), bits.data(), 0, codeBits,
                            soft.data());
         for (const std::int8_t value : soft) {
-            counts.at(static_cast<std::size_t>(value + 128)) += 1;
+            counts.at(quarzel::test::placeOf(value)) += 1;
         }
     }
     return counts;
-}
-
-/// How far two sets of counts, or counts and expectations, are apart: chi-square, normalised to a mean of 0
-/// and a deviation of 1 (Wilson and Hilferty). Values that are expected less than 20 times are taken
-/// together.
-double deviation(const Counts& observed, const Counts& expected, double varianceOfDifference) {
-    double chiSquare = 0;
-    double cells = 0;
-    double restObserved = 0;
-    double restExpected = 0;
-    const auto add = [&](double o, double e) {
-        chiSquare += (o - e) * (o - e) / (e * varianceOfDifference);
-        cells += 1;
-    };
-    for (std::size_t i = 0; i < observed.size(); ++i) {
-        restObserved += observed[i];
-        restExpected += expected[i];
-        if (restExpected >= 20) {
-            add(restObserved, restExpected);
-            restObserved = restExpected = 0;
-        }
-    }
-    if (restExpected >= 1) {
-        add(restObserved, restExpected);
-    }
-    const double freedom = std::max(cells - 1, 1.0);
-    const double spread = 2 / (9 * freedom);
-    return (std::cbrt(chiSquare / freedom) - (1 - spread)) / std::sqrt(spread);
 }
 
 TEST(QuantisedChannel, DrawsTheExactDistribution) {

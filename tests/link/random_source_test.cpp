@@ -64,7 +64,7 @@ TEST(DrawFunctions, GiveTheNumbersOfTheLibraryForEveryCounter) {
 }
 
 TEST(RandomSource, GivesOtherNumbersForEveryPartOfTheName) {
-    std::vector<BlockName> names(8, name);
+    std::vector<BlockName> names(14, name);
     names[1].seed ^= 1;
     names[2].seed ^= std::uint64_t{1} << 40;
     names[3].blockSize = 1088;
@@ -72,14 +72,33 @@ TEST(RandomSource, GivesOtherNumbersForEveryPartOfTheName) {
     names[5].ebN0.micro = -names[5].ebN0.micro;
     names[6].block += 1;
     names[7].block += std::uint64_t{1} << 32;
+    names[8].transmission = 31;
+    names[9].repetition = 1;
+    names[10].transportBlock = (1U << 19U) - 1;
+    names[11].transportBlock = 1024;
+    names[12] = names[11];
+    names[12].codeBlock = 1;
+    names[13] = names[12];
+    names[13].codeBlock = 1023;
     std::set<std::uint32_t> seen;
     for (const BlockName& block : names) {
-        for (const Purpose purpose : {Purpose::informationBits, Purpose::noise, Purpose::refinement}) {
+        for (const Purpose purpose : {Purpose::informationBits, Purpose::noise, Purpose::refinement,
+                                      Purpose::fading, Purpose::fadingRefinement}) {
             const std::vector<std::uint32_t> words = wordsOf(block, purpose);
             seen.insert(words.begin(), words.begin() + 4);
         }
     }
-    EXPECT_EQ(seen.size(), 8U * 3 * 4);
+    EXPECT_EQ(seen.size(), names.size() * 5 * 4);
+}
+
+TEST(RandomSource, GivesTheCodeBlocksOfATransmissionSomethingInCommon) {
+    BlockName block = name;
+    block.transportBlock = 20000;
+    block.codeBlock = 2;
+    std::vector<std::uint32_t> common(wordsPerGroup);
+    RandomSource(block).ofTransmission().words(Purpose::fading, 0, 1, common.data());
+    block.codeBlock = 0;
+    EXPECT_EQ(common, wordsOf(block, Purpose::fading));
 }
 
 TEST(RandomSource, GivesAGroupWhereverTheCallerBegins) {

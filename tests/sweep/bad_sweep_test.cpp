@@ -30,7 +30,9 @@ const std::vector<BadSweep> badSweeps = {
      {"--ebn0", "1", "--block-size", "40,41"},
      "--block-size: 41 is not a block size of LTE; the nearest: 40, 48"},
     {"ThreeUnits", {"--ebn0", "1", "--units", "2,3"}, "--units: '3' is not 2, 4 or 8" + seeSweep},
-    {"Algorithm3", {"--ebn0", "1", "--algorithm", "3"}, "--algorithm: '3' is not 0, 1 or 2" + seeSweep},
+    {"Algorithm3",
+     {"--ebn0", "1", "--algorithm", "3"},
+     "--algorithm: '3' is not 0, 1, 2, max-log, scaled-max-log, max-star" + seeSweep},
     {"NoIteration",
      {"--ebn0", "1", "--iterations", "0"},
      "--iterations: '0' is not a number from 1 to 15" + seeSweep},
@@ -48,7 +50,9 @@ const std::vector<BadSweep> badSweeps = {
     {"NoScale",
      {"--ebn0", "1", "--scale", "0"},
      "--scale: '0' is not a number above 0 and up to 1000000" + seeSweep},
-    {"TwoQuantisers", {"--ebn0", "1", "--scale", "1", "--llr", "1"}, "--scale excludes --llr" + seeSweep},
+    {"ScaleIsNoNumber",
+     {"--ebn0", "1", "--llr", "4,x"},
+     "--llr: 'x' is not a number above 0 and up to 1000000" + seeSweep},
     {"TwoForms", {"--ebn0", "1", "--json", "--csv"}, "--json excludes --csv" + seeSweep},
     {"ShardBeyondLast",
      {"--ebn0", "1", "--shard", "3/2", "-o", "x"},
@@ -59,6 +63,12 @@ const std::vector<BadSweep> badSweeps = {
     {"ShardWithTime",
      {"--ebn0", "1", "--shard", "1/2", "-o", "x", "--max-time", "3"},
      "--max-time: parts that end by time cannot be joined; leave out --max-time or --shard"},
+    {"ShardWithTarget",
+     {"--ebn0", "1", "--shard", "1/2", "-o", "x", "--target-bler", "0.1"},
+     "--target-bler: parts do not know where the curves of others end; leave out --target-bler or --shard"},
+    {"TargetIsNoRate",
+     {"--ebn0", "1", "--target-bler", "2"},
+     "--target-bler: '2' is not a number from 0 to 1" + seeSweep},
     {"ResumeWithoutFile",
      {"--ebn0", "1", "--resume"},
      "--resume: there is no file to go on from; name the output with -o, or the checkpoint with "
@@ -105,9 +115,18 @@ TEST(BadSweep, LeavesACheckpointAloneUnlessToldToGoOn) {
     const ToolRun resumed =
         runTool({"sweep", "--ebn0", "9", "-o", directory.path("result.json"), "--resume"});
     EXPECT_EQ(resumed.err,
-              "quarzel: error: " + checkpoint + ": is not a quarzel sweep part; give the name of one\n");
+              "quarzel: error: " + checkpoint + ": is not a quarzel sweep result; give the name of one\n");
     EXPECT_EQ(resumed.exitCode, 3);
     EXPECT_EQ(readFile(checkpoint), "precious");
+}
+
+TEST(BadSweep, LeavesAFileAloneThatIsNoResult) {
+    const TemporaryDirectory directory;
+    const std::string file = directory.write("result.json", "precious");
+    const ToolRun run = runTool({"sweep", "--ebn0", "9", "-o", file});
+    EXPECT_EQ(run.err, "quarzel: error: " + file + ": is not a quarzel sweep result; give the name of one\n");
+    EXPECT_EQ(run.exitCode, 3);
+    EXPECT_EQ(readFile(file), "precious");
 }
 
 }  // namespace quarzel::test

@@ -36,12 +36,12 @@ TEST(ErrorRates, LieNearIndependentFigures) {
         sweep::Configuration configuration;
         configuration.algorithms = {figure.algorithm};
         configuration.iterations = {8};
-        configuration.quantiser = {link::Quantiser::Kind::llr, 4};  // 4 L = 8 y / sigma^2
+        configuration.quantisers = {{link::Quantiser::Kind::llr, 4}};  // 4 L = 8 y / sigma^2
         configuration.ebN0 = {figure.ebN0};
-        configuration.maxBlocks = 320;
-        configuration.maxBlockErrors = 0;
+        configuration.stopRule.maxBlocks = 320;
+        configuration.stopRule.maxBlockErrors = 0;
         configuration.seed = seed;
-        const sweep::PointState point = resultOf(configuration).points[0];
+        const sweep::PointState point = resultOf(configuration).points.begin()->second;
         const auto blocks = static_cast<double>(point.blocks);
         const double bler = static_cast<double>(point.last().blockErrors) / blocks;
         const double deviation = std::sqrt(figure.bler * (1 - figure.bler) * (1 / blocks + 1 / figureBlocks));

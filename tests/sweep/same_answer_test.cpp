@@ -59,24 +59,35 @@ std::vector<std::string> with(std::vector<std::string> arguments, const std::vec
 }  // namespace
 
 // The stored results pin bits, noise, channel, core and the form of the file, on every machine and in every
-// version: what alters them alters every result that users have kept.
+// version: what alters them alters every result that users have kept. These two are in version 1 of the
+// format.
 TEST(SameAnswer, IsTheStoredOne) {
-    const std::string stored = readFile(QUARZEL_SWEEP_DATA "/small_sweep.json");
+    const sweep::Result stored = sweep::readResult(readFile(QUARZEL_SWEEP_DATA "/small_sweep.json"));
     sweep::Configuration configuration = smallSweep();
     configuration.perIteration = true;
-    configuration.quantiser = {link::Quantiser::Kind::llr, 8};
+    configuration.quantisers = {{link::Quantiser::Kind::llr, 8}};
     sweep::Result result = resultOf(configuration);
     result.quarzel = "1.0.0";
-    EXPECT_EQ(sweep::resultText(result), stored);
+    EXPECT_EQ(sweep::resultText(result), sweep::resultText(stored));
 }
 
 // All units and algorithms, a size of many windows, amplitudes, and the greatest seed.
 TEST(SameAnswer, IsTheStoredOneForEveryCore) {
-    const std::string stored = readFile(QUARZEL_SWEEP_DATA "/every_core.json");
-    sweep::Result result = resultOf(sweep::readResult(stored).configuration);
-    result.quarzel = "1.0.0";
-    ASSERT_EQ(result.points.size(), 36U);
-    EXPECT_EQ(sweep::resultText(result), stored);
+    const sweep::Result stored = sweep::readResult(readFile(QUARZEL_SWEEP_DATA "/every_core.json"));
+    ASSERT_EQ(stored.points.size(), 36U);
+    EXPECT_EQ(sweep::resultText(repeated(stored)), sweep::resultText(stored));
+}
+
+// Version 2 of the format.
+TEST(SameAnswer, IsTheStoredOneForSeveralQuantisers) {
+    sweep::Configuration configuration = smallSweep();
+    configuration.blockSizes = {40};
+    configuration.quantisers = {{link::Quantiser::Kind::llr, 2},
+                                {link::Quantiser::Kind::amplitude, 12.5},
+                                {link::Quantiser::Kind::llr, 0.5}};
+    sweep::Result result = resultOf(configuration);
+    result.quarzel = "1.1.0";
+    EXPECT_EQ(sweep::resultText(result), readFile(QUARZEL_SWEEP_DATA "/quantisers.json"));
 }
 
 TEST(SameAnswer, ComesFromAnyNumberOfThreads) {
@@ -87,16 +98,16 @@ TEST(SameAnswer, ComesFromAnyNumberOfThreads) {
 }
 
 TEST(SameAnswer, ComesFromAnyNumberOfShards) {
-    for (const bool perIteration : {false, true}) {
-        sweep::Configuration configuration = smallSweep();
-        configuration.perIteration = perIteration;
-        const std::string expected = sweep::resultText(resultOf(configuration));
-        for (const std::uint64_t shards : {2U, 9U}) {
-            std::vector<sweep::NamedPart> parts;
-            for (std::uint64_t index = shards; index-- > 0;) {
-                parts.push_back(partOf(configuration, {index, shards}));
+    for (const std::uint64_t maxBlockErrors : {50U, 0U}) {
+        for (const bool perIteration : {false, true}) {
+            sweep::Configuration configuration = smallSweep();
+            configuration.stopRule.maxBlockErrors = maxBlockErrors;
+            configuration.perIteration = perIteration;
+            const std::string expected = sweep::resultText(resultOf(configuration));
+            for (const std::uint64_t shards : {2U, 45U}) {  // sometimes more than there are points or octets
+                EXPECT_EQ(sweep::resultText(sweep::merge(partsOf(configuration, shards))), expected)
+                    << shards;
             }
-            EXPECT_EQ(sweep::resultText(sweep::merge(parts)), expected) << shards;
         }
     }
 }
@@ -107,26 +118,27 @@ TEST(SameAnswer, ComesOutForFewerPointsAndForThemAlone) {
     one.blockSizes = {104};
     one.algorithms = {2};
     one.ebN0 = {{1'500'000}};
-    const sweep::PointState alone = resultOf(one).points[0];
-    const sweep::PointState& among = all.points[10];
+    const sweep::Result result = resultOf(one);
+    const auto& [setup, alone] = *result.points.begin();
+    const sweep::PointState& among = all.points.at(setup);
     EXPECT_EQ(alone.blocks, among.blocks);
-    EXPECT_EQ(alone.last().bitErrors, among.last().bitErrors);
+    EXPECT_EQ(alone.last(), among.last());
 }
 
 TEST(SameAnswer, ComesOutAfterAnyNumberOfInterruptions) {
     sweep::Configuration configuration = smallSweep();
     configuration.blockSizes = {1024};
-    configuration.maxBlocks = 150;
+    configuration.stopRule.maxBlocks = 150;
     const std::string expected = sweep::resultText(resultOf(configuration));
-    sweep::Plan plan{configuration, {}, {}, {}};
+    sweep::Points known;
     for (bool isFinished = false; !isFinished;) {
-        sweep::Dispatcher dispatcher(plan);
+        sweep::Dispatcher dispatcher(sweep::planOf(configuration, {}, known));
         Impatience impatience(0);
         sweep::ThreadWorkers(2).run(dispatcher, impatience);
         isFinished = dispatcher.hasFinished();
-        plan.start = sweep::readPart(sweep::partText({configuration, {}, dispatcher.states()})).points;
+        known = sweep::readResult(sweep::resultText({7, dispatcher.points(), {}})).points;
     }
-    EXPECT_EQ(sweep::resultText({configuration, plan.start}), expected);
+    EXPECT_EQ(sweep::resultText({7, known, {}}), expected);
 }
 
 // Each kill comes at a random time within half of that of a whole run, which it goes on from what the runs

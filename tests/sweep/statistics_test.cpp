@@ -56,4 +56,23 @@ TEST(Rates, TakeTheSpreadOfBitErrorsFromTheBlocks) {
     EXPECT_DOUBLE_EQ(rates.berInterval.high, (2 + 1.959963984540054 * std::sqrt(6.0 / 4)) / 40);
 }
 
+// The same blocks: q = 1.96^2 * 6 * 4 / 8^2 solves (2 - p)^2 = 1.96^2 * (6 / 2) * p / 4.
+TEST(BerScoreInterval, HoldsTheRatesFromWhichTheMeasuredOneIsNotTooFar) {
+    const sweep::Interval interval = sweep::berScoreInterval(pointOf(4, {3, 5}), 40);
+    for (const double p : {interval.low * 40, interval.high * 40}) {
+        const double z = 1.959963984540054;
+        EXPECT_NEAR((2 - p) * (2 - p), z * z * (6.0 / 2) * p / 4, 1e-9);
+    }
+    EXPECT_GT(interval.low, 0);
+    EXPECT_LT(interval.low, 0.05);
+    EXPECT_GT(interval.high, 0.05);
+}
+
+TEST(BerScoreInterval, IsThatOfTheRatesWhereNoErrorWasSeen) {
+    const sweep::PointState silent = pointOf(1000, {});
+    EXPECT_EQ(sweep::berScoreInterval(silent, 40).low, 0);
+    EXPECT_EQ(sweep::berScoreInterval(silent, 40).high, sweep::ratesOf(silent, 40).berInterval.high);
+    EXPECT_EQ(sweep::berScoreInterval(pointOf(3, {40, 40, 40}), 40).high, 1);
+}
+
 }  // namespace quarzel::test

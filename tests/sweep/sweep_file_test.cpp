@@ -1,4 +1,5 @@
 // SPDX-License-Identifier: MIT
+#include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
 #include <functional>
@@ -29,23 +30,41 @@ const std::string& smallResultText() {
 }  // namespace
 
 TEST(SweepFile, KeepsAResult) {
-    const sweep::Result result = sweep::readResult(smallResultText());
-    EXPECT_EQ(result.configuration, smallSweep());
-    ASSERT_EQ(result.points.size(), 12U);
-    const sweep::Result original = resultOf(smallSweep());
-    for (std::size_t i = 0; i < result.points.size(); ++i) {
-        EXPECT_EQ(result.points[i].blocks, original.points[i].blocks);
-        EXPECT_EQ(result.points[i].last().bitErrors, original.points[i].last().bitErrors);
-        EXPECT_EQ(result.points[i].stoppedBy, original.points[i].stoppedBy);
+    sweep::Configuration configuration = smallSweep();
+    configuration.quantisers.push_back({link::Quantiser::Kind::amplitude, 0.1});
+    for (const bool perIteration : {false, true}) {
+        configuration.perIteration = perIteration;
+        const sweep::Result original = resultOf(configuration);
+        const sweep::Result result = sweep::readResult(sweep::resultText(original));
+        EXPECT_EQ(result.seed, 7U);
+        ASSERT_EQ(result.points.size(), 24U);
+        for (const auto& [setup, point] : result.points) {
+            const sweep::PointState& expected = original.points.at(setup);
+            EXPECT_EQ(point.blocks, expected.blocks);
+            EXPECT_EQ(point.counts, expected.counts);
+            EXPECT_EQ(point.bitErrorSquares, expected.bitErrorSquares);
+            EXPECT_EQ(point.stoppedBy, expected.stoppedBy);
+        }
     }
 }
 
 TEST(SweepFile, KeepsAPart) {
     sweep::Configuration configuration = smallSweep();
     configuration.perIteration = true;
-    const sweep::Part part = partOf(configuration, {1, 3}).part;
-    const std::string text = sweep::partText(part);
-    EXPECT_EQ(sweep::partText(sweep::readPart(text)), text);
+    const std::string text = sweep::resultText(partResult(configuration, {1, 3}).result);
+    EXPECT_EQ(sweep::resultText(sweep::readResultOrPart(text)), text);
+    EXPECT_EQ(complaintOf([&] { sweep::readResult(text); }),
+              "is a part of a sweep; join all its parts with 'quarzel merge'");
+}
+
+TEST(SweepFile, KeepsAPointThatHasNotEnded) {
+    sweep::PointState point;
+    point.blocks = 16;
+    point.seconds = 0.25;
+    const std::string text = sweep::resultText({1, {{sweep::Setup{}, point}}, {}});
+    const sweep::PointState kept = sweep::readResult(text).points.at({});
+    EXPECT_EQ(kept.stoppedBy, std::nullopt);
+    EXPECT_EQ(kept.seconds, 0.25);
 }
 
 // The version of quarzel stands in a file for people; the version of the format decides.
@@ -60,18 +79,9 @@ TEST(SweepFile, IsReadWhicheverVersionOfQuarzelWroteIt) {
     }
 }
 
-// The stored parts come from version 1.0.0. Their result names the version that joined them.
-TEST(SweepFile, OfAPartIsReadWhicheverVersionOfQuarzelWroteIt) {
-    std::vector<sweep::NamedPart> parts;
-    for (const char* const file : {"/part_1_of_2.json", "/part_2_of_2.json"}) {
-        const std::string text = readFile(std::string(QUARZEL_SWEEP_DATA) + file);
-        EXPECT_NE(text.find(R"("quarzel":"1.0.0")"), std::string::npos);
-        parts.push_back({file, sweep::readPart(text)});
-    }
-    ASSERT_STRNE(VARDEL_IP_QUARZEL_VERSION, "1.0.0");
-    const sweep::Result merged = sweep::merge(parts);
-    EXPECT_EQ(sweep::resultText(merged), sweep::resultText(resultOf(merged.configuration)));
-    EXPECT_EQ(merged.quarzel, VARDEL_IP_QUARZEL_VERSION);
+TEST(SweepFile, OfAPartInVersion1IsRefused) {
+    EXPECT_EQ(complaintOf([] { sweep::readResultOrPart(readFile(QUARZEL_SWEEP_DATA "/part_1_of_2.json")); }),
+              "has version 1 of its format, which this quarzel does not read; use the quarzel that wrote it");
 }
 
 TEST(SweepFile, IsRefusedWhereverItIsCut) {
@@ -107,29 +117,30 @@ TEST(SweepFile, IsRefusedWithItsReason) {
     };
     EXPECT_EQ(altered("\"seed\": 7", "\"seed\": 8"),
               "has been altered: its checksum does not match; use another copy of it");
-    EXPECT_EQ(altered("\"version\": 1", "\"version\": 2"),
-              "has version 2 of its format, not 1; use the quarzel that wrote it");
-    EXPECT_EQ(altered("quarzel sweep result", "quarzel sweep part"),
+    for (const std::string version : {"0", "3", "null", "2.5"}) {
+        EXPECT_EQ(altered("\"version\": 2", "\"version\": " + version),
+                  "has version " + version +
+                      " of its format, which this quarzel does not read; use the quarzel that wrote it");
+    }
+    EXPECT_EQ(altered("quarzel sweep result", "quarzel sweep"),
               "is not a quarzel sweep result; give the name of one");
     EXPECT_EQ(complaintOf([] { sweep::readResult("[1]"); }),
               "is not a quarzel sweep result; give the name of one");
-    EXPECT_EQ(complaintOf([] { sweep::readPart(smallResultText()); }),
-              "is not a quarzel sweep part; give the name of one");
+    EXPECT_EQ(complaintOf([] { sweep::readResultOrPart("quarzel"); }),
+              "is not a quarzel sweep result; give the name of one");
 }
 
-TEST(SweepFile, OfAnotherRunIsRefusedWithTheFirstDifference) {
-    const sweep::Part part = sweep::freshPart(smallSweep(), {});
-    sweep::Configuration other = smallSweep();
-    other.ebN0.pop_back();
-    EXPECT_EQ(
-        complaintOf([&] { sweep::requireSameRun(part, other, {}); }),
-        "belongs to another sweep: it has ebn0_db [0.0,1.5,3.0] instead of [0.0,1.5]; give the same options "
-        "as before, or remove it to begin anew");
-    EXPECT_EQ(complaintOf([&] {
-                  sweep::requireSameRun(part, smallSweep(), {1, 4});
-              }),
-              "belongs to shard 1/1; give the same options as before, or remove it to begin anew");
-    EXPECT_EQ(complaintOf([&] { sweep::requireSameRun(part, smallSweep(), {}); }), "none");
+TEST(SweepFile, IsRefusedWhenItHoldsWhatIsNotPossible) {
+    const auto complaintWith = [](const sweep::Setup& setup, const sweep::PointState& point) {
+        const std::string text = sweep::resultText({1, {{setup, point}}, {}});
+        return complaintOf([&text] { sweep::readResult(text); });
+    };
+    sweep::Setup setup;
+    setup.blockSize = 41;
+    EXPECT_THAT(complaintWith(setup, sweep::PointState()),
+                testing::StartsWith("is not understood: block size 41 is not possible"));
+    EXPECT_EQ(complaintWith({}, sweep::PointState(3)),
+              "is not understood: a point does not have a count for each iteration; use another copy of it");
 }
 
 }  // namespace quarzel::test

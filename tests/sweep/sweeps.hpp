@@ -1,10 +1,11 @@
 // SPDX-License-Identifier: MIT
 #pragma once
 
+#include <iterator>
 #include <string>
 #include <vector>
 
-#include "sweep/part.hpp"
+#include "sweep/merge.hpp"
 #include "sweep/run.hpp"
 
 namespace quarzel::test {
@@ -17,8 +18,8 @@ inline sweep::Configuration smallSweep() {
     configuration.algorithms = {0, 2};
     configuration.iterations = {3};
     configuration.ebN0 = {{0}, {1'500'000}, {3'000'000}};
-    configuration.maxBlocks = 301;
-    configuration.maxBlockErrors = 50;
+    configuration.stopRule.maxBlocks = 301;
+    configuration.stopRule.maxBlockErrors = 50;
     configuration.seed = 7;
     return configuration;
 }
@@ -28,16 +29,40 @@ inline void run(sweep::Dispatcher& dispatcher, unsigned threads) {
     sweep::ThreadWorkers(threads).run(dispatcher, none);
 }
 
-inline sweep::Result resultOf(const sweep::Configuration& configuration, unsigned threads = 1) {
-    sweep::Dispatcher dispatcher({configuration});
+inline sweep::Result resultOf(const sweep::Configuration& configuration, unsigned threads = 1,
+                              const sweep::Points& known = {}) {
+    sweep::Dispatcher dispatcher(sweep::planOf(configuration, {}, known));
     run(dispatcher, threads);
-    return {configuration, dispatcher.states()};
+    return {configuration.seed, dispatcher.points(), {}};
 }
 
-inline sweep::NamedPart partOf(const sweep::Configuration& configuration, const sweep::Shard& shard) {
-    sweep::Dispatcher dispatcher({configuration, shard});
+inline sweep::NamedResult partResult(const sweep::Configuration& configuration, const sweep::Shard& shard) {
+    sweep::Dispatcher dispatcher(sweep::planOf(configuration, shard));
     run(dispatcher, 1);
-    return {"part " + std::to_string(shard.index + 1), {configuration, shard, dispatcher.states()}};
+    return {"part " + std::to_string(shard.index + 1),
+            {configuration.seed, dispatcher.points(), sweep::partOf(configuration, shard)}};
+}
+
+inline std::vector<sweep::NamedResult> partsOf(const sweep::Configuration& configuration,
+                                               std::uint64_t count) {
+    std::vector<sweep::NamedResult> parts;
+    for (std::uint64_t index = count; index-- > 0;) {
+        parts.push_back(partResult(configuration, {index, count}));
+    }
+    return parts;
+}
+
+/// The result of simulating the points of another one again.
+inline sweep::Result repeated(sweep::Result result) {
+    sweep::Dispatcher dispatcher(sweep::repetitionOf(result.seed, result.points));
+    run(dispatcher, 2);
+    result.points = dispatcher.points();
+    return result;
+}
+
+/// A point by its place in the order.
+inline sweep::PointState& pointAt(sweep::Result& result, std::size_t number) {
+    return std::next(result.points.begin(), static_cast<std::ptrdiff_t>(number))->second;
 }
 
 }  // namespace quarzel::test

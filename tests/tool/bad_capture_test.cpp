@@ -56,13 +56,16 @@ const std::string notUnderstood = "has an npy header that cannot be understood" 
 const std::string noFormat =
     "has neither an npy header nor the CSV header systematic,parity1,parity2; give a capture in one of these "
     "formats";
-const std::string wholeNumber = "; give a whole number of at most 32 bits, in units of 1/8";
+const std::string realNumbers =
+    "give --llr 4 when they are log-likelihood ratios, --scale S when they are samples";
+const std::string wholeNumber =
+    "; give a whole number of at most 32 bits, in units of 1/8; for real numbers " + realNumbers;
 const std::string everyLine = "; give systematic,parity1,parity2 in every line";
 const std::string cutShort = "; copy it again, it was cut short";
 const std::string shapeOfCapture =
     "; a capture has shape (blocks, 3, K + 4), with systematic, parity 1, parity 2 in axis 1";
 const std::string types =
-    "; save int8, int16 or int32 (little-endian), with numpy's astype('<i2') for example";
+    "; save soft values as int8, int16 or int32, real numbers as float32 or float64, little-endian";
 
 const std::vector<BadCapture> badCaptures = {
     {"EmptyNpy", "a.npy", "", "ends within its npy header" + saveAgain},
@@ -87,7 +90,10 @@ const std::vector<BadCapture> badCaptures = {
      notUnderstood},
     {"TextAfterHeader", "a.npy", rawNpy(npyHeader("|i1", "(1, 3, 44)") + 'x'), notUnderstood},
     {"UnknownKey", "a.npy", rawNpy("{'color': 'red', 'descr': '|i1'}\n"), notUnderstood},
-    {"Float", "a.npy", npy("<f4", "(1, 3, 44)", 528), "holds values of type '<f4'" + types},
+    {"Float", "a.npy", npy("<f4", "(1, 3, 44)", 528), "holds values of type '<f4'; " + realNumbers},
+    {"Double", "a.npy", npy("<f8", "(1, 3, 44)", 1056), "holds values of type '<f8'; " + realNumbers},
+    {"HalfFloat", "a.npy", npy("<f2", "(1, 3, 44)", 264), "holds values of type '<f2'" + types},
+    {"BigEndianFloat", "a.npy", npy(">f4", "(1, 3, 44)", 528), "holds values of type '>f4'" + types},
     {"Int64", "a.npy", npy("<i8", "(1, 3, 44)", 1056), "holds values of type '<i8'" + types},
     {"Unsigned", "a.npy", npy("|u1", "(1, 3, 44)", 132), "holds values of type '|u1'" + types},
     {"BigEndian", "a.npy", npy(">i2", "(1, 3, 44)", 264), "holds values of type '>i2'" + types},
@@ -162,6 +168,27 @@ TEST_P(BadCaptureTest, IsRefusedInOneLineThatTellsWhatIsWrong) {
 
 INSTANTIATE_TEST_SUITE_P(, BadCaptureTest, testing::ValuesIn(badCaptures),
                          [](const auto& test) { return std::string(test.param.title); });
+
+TEST(BadCapture, IsOneOfRealNumbersThatAreNone) {
+    const auto refusal = [](const std::string& name, const std::string& content) {
+        std::istringstream stream(content);
+        return refusalOf([&] { tool::readCapture(stream, name, 4); });
+    };
+    const std::string ready = "; integers are soft values already; leave out --llr and --scale\n";
+    EXPECT_EQ(refusal("a.npy", npy("|i1", "(1, 3, 44)", 132)),
+              "quarzel: error: a.npy: holds values of type '|i1'" + ready);
+    const std::string header = npyHeader("<f4", "(2, 3, 44)");
+    EXPECT_EQ(refusal("a.npy", rawNpy(header, std::string(528, '\1') + std::string(528, '\xff'))),
+              "quarzel: error: a.npy: block 2 of 2 has values that are not a number (NaN); give 0 for a bit "
+              "that is unknown\n");
+    EXPECT_EQ(refusal("a.npy", rawNpy(header, std::string(1000, '\1'))),
+              "quarzel: error: a.npy: ends within block 2 of 2" + cutShort + '\n');
+    for (const std::string field : {"nan", "1.5x", "1e999", ""}) {
+        EXPECT_EQ(refusal("a.csv", withLine(3, "1," + field + ",-0.5")),
+                  "quarzel: error: a.csv: line 3: parity1 is '" + field +
+                      "'; give a real number, 0 for a bit that is unknown\n");
+    }
+}
 
 TEST(BadCapture, LeavesNoOutputAndTakesNoMemoryForWhatItOnlyClaimsToHold) {
     for (const BadCapture& bad : badCaptures) {

@@ -50,9 +50,8 @@ class FullDisk : public testing::Test {
 TEST_F(FullDisk, LeavesASweepItsOlderCheckpoint) {
     const std::string file = itsDisk->path("result.json");
     const sweep::Result whole = resultOf(smallSweep());
-    sweep::Part half = sweep::freshPart(smallSweep(), {});
-    std::copy_n(whole.points.begin(), whole.points.size() / 2, half.points.begin());
-    const std::string checkpoint = itsDisk->write("result.json.checkpoint", sweep::partText(half));
+    const sweep::Result half{7, {whole.points.begin(), std::next(whole.points.begin(), 6)}, {}};
+    const std::string checkpoint = itsDisk->write("result.json.checkpoint", sweep::resultText(half));
     const std::vector<std::string> arguments = {
         "sweep",   "--block-size", "40,104", "--algorithm",  "0,2", "--iterations",       "3",  "--ebn0",
         "0:1.5:3", "--seed",       "7",      "--max-blocks", "301", "--max-block-errors", "50", "-o",
@@ -68,7 +67,7 @@ TEST_F(FullDisk, LeavesASweepItsOlderCheckpoint) {
                             "goes on from what was kept\n");
     EXPECT_EQ(full.exitCode, 3);
     EXPECT_THAT(itsDisk->names(), testing::ElementsAre("ballast", "result.json.checkpoint"));
-    EXPECT_EQ(readFile(checkpoint), sweep::partText(half));
+    EXPECT_EQ(readFile(checkpoint), sweep::resultText(half));
 
     itsDisk->makeRoom();
     const ToolRun run = runTool(arguments);
@@ -83,7 +82,8 @@ TEST_F(FullDisk, LeavesNothingOfASweepThatKeptNothing) {
     const ToolRun run = runTool({"sweep", "--block-size", "40", "--ebn0", "20", "--max-blocks", "9", "--json",
                                  "-o", itsDisk->path("result.json")});
     EXPECT_THAT(run.err, testing::EndsWith("free some space; the sweep then begins anew\n"));
-    EXPECT_EQ(sweep::readResult(run.out).points.at(0).blocks, 9U) << "the result is printed nonetheless";
+    EXPECT_EQ(sweep::readResult(run.out).points.begin()->second.blocks, 9U)
+        << "the result is printed nonetheless";
     EXPECT_EQ(run.exitCode, 3);
     EXPECT_THAT(itsDisk->names(), testing::ElementsAre("ballast"));
 }
@@ -92,7 +92,7 @@ TEST_F(FullDisk, KeepsAMergedResultAway) {
     std::vector<std::string> arguments = {"merge"};
     for (const std::uint64_t index : {0U, 1U}) {
         arguments.push_back(itsDisk->write("part" + std::to_string(index),
-                                           sweep::partText(partOf(smallSweep(), {index, 2}).part)));
+                                           sweep::resultText(partResult(smallSweep(), {index, 2}).result)));
     }
     arguments.insert(arguments.end(), {"-o", itsDisk->path("merged.json")});
     expectOneLineAndThenDone(arguments, "merged.json", "merged.json");

@@ -52,8 +52,17 @@ TEST(Help, TeachesCompletion) {
     expectHelp({"completion", "--help"}, "completion_help.txt");
 }
 
+TEST(Help, TeachesHelp) {
+    expectHelp({"help", "--help"}, "help_help.txt");
+}
 TEST(Help, TeachesSweep) {
     expectHelp({"sweep", "--help"}, "sweep_help.txt");
+}
+TEST(Help, TeachesThreshold) {
+    expectHelp({"threshold", "--help"}, "threshold_help.txt");
+}
+TEST(Help, TeachesShow) {
+    expectHelp({"show", "--help"}, "show_help.txt");
 }
 TEST(Help, TeachesMerge) {
     expectHelp({"merge", "--help"}, "merge_help.txt");

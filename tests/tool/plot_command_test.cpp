@@ -3,55 +3,9 @@
 
 #include <cstdlib>
 
-#include "run_tool.hpp"
-#include "sweep/result.hpp"
-#include "temporary_directory.hpp"
+#include "plot_fixture.hpp"
 
 namespace quarzel::test {
-
-namespace {
-
-/// A result of two curves of two points, the second without an error.
-std::string result(bool perIteration) {
-    sweep::Result result;
-    result.configuration.blockSizes = {40};
-    result.configuration.algorithms = {0, 1};
-    result.configuration.iterations = {2};
-    result.configuration.ebN0 = {{500000}, {1000000}};
-    result.configuration.perIteration = perIteration;
-    for (const std::uint64_t errors : {10U, 0U, 8U, 0U}) {
-        sweep::PointState point(perIteration ? 2 : 1);
-        point.blocks = 100;
-        point.counts.front() = {5 * errors, 2 * errors};
-        point.counts.back() = {3 * errors, errors};
-        point.bitErrorSquares = 9 * errors;
-        point.stoppedBy = sweep::StopReason::blocks;
-        result.points.push_back(point);
-    }
-    return sweep::resultText(result);
-}
-
-class PlotCommand : public testing::Test {
-  protected:
-    ToolRun plot(const std::vector<std::string>& options) {
-        std::vector<std::string> arguments = {"plot", itsResult};
-        arguments.insert(arguments.end(), options.begin(), options.end());
-        return runTool(arguments);
-    }
-
-    void expectRefused(const ToolRun& run, const std::string& message, int exitCode) {
-        EXPECT_EQ(run.err, "quarzel: error: " + message + '\n');
-        EXPECT_EQ(run.out, "");
-        EXPECT_EQ(run.exitCode, exitCode);
-        EXPECT_EQ(itsDirectory.names(), std::vector<std::string>{"result.json"}) << "nothing may be left";
-    }
-
-    TemporaryDirectory itsDirectory;
-    std::string itsResult = itsDirectory.write("result.json", result(false));
-    std::string itsSvg = itsDirectory.path("out.svg");
-};
-
-}  // namespace
 
 TEST_F(PlotCommand, DrawsInTheFormatThatTheNameTells) {
     for (const auto& [name, start] : std::vector<std::pair<std::string, std::string>>{
@@ -69,7 +23,7 @@ TEST_F(PlotCommand, NamesTheCurvesInALegend) {
     const std::string svg = readFile(itsSvg);
     for (const char* const text :
          {">max-log<", ">scaled max-log<", ">a &amp; bound<", ">K = 40, 2 units, 2 iterations, LLR \u00d7 4<",
-          ">Bit error rate<", ">no error: 95 % upper bound<"}) {
+          ">Bit error rate<", ">no error: 95 % upper bound<", ">95 % interval<"}) {
         EXPECT_NE(svg.find(text), std::string::npos) << text;
     }
     ASSERT_EQ(plot({"-o", itsSvg, "--algorithm", "1", "--title", "Mine"}).exitCode, 0);
@@ -78,11 +32,26 @@ TEST_F(PlotCommand, NamesTheCurvesInALegend) {
 }
 
 TEST_F(PlotCommand, DrawsTheIterationsOfOneCurve) {
-    itsDirectory.write("result.json", result(true));
+    itsDirectory.write("result.json", twoCurves(true));
     ASSERT_EQ(plot({"-o", itsSvg, "--per-iteration", "--algorithm", "0"}).exitCode, 0);
     const std::string svg = readFile(itsSvg);
     EXPECT_NE(svg.find(">after 1 iteration<"), std::string::npos);
     EXPECT_NE(svg.find(">after 2 iterations<"), std::string::npos);
+    ASSERT_EQ(plot({"-o", itsSvg, "--per-iteration", "--algorithm", "0", "--iterations", "2"}).exitCode, 0);
+    EXPECT_EQ(readFile(itsSvg).find(">after 1 iteration<"), std::string::npos);
+    EXPECT_NE(readFile(itsSvg).find(">after 2 iterations<"), std::string::npos);
+}
+
+TEST_F(PlotCommand, DrawsEveryTextAsItIs) {
+    for (const std::string text : {"''it''s' `false` \"$x\" \\n @a {/*2 b}_c^d %s", "a\xff\xc3'"}) {
+        const std::string reference = itsDirectory.write("b.csv", "ebn0_db,bler\n1,0.1\n");
+        const ToolRun run = plot({"-o", itsSvg, "--title", text, "--reference", text + '=' + reference,
+                                  "--x-label", text, "--label", text, "--label", "b"});
+        EXPECT_EQ(run.exitCode, 0) << run.err;
+        const std::string svg = readFile(itsSvg);
+        const std::string shown = text[0] == 'a' ? ">a\uFFFD\uFFFD'<" : "''it''s' `false` ";
+        EXPECT_NE(svg.find(shown), std::string::npos) << svg;
+    }
 }
 
 TEST_F(PlotCommand, DrawsAxesWhereNoErrorWasSeen) {
@@ -90,14 +59,10 @@ TEST_F(PlotCommand, DrawsAxesWhereNoErrorWasSeen) {
     for (const std::vector<std::string>& options :
          {std::vector<std::string>{"--per-iteration", "--algorithm", "0"}, {"--reference", reference}}) {
         sweep::Result silent;
-        silent.configuration.blockSizes = {40};
-        silent.configuration.algorithms = {0};
-        silent.configuration.iterations = {2};
-        silent.configuration.ebN0 = {{500000}};
-        silent.configuration.perIteration = true;
-        silent.points.emplace_back(2);
-        silent.points.back().blocks = 100;
-        silent.points.back().stoppedBy = sweep::StopReason::blocks;
+        sweep::PointState& point =
+            silent.points.emplace(sweep::Setup{40, 2, 0, 2, {}, {500000}}, 2).first->second;
+        point.blocks = 100;
+        point.stoppedBy = sweep::StopReason::blocks;
         itsDirectory.write("result.json", sweep::resultText(silent));
         std::vector<std::string> all = {"-o", itsSvg};
         all.insert(all.end(), options.begin(), options.end());
@@ -107,12 +72,10 @@ TEST_F(PlotCommand, DrawsAxesWhereNoErrorWasSeen) {
 }
 
 TEST_F(PlotCommand, DoesNotMixTheIterationsOfSeveralCurves) {
-    itsDirectory.write("result.json", result(true));
+    itsDirectory.write("result.json", twoCurves(true));
     expectRefused(
         plot({"-o", itsSvg, "--per-iteration"}),
-        "--per-iteration: there are 2 curves; choose one with --block-size, --units, --algorithm and "
-        "--iterations",
-        2);
+        "--per-iteration: there are 2 curves; choose one with --block-size, --units and --algorithm", 2);
 }
 
 TEST_F(PlotCommand, RefusesIterationsThatWereNotCounted) {

@@ -3,6 +3,7 @@
 
 #include <fcntl.h>
 #include <pty.h>
+#include <sys/ioctl.h>
 #include <sys/resource.h>
 #include <sys/wait.h>
 #include <unistd.h>
@@ -81,13 +82,14 @@ ToolRun runTool(const std::vector<std::string>& arguments, const ToolSetting& se
     int master = -1;
     int err = -1;
     if (setting.terminal) {
-        checked(::openpty(&master, &err, nullptr, nullptr, nullptr));
+        const winsize size{24, 80, 0, 0};
+        checked(::openpty(&master, &err, nullptr, nullptr, &size));
     } else {
         err = openForWriting(directory.path("stderr"));
     }
     const pid_t child = checked(::fork());
     if (child == 0) {
-        become(argv.data(), setting, out, err);
+        become(argv.data(), setting, setting.outputToTerminal ? err : out, err);
     }
     ::close(out);
     ::close(err);

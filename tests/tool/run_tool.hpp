@@ -20,7 +20,8 @@ struct ToolSetting {
     std::string standardOutput = {};                  ///< a file to write it to instead of catching it
     std::optional<unsigned long> fileSizeLimit = {};  ///< in bytes
     std::optional<unsigned long> memoryLimit = {};  ///< in bytes; the address sanitizer cannot live with one
-    bool terminal = false;                          ///< standard error is a terminal
+    bool terminal = false;                          ///< standard error is a terminal, of 80 columns
+    bool outputToTerminal = false;                  ///< standard output is the same terminal
 };
 
 /// Run the tool with these arguments and wait for its end.

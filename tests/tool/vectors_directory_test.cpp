@@ -1,5 +1,7 @@
 // SPDX-License-Identifier: MIT
 #include <gtest/gtest.h>
+#include <sys/stat.h>
+#include <unistd.h>
 
 #include <filesystem>
 
@@ -86,7 +88,8 @@ TEST_F(VectorsDirectory, IsNotThereWhenAFileCannotBeWritten) {
 }
 
 TEST_F(VectorsDirectory, IsNotThereWhenTheToolIsInterrupted) {
-    const std::string interrupted = R"sh("$0" vectors "$1" --block-size 6144 --blocks 100000 &
+    const std::string interrupted = R"sh(env --default-signal=INT \
+                                             "$0" vectors "$1" --block-size 6144 --blocks 100000 &
                                          until [ -n "$(ls -A "$2")" ]; do sleep 0.01; done
                                          kill -s INT $!
                                          wait $!)sh";
@@ -94,6 +97,59 @@ TEST_F(VectorsDirectory, IsNotThereWhenTheToolIsInterrupted) {
         runTool({"-c", interrupted, QUARZEL_TOOL, itsSet, itsDirectory.path("")}, {.program = "/bin/sh"});
     expectRefused(run, itsSet + ": was not made, since a signal came; run the command again", 4);
     EXPECT_EQ(itsDirectory.names(), std::vector<std::string>{});
+}
+
+TEST_F(VectorsDirectory, KeepsWhatAppearsInTheOlderSetWhileItIsReplaced) {
+    ASSERT_EQ(make().exitCode, 0);
+    const std::string script = R"sh("$0" vectors "$1" --block-size 6144 --blocks 300 --replace &
+                                    until [ -n "$(ls -d "$2"/.quarzel-* 2>&-)" ]; do sleep 0.01; done
+                                    echo precious > "$1/u2_a1/simulated.hex"
+                                    wait $!)sh";
+    const ToolRun run =
+        runTool({"-c", script, QUARZEL_TOOL, itsSet, itsDirectory.path("")}, {.program = "/bin/sh"});
+    EXPECT_EQ(run.exitCode, 0);
+    const std::vector<std::string> names = itsDirectory.names();
+    ASSERT_EQ(names.size(), 2U) << "the older set is kept under another name";
+    EXPECT_EQ(run.err, "quarzel: warning: " + itsSet +
+                           ": files that are not part of the older set are kept in " +
+                           itsDirectory.path(names[0]) + '\n');
+    EXPECT_EQ(readFile(itsDirectory.path(names[0]) + "/u2_a1/simulated.hex"), "precious\n");
+    EXPECT_FALSE(fs::exists(itsDirectory.path(names[0]) + "/manifest.json"));
+    EXPECT_FALSE(fs::exists(itsCore + "/simulated.hex"));
+}
+
+TEST_F(VectorsDirectory, OfAnotherRunIsNotReplacedUnasked) {
+    const std::string script = R"sh("$0" vectors "$1" --block-size 6144 --blocks 300 &
+                                    until [ -n "$(ls -A "$2")" ]; do sleep 0.01; done
+                                    "$0" vectors "$1" --seed 2 > "$2/report"
+                                    wait $!)sh";
+    const ToolRun run =
+        runTool({"-c", script, QUARZEL_TOOL, itsSet, itsDirectory.path("")}, {.program = "/bin/sh"});
+    expectRefused(run, itsSet + ": cannot be written: Directory not empty; choose another place");
+    EXPECT_EQ(runTool({"compare", itsCore, itsCore + "/dout.hex"}).exitCode, 0);
+    EXPECT_EQ(itsDirectory.names(), (std::vector<std::string>{"report", "set"}));
+}
+
+TEST_F(VectorsDirectory, KeepsItsMode) {
+    fs::create_directory(itsSet);
+    fs::permissions(itsSet, static_cast<fs::perms>(0750));
+    ASSERT_EQ(make().exitCode, 0);
+    EXPECT_EQ(fs::status(itsSet).permissions(), static_cast<fs::perms>(0750));
+    ASSERT_EQ(make({"--replace"}).exitCode, 0);
+    EXPECT_EQ(fs::status(itsSet).permissions(), static_cast<fs::perms>(0750));
+}
+
+TEST_F(VectorsDirectory, IsNotReplacedWhenItCannotBeReadThrough) {
+    if (::geteuid() != 0) {
+        GTEST_SKIP() << "only the superuser can become another user";
+    }
+    ASSERT_EQ(make().exitCode, 0);
+    ASSERT_EQ(::chmod(itsDirectory.path("").c_str(), 0777), 0);
+    ASSERT_EQ(::chmod(itsCore.c_str(), 0700), 0);
+    const ToolRun run = runTool(
+        {"--reuid=65534", "--regid=65534", "--clear-groups", QUARZEL_TOOL, "vectors", itsSet, "--replace"},
+        {.program = "/usr/bin/setpriv"});
+    expectRefused(run, itsSet + ": cannot be read: Permission denied; make it readable");
 }
 
 TEST_F(VectorsDirectory, IsWhatCompareExpects) {

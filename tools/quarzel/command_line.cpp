@@ -4,9 +4,11 @@
 #include <fmt/format.h>
 
 #include <CLI/CLI.hpp>
+#include <algorithm>
 #include <memory>
 #include <optional>
 #include <string>
+#include <string_view>
 #include <vector>
 
 #include "decode/decode_command.hpp"
@@ -15,6 +17,8 @@
 #include "shell/nearest_name.hpp"
 #include "shell/shell_commands.hpp"
 #include "sweeps/merge_command.hpp"
+#include "sweeps/show_command.hpp"
+#include "sweeps/threshold_command.hpp"
 #include "sweeps/verify_result_command.hpp"
 #include "tool_error.hpp"
 #include "trace/trace_diff_command.hpp"
@@ -27,9 +31,10 @@ namespace {
 
 constexpr const char* description = "A bit-accurate model of a hardware turbo decoder core for 3GPP LTE";
 
-constexpr const char* footer = R"('quarzel COMMAND --help' tells what a command reads, writes and prints.
-Results go to standard output; errors, warnings and a progress bar to standard
-error.
+constexpr const char* footer =
+    R"('quarzel help COMMAND' tells what a command reads, writes and prints. A file
+named - is standard input or output.
+Results go to standard output; errors, warnings and progress to standard error.
 
 Examples:
   quarzel info 6144
@@ -39,6 +44,7 @@ Examples:
   quarzel vectors vectors --block-size 40,6144 --ebn0 0.8
   quarzel compare vectors/u2_a1 simulated.hex
   quarzel sweep --ebn0 0:0.2:1 --iterations 8 -o result.json
+  quarzel show result.json
   quarzel plot result.json -o curves.svg
 )";
 
@@ -108,6 +114,25 @@ std::string remedyFor(const CLI::App& app) {
     return nearest ? fmt::format("did you mean '{}'? {}", *nearest, help) : help;
 }
 
+/// The error for a command line that was not understood.
+ToolError usageError(const CLI::App& app, const CLI::ParseError& error) {
+    return {ExitCode::usage, "", problemWith(app, error), remedyFor(app)};
+}
+
+/// The command line with every --json behind the command, wherever the user typed it.
+std::vector<const char*> withJsonBehindCommand(int argc, const char* const* argv) {
+    std::vector<const char*> arguments(argv, argv + argc);
+    const auto first = arguments.begin() + std::min(argc, 1);
+    const auto command =
+        std::find_if(first, arguments.end(), [](std::string_view word) { return !word.starts_with('-'); });
+    if (command != arguments.end()) {
+        const auto moved =
+            std::stable_partition(first, command, [](std::string_view word) { return word != "--json"; });
+        std::rotate(moved, command, command + 1);
+    }
+    return arguments;
+}
+
 }  // namespace
 
 ExitCode runCommandLine(int argc, const char* const* argv, std::ostream& results,
@@ -125,18 +150,24 @@ ExitCode runCommandLine(int argc, const char* const* argv, std::ostream& results
     addVectorsCommand(app, results);
     addCompareCommand(app, results, exitCode);
     addSweepCommand(app, results, makeWorkers);
+    addThresholdCommand(app, results, makeWorkers);
+    addShowCommand(app, results);
     addMergeCommand(app, results);
     addVerifyResultCommand(app, results, exitCode, makeWorkers);
     addPlotCommand(app);
     addShellCommands(app, results);
     try {
-        app.parse(argc, argv);
-    } catch (const CLI::CallForHelp&) {
+        const std::vector<const char*> arguments = withJsonBehindCommand(argc, argv);
+        app.parse(argc, arguments.data());
+    } catch (const CLI::CallForHelp& help) {
+        if (app.get_subcommands().empty() && !app.remaining().empty()) {
+            throw usageError(app, help);
+        }
         results << app.help();
     } catch (const CLI::CallForVersion& version) {
         results << version.what() << '\n';
     } catch (const CLI::ParseError& error) {
-        throw ToolError(ExitCode::usage, "", problemWith(app, error), remedyFor(app));
+        throw usageError(app, error);
     }
     return exitCode;
 }

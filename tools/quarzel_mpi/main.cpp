@@ -39,6 +39,7 @@ unsigned threadsOfRank() {
 void serve(unsigned usual, unsigned max) {
     std::signal(SIGINT, SIG_IGN);
     std::signal(SIGTERM, SIG_IGN);
+    std::signal(SIGHUP, SIG_IGN);
     try {
         quarzel::mpi::serve(usual, max);
     } catch (const std::exception& error) {

@@ -5,7 +5,7 @@
 #define MPICH_SKIP_MPICXX 1
 #include <mpi.h>
 
-#include "sweep/part.hpp"
+#include "sweep/point_json.hpp"
 
 namespace quarzel::mpi {
 
@@ -60,6 +60,26 @@ Words receive(MPI_Status status) {
     return words;
 }
 
+/// What the ranks that simulate blocks need of a plan.
+std::string textOf(const sweep::Plan& plan) {
+    sweep::Json points = sweep::Json::array();
+    for (const sweep::PlannedPoint& point : plan.points) {
+        points.push_back({sweep::curveJson(point.setup),
+                          sweep::pointJson(point.setup, sweep::PointState(point.start.counts.size()))});
+    }
+    return sweep::Json{plan.seed, plan.shard.index, plan.shard.count, std::move(points)}.dump();
+}
+
+sweep::Plan planFrom(const std::string& text) {
+    const sweep::Json json = sweep::Json::parse(text);
+    sweep::Plan plan{json.at(0), {}, 0, {json.at(1), json.at(2)}};
+    for (const sweep::Json& point : json.at(3)) {
+        auto [setup, start] = sweep::pointFrom(point.at(0), point.at(1));
+        plan.points.push_back({setup, {}, std::move(start)});
+    }
+    return plan;
+}
+
 /// Give the text of rank 0 to all.
 void broadcast(std::string& text) {
     int size = static_cast<int>(text.size());
@@ -70,11 +90,8 @@ void broadcast(std::string& text) {
 
 }  // namespace
 
-// The sweep travels as a part that has not begun.
 void announce(const std::optional<Announcement>& announcement) {
-    std::string text =
-        announcement ? sweep::partText(sweep::freshPart(announcement->configuration, announcement->shard))
-                     : std::string();
+    std::string text = announcement ? textOf(announcement->plan) : std::string();
     broadcast(text);
     Words threads = {announcement ? announcement->threads : 0};
     MPI_Bcast(threads.data(), 1, MPI_UINT64_T, 0, MPI_COMM_WORLD);
@@ -88,8 +105,7 @@ std::optional<Announcement> awaitAnnouncement() {
     if (text.empty()) {
         return std::nullopt;
     }
-    const sweep::Part part = sweep::readPart(text);
-    return Announcement{part.configuration, part.shard, static_cast<unsigned>(threads.front())};
+    return Announcement{planFrom(text), static_cast<unsigned>(threads.front())};
 }
 
 std::optional<sweep::Task> exchange(const std::optional<Outcome>& outcome) {

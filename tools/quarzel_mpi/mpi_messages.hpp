@@ -13,8 +13,7 @@ namespace quarzel::mpi {
 
 /// The work that rank 0 announces to all.
 struct Announcement {
-    sweep::Configuration configuration;
-    sweep::Shard shard;
+    sweep::Plan plan;  ///< its rules are for rank 0 alone
     unsigned threads;  ///< of each rank; 0: the usual number
 };
 

@@ -11,7 +11,6 @@
 #include <exception>
 #include <mutex>
 #include <thread>
-#include <vector>
 
 #include "link/parallel.hpp"
 #include "mpi_messages.hpp"
@@ -52,20 +51,15 @@ bool answerRequest(sweep::Dispatcher& dispatcher, unsigned& askers) {
 /// What the threads of a rank do: they ask rank 0 for tasks, one at a time.
 class Asker {
   public:
-    explicit Asker(const Announcement& announcement)
-        : itsAnnouncement(announcement),
-          itsCurves(announcement.configuration.curves()),
-          itsChannels(announcement.configuration.quantiser) {}
+    explicit Asker(const sweep::Plan& plan) : itsPlan(plan) {}
 
     void run() {
-        const sweep::Configuration& configuration = itsAnnouncement.configuration;
-        sweep::BlockSimulator simulator(configuration, itsChannels);
+        sweep::BlockSimulator simulator(itsPlan.seed, itsChannels);
         std::optional<Outcome> outcome;
         while (const std::optional<sweep::Task> task = ask(outcome)) {
-            const std::size_t pointsPerCurve = configuration.ebN0.size();
-            outcome = Outcome{*task, simulator.simulate(itsCurves[task->point / pointsPerCurve],
-                                                        configuration.ebN0[task->point % pointsPerCurve],
-                                                        sweep::octetNumbers(*task, itsAnnouncement.shard))};
+            const sweep::PlannedPoint& point = itsPlan.points[task->point];
+            outcome = Outcome{*task, simulator.simulate(point.setup, point.start.counts.size(),
+                                                        sweep::octetNumbers(*task, itsPlan.shard))};
         }
     }
 
@@ -75,8 +69,7 @@ class Asker {
         return exchange(outcome);
     }
 
-    const Announcement& itsAnnouncement;
-    std::vector<sweep::Curve> itsCurves;
+    const sweep::Plan& itsPlan;
     sweep::Channels itsChannels;
     std::mutex itsMutex;
 };
@@ -84,7 +77,7 @@ class Asker {
 }  // namespace
 
 void MpiWorkers::run(sweep::Dispatcher& dispatcher, sweep::Observer& observer) {
-    announce(Announcement{dispatcher.configuration(), dispatcher.shard(), itsThreads});
+    announce(Announcement{dispatcher.plan(), itsThreads});
     unsigned askers = sumOver(0);  // threads of the other ranks
     std::atomic<bool> isDoneHere = false;
     std::exception_ptr failure;
@@ -123,7 +116,7 @@ void serve(unsigned usual, unsigned max) {
     while (const std::optional<Announcement> announcement = awaitAnnouncement()) {
         const unsigned threads = std::min(announcement->threads == 0 ? usual : announcement->threads, max);
         sumOver(threads);
-        Asker asker(*announcement);
+        Asker asker(announcement->plan);
         link::forEachOnThreads(threads, threads, [&asker] { return [&asker](std::size_t) { asker.run(); }; });
     }
 }

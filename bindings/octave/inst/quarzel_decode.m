@@ -18,6 +18,7 @@ function [bits, details] = quarzel_decode (varargin)
   %
   %   of class int8, int16 or int32, or double when the values are whole. The last 4 positions hold the tail. K is
   %   one of the 188 block sizes of LTE, 40 to 6144. What lies outside -128 to 127 is saturated, with a warning.
+  %   quarzel_quantise makes soft values of log-likelihood ratios.
   %   bits is uint8, of 0 and 1. Many blocks in one call are several times as fast as a call for each.
   %
   %   iterations, 1 to 15, are 6 when they are not given; every one of them runs.
@@ -42,7 +43,7 @@ function [bits, details] = quarzel_decode (varargin)
   %     [sys, par1, par2] = quarzel_encode (bits);
   %     isequal (quarzel_decode (16 * sys - 8, 16 * par1 - 8, 16 * par2 - 8), bits)
   %
-  %   See also quarzel_encode.
+  %   See also quarzel_encode, quarzel_quantise.
 
   [problem, bits, tags, trace] = quarzel_mex ('decode', varargin{:});
   if (~isempty (problem))
@@ -153,10 +154,11 @@ end
 %! quarzel_decode (zeros (45, 1), zeros (45, 1), zeros (45, 1))
 %!error <nearest that have one: 44> quarzel_decode ([], [], [])
 %!error id=quarzel:type quarzel_decode (single (soft{1}), soft{2}, soft{3})
-%!error <not single; for instance int8\(round\(8 \* llr\)\)> quarzel_decode (single (1), 1, 1)
+%!error <not single; quantise log-likelihood ratios first: quarzel_quantise \(llr\)> quarzel_decode (single (1), 1, 1)
 %!error <real and full> quarzel_decode (sparse (zeros (44, 1)), zeros (44, 1), zeros (44, 1))
 %!error <real and full> quarzel_decode (1i * ones (44, 1), zeros (44, 1), zeros (44, 1))
-%!error <not a whole number> quarzel_decode (0.5 * ones (44, 1), zeros (44, 1), zeros (44, 1))
+%!error <not a whole number .*; quantise log-likelihood ratios first: quarzel_quantise \(llr\)> ...
+%! quarzel_decode (0.5 * ones (44, 1), zeros (44, 1), zeros (44, 1))
 %!error <not a whole number> quarzel_decode (NaN (44, 1), zeros (44, 1), zeros (44, 1))
 %!error <one class and size> quarzel_decode (zeros (44, 1), zeros (1, 44), zeros (44, 1))
 %!error <one class and size> quarzel_decode (soft{1}, double (soft{2}), soft{3})

@@ -20,8 +20,8 @@ bindings::HostCore& CoreShelf::take(const CoreSettings& settings) {
     const bindings::Outcome outcome = place.core.open(settings);
     if (!outcome.done()) {
         drop();
-        throw bindings::BindingError(outcome.fault, outcome.message());
     }
+    requireDone(outcome);
     if (itsPlaces.size() > maxPlaces) {
         itsPlaces.pop_back();
     }

@@ -53,15 +53,6 @@ bool isRealNumeric(const mxArray* array) {
     return mxIsNumeric(array) && !mxIsComplex(array) && !mxIsSparse(array);
 }
 
-int wholeNumber(const mxArray* array, const char* name) {
-    const bool isNumber = isRealNumeric(array) && mxGetNumberOfElements(array) == 1;
-    const double value = isNumber ? numberIn(array, 0) : 0.5;
-    if (value != std::trunc(value) || std::abs(value) > std::numeric_limits<int>::max()) {
-        throw BindingError(Fault::value, std::string(name) + " must be a whole number");
-    }
-    return static_cast<int>(value);
-}
-
 std::vector<unsigned> tagsIn(const mxArray* array) {
     const bool isNumeric = isRealNumeric(array);
     std::vector<unsigned> tags(isNumeric ? mxGetNumberOfElements(array) : 0);
@@ -95,8 +86,7 @@ void setOption(DecodeOptions& options, std::string_view name, const mxArray* val
     if (name == "units") {
         options.settings.units = wholeNumber(value, "units");
     } else if (name == "algorithm") {
-        options.settings.algorithm =
-            mxIsChar(value) ? bindings::algorithmOf(textOf(value)) : wholeNumber(value, "algorithm");
+        options.settings.algorithm = algorithmIn(value);
     } else if (name == "tag_width") {
         options.settings.tagWidth = wholeNumber(value, "tag_width");
     } else if (name == "tags") {
@@ -125,7 +115,23 @@ void setOptions(DecodeOptions& options, const mxArray* fields) {
 
 }  // namespace
 
+int wholeNumber(const mxArray* array, const char* name) {
+    const bool isNumber = isRealNumeric(array) && mxGetNumberOfElements(array) == 1;
+    const double value = isNumber ? numberIn(array, 0) : 0.5;
+    if (value != std::trunc(value) || std::abs(value) > std::numeric_limits<int>::max()) {
+        throw BindingError(Fault::value, std::string(name) + " must be a whole number");
+    }
+    return static_cast<int>(value);
+}
+
+int algorithmIn(const mxArray* array) {
+    return mxIsChar(array) ? bindings::algorithmOf(textOf(array)) : wholeNumber(array, "algorithm");
+}
+
 std::string textOf(const mxArray* array) {
+    if (!mxIsChar(array)) {
+        return {};
+    }
     std::vector<char> text(mxGetNumberOfElements(array) + 1);
     mxGetString(array, text.data(), static_cast<mwSize>(text.size()));
     return text.data();

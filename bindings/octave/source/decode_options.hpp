@@ -25,7 +25,14 @@ struct DecodeOptions {
 /// @throws bindings::BindingError when there is something that no option is
 DecodeOptions decodeOptions(std::span<const mxArray* const> arguments);
 
-/// Text of a char array.
+/// Text of a char array; empty for another one.
 std::string textOf(const mxArray* array);
+
+/// @throws bindings::BindingError naming what must be a whole number, and is not
+int wholeNumber(const mxArray* array, const char* name);
+
+/// The number of an algorithm that is given by its name or number.
+/// @throws bindings::BindingError or std::invalid_argument when it is neither
+int algorithmIn(const mxArray* array);
 
 }  // namespace quarzel::octave

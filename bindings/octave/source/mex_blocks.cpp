@@ -23,7 +23,8 @@ mxClassID typeOf(const mxArray* array) {
     if (type != mxINT8_CLASS && type != mxINT16_CLASS && type != mxINT32_CLASS && type != mxDOUBLE_CLASS) {
         throw BindingError(Fault::type,
                            std::string("soft values must be int8, int16, int32 or whole doubles, not ") +
-                               mxGetClassName(array) + "; for instance int8(round(8 * llr))");
+                               mxGetClassName(array) +
+                               "; quantise log-likelihood ratios first: quarzel_quantise (llr)");
     }
     return type;
 }
@@ -44,8 +45,8 @@ std::int16_t wholeNumber(double value) {
         }
     }
     throw BindingError(Fault::value,
-                       "a soft value is not a whole number of the unit 1/8; round first, "
-                       "for instance int8(round(8 * llr))");
+                       "a soft value is not a whole number of the unit 1/8; quantise log-likelihood ratios "
+                       "first: quarzel_quantise (llr)");
 }
 
 template <SoftValue Value>

@@ -1,8 +1,10 @@
 // SPDX-License-Identifier: MIT
-// The function behind quarzel_decode and quarzel_encode, over the C API that Octave and MATLAB share:
+// The function behind those of the package, over the C API that Octave and MATLAB share:
 //
 //   [problem, bits, tags, trace] = quarzel_mex('decode', sys, par1, par2, ...)  as for quarzel_decode
 //   [problem, code] = quarzel_mex('encode', bits)                               bits of uint8
+//   [problem, soft] = quarzel_mex('quantise', values, scale)                    full, of double or single
+//   [problem, ...] = quarzel_mex(...)                                           as lte_calls.cpp has them
 //
 // It never raises an error, which would leave C++ by a jump. `problem` is empty, or a struct: `fault` names
 // what went wrong, `text` says it, `warnings` are the model's. The functions that users call raise them.
@@ -21,8 +23,10 @@
 
 #include "common/encoding.hpp"
 #include "common/host_core.hpp"
+#include "common/quantising.hpp"
 #include "core_shelf.hpp"
 #include "decode_options.hpp"
+#include "lte_calls.hpp"
 #include "mex_blocks.hpp"
 
 // Octave counts signals here until it handles them, after the call. MATLAB has no such counter.
@@ -34,6 +38,7 @@ using quarzel::bindings::BindingError;
 using quarzel::bindings::Fault;
 using quarzel::bindings::guarded;
 using quarzel::bindings::Outcome;
+using quarzel::bindings::requireDone;
 using quarzel::octave::CoreShelf;
 using quarzel::octave::DecodeOptions;
 using quarzel::octave::MexBlocks;
@@ -63,13 +68,6 @@ bool isInterrupted() {
     return &octave_signal_caught != nullptr && octave_signal_caught != 0;
 }
 
-/// Throw what went wrong inside.
-void check(const Outcome& outcome) {
-    if (!outcome.done()) {
-        throw BindingError(outcome.fault, outcome.message());
-    }
-}
-
 void writeFile(const std::string& name, const std::string& text) {
     std::FILE* const file = std::fopen(name.c_str(), "w");
     if (file == nullptr) {
@@ -82,8 +80,12 @@ void writeFile(const std::string& name, const std::string& text) {
     }
 }
 
+CoreShelf& shelf() {
+    static CoreShelf cores;
+    return cores;
+}
+
 void decode(Results& results, Arguments arguments, std::vector<std::string>& warnings) {
-    static CoreShelf shelf;
     if (arguments.size() < 3) {
         throw BindingError(Fault::value,
                            "three streams are needed; call quarzel_decode (sys, par1, par2, iterations)");
@@ -100,19 +102,19 @@ void decode(Results& results, Arguments arguments, std::vector<std::string>& war
     tags.resize(blocks.count());
     Outcome outcome;
     if (options.passes == 0) {
-        outcome = blocks.decode(shelf.take(options.settings), options.iterations, tags, isInterrupted);
+        outcome = blocks.decode(shelf().take(options.settings), options.iterations, tags, isInterrupted);
         // The next call tells of its own first saturation.
         if (!outcome.done() || !outcome.warnings.empty()) {
-            shelf.drop();
+            shelf().drop();
         }
     } else {
         // A trace shows what earlier blocks have left at the termination steps: nothing, in a new core.
         quarzel::bindings::HostCore core;
-        check(core.open(options.settings));
+        requireDone(core.open(options.settings));
         outcome = blocks.trace(core, options.iterations, tags, options.passes);
     }
     warnings.swap(outcome.warnings);
-    check(outcome);
+    requireDone(outcome);
     if (!options.traceFile.empty()) {
         writeFile(options.traceFile, outcome.trace);
     }
@@ -128,8 +130,40 @@ void encode(Results& results, const mxArray* bits) {
     const std::array<mwSize, 3> shape = {static_cast<mwSize>(K + quarzel::tailPositions), 3,
                                          static_cast<mwSize>(blocks)};
     results[1] = mxCreateNumericArray(3, shape.data(), mxUINT8_CLASS, mxREAL);
-    check(quarzel::bindings::encode(static_cast<const std::uint8_t*>(mxGetData(bits)), K, blocks,
-                                    static_cast<std::uint8_t*>(mxGetData(results[1]))));
+    requireDone(quarzel::bindings::encode(static_cast<const std::uint8_t*>(mxGetData(bits)), K, blocks,
+                                          static_cast<std::uint8_t*>(mxGetData(results[1]))));
+}
+
+/// A command of the coding chain.
+/// @return  false when there is none of that name
+bool runLte(Results& results, const std::string& command, Arguments arguments) {
+    std::vector<mxArray*> given;
+    const bool isKnown = quarzel::octave::runLte(
+        command, arguments, given,
+        {[](const auto& settings) -> auto& { return shelf().take(settings);
+}
+, isInterrupted
+}  // namespace
+);
+std::copy(given.begin(), given.end(), results.begin() + 1);
+return isKnown;
+}
+
+/// Soft values of real numbers, in an array of their shape.
+/// @param scale  a double, or an empty array for the default
+void quantise(Results& results, const mxArray* values, const mxArray* scale) {
+    results[1] =
+        mxCreateNumericArray(mxGetNumberOfDimensions(values), mxGetDimensions(values), mxINT8_CLASS, mxREAL);
+    const std::size_t count = mxGetNumberOfElements(values);
+    const std::span<std::int8_t> soft(static_cast<std::int8_t*>(mxGetData(results[1])), count);
+    const double factor = mxIsEmpty(scale) ? quarzel::llrScale : mxGetScalar(scale);
+    if (mxIsSingle(values)) {
+        requireDone(quarzel::bindings::quantise(
+            std::span(static_cast<const float*>(mxGetData(values)), count), factor, soft));
+    } else {
+        requireDone(quarzel::bindings::quantise(
+            std::span(static_cast<const double*>(mxGetData(values)), count), factor, soft));
+    }
 }
 
 /// What the functions that users call are to raise; an empty matrix when there is nothing.
@@ -158,7 +192,9 @@ Results run(Arguments arguments) noexcept {
             decode(results, arguments.subspan(1), warnings);
         } else if (command == "encode" && arguments.size() == 2 && mxIsUint8(arguments[1])) {
             encode(results, arguments[1]);
-        } else {
+        } else if (command == "quantise" && arguments.size() == 3) {
+            quantise(results, arguments[1], arguments[2]);
+        } else if (arguments.empty() || !runLte(results, command, arguments.subspan(1))) {
             throw BindingError(Fault::value, "quarzel_mex is not to be called directly; see quarzel_decode");
         }
     });

@@ -12,10 +12,12 @@ three streams of K + 4 soft values (systematic, parity 1, parity 2), the last 4 
 the standard places it.
 """
 
+from . import lte
 from ._code import Segments, block_sizes, encode, qpp, segments
 from ._core import ModelWarning
 from ._core import version as __version__
 from ._decoder import Decoder, algorithms, implementations
+from ._figure import plot
 from ._mismatch import Mismatch
 from ._scoreboard import Scoreboard
 from ._simulation import Curve, Point, SweepResult, sweep
@@ -40,6 +42,8 @@ __all__ = [
     "block_sizes",
     "encode",
     "implementations",
+    "lte",
+    "plot",
     "qpp",
     "quantise",
     "read_trace",
@@ -49,6 +53,6 @@ __all__ = [
 
 # Tracebacks, pickles and help name the package, not the submodule where something happens to stand.
 for _public in (BlockTrace, Curve, Decoder, Mismatch, Point, Scoreboard, Segments, SweepResult, encode, implementations,
-                qpp, quantise, read_trace, segments, sweep):  # fmt: skip
+                plot, qpp, quantise, read_trace, segments, sweep):  # fmt: skip
     _public.__module__ = __name__
 del _public

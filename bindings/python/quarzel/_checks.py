@@ -78,5 +78,30 @@ def array_of(name: str, values: ArrayLike) -> NDArray[Any]:
         raise ValueError(f"{name} is not an array: its rows must have the same length") from None
 
 
+def bit_array(name: str, values: ArrayLike, what: str) -> NDArray[np.uint8]:
+    """Bits in bytes. What is neither 0 nor 1 stays something else.
+
+    :param what: a block holds, for the error text
+    :raises TypeError: they are not integers or booleans, or are masked
+    :raises ValueError: they are a single number, or nested unevenly
+    """
+    array = array_of(name, values)
+    if array.dtype.kind not in "biu":
+        raise TypeError(f"{name} must be integers or booleans, not {array.dtype}; use {name}.astype(numpy.uint8)")
+    if array.ndim == 0:
+        raise ValueError(f"{name} must be an array of {what}, or of blocks of {what}")
+    if array.dtype != np.uint8:
+        # What does not fit a byte must not become a bit by losing its upper part.
+        array = np.where((array == 0) | (array == 1), array, 2).astype(np.uint8)
+    return array
+
+
+def rows_of(array: NDArray[Any], block_dimensions: int = 1) -> NDArray[Any]:
+    """The blocks of an array, whose last dimensions are those of a block, along one leading axis and in memory after
+    one another."""
+    split = array.ndim - block_dimensions
+    return np.ascontiguousarray(array.reshape(math.prod(array.shape[:split]), *array.shape[split:]))
+
+
 def _kind(value: Any) -> str:
     return repr(value) if isinstance(value, str) else type(value).__name__

@@ -4,7 +4,6 @@
 from __future__ import annotations
 
 import bisect
-import math
 import operator
 from typing import NamedTuple
 
@@ -12,7 +11,7 @@ import numpy as np
 from numpy.typing import ArrayLike, NDArray
 
 from . import _core
-from ._checks import array_of, choice
+from ._checks import bit_array, choice, rows_of
 from ._types import Units
 
 block_sizes: tuple[int, ...] = tuple(_core.block_sizes())
@@ -29,7 +28,7 @@ class Segments(NamedTuple):
     or 0 for the window that starts at step 0."""
 
 
-def _size(K: int) -> int:
+def block_size(K: int) -> int:
     """K, when it is a block size."""
     try:
         number = operator.index(K)
@@ -51,7 +50,7 @@ def qpp(K: int) -> NDArray[np.int32]:
     >>> quarzel.qpp(40)[:6].tolist()
     [0, 13, 6, 19, 12, 25]
     """
-    return _core.qpp(_size(K))
+    return _core.qpp(block_size(K))
 
 
 def segments(K: int, units: Units) -> Segments:
@@ -60,7 +59,7 @@ def segments(K: int, units: Units) -> Segments:
     >>> quarzel.segments(1024, units=2).alpha[:2].tolist()
     [[0, 128], [128, 256]]
     """
-    count, windows = _core.layout(_size(K), choice("units", units, (2, 4, 8)))
+    count, windows = _core.layout(block_size(K), choice("units", units, (2, 4, 8)))
     lengths = np.array(windows, dtype=np.int32)
     tops = np.cumsum(lengths, dtype=np.int32)
     starts = np.arange(count, dtype=np.int32) * tops[-1]
@@ -81,14 +80,7 @@ def encode(bits: ArrayLike) -> NDArray[np.uint8]:
     >>> quarzel.encode(np.ones((5, 40), dtype=np.uint8)).shape
     (5, 3, 44)
     """
-    array = array_of("bits", bits)
-    if array.dtype.kind not in "biu":
-        raise TypeError(f"bits must be integers or booleans, not {array.dtype}; use bits.astype(numpy.uint8)")
-    if array.ndim == 0:
-        raise ValueError("bits must be an array of K bits, or of blocks of K bits")
-    if array.dtype != np.uint8:
-        # What does not fit a byte must not become a bit by losing its upper part.
-        array = np.where((array == 0) | (array == 1), array, 2).astype(np.uint8)
-    rows = array.reshape(math.prod(array.shape[:-1]), _size(array.shape[-1]))
-    code = _core.encode(np.ascontiguousarray(rows))
+    array = bit_array("bits", bits, "K bits")
+    block_size(array.shape[-1])
+    code = _core.encode(rows_of(array))
     return code.reshape(*array.shape[:-1], *code.shape[1:])

@@ -15,7 +15,7 @@ from ._soft import soft_blocks
 from ._trace import BlockTrace, trace_of_arrays
 from ._types import Algorithm, AlgorithmOrNumber, Units
 
-_MAX_ITERATIONS = 15
+MAX_ITERATIONS = 15
 
 algorithms: tuple[Algorithm, ...] = _core.algorithms
 """The arithmetics of the core, in the order of their numbers 0, 1 and 2."""
@@ -166,7 +166,7 @@ class Decoder:
                 return plain
         blocks = soft_blocks(systematic, parity1, parity2)
         tag_array = None if tags is None else _tag_array(tags, blocks.shape)
-        count = whole("iterations", iterations, 1, _MAX_ITERATIONS)
+        count = whole("iterations", iterations, 1, MAX_ITERATIONS)
         bits, tags_back = self._core.decode(*blocks.streams, count, tag_array, False)
         if packed:
             bits = np.packbits(bits, axis=-1)
@@ -188,7 +188,7 @@ class Decoder:
         (4, 40)
         """
         blocks = soft_blocks(systematic, parity1, parity2)
-        count = whole("iterations", iterations, 1, _MAX_ITERATIONS)
+        count = whole("iterations", iterations, 1, MAX_ITERATIONS)
         bits, _ = self._core.decode(*blocks.streams, count, None, True)
         return bits.reshape(*blocks.shape, *bits.shape[1:])
 
@@ -212,7 +212,7 @@ class Decoder:
         blocks = soft_blocks(systematic, parity1, parity2)
         if blocks.shape != ():
             raise ValueError(f"a trace shows one block, not blocks of shape {blocks.shape}; pick one of them")
-        all_passes = 2 * whole("iterations", iterations, 1, _MAX_ITERATIONS)
+        all_passes = 2 * whole("iterations", iterations, 1, MAX_ITERATIONS)
         count = all_passes if passes is None else min(whole("passes", passes, 1), all_passes)
         bits, block, inputs, signals = self._core.trace(*blocks.streams, all_passes // 2, count)
         return trace_of_arrays(block, inputs, signals, bits[0])

@@ -12,6 +12,7 @@ from typing import Any, Callable, Iterable, Literal, Optional, Union
 import numpy as np
 from numpy.typing import ArrayLike, NDArray
 
+from . import _core
 from ._checks import array_of, choice, real, whole
 from ._decoder import algorithm_number, algorithms
 from ._types import Algorithm, AlgorithmOrNumber, Units
@@ -36,8 +37,8 @@ class Point:
     ber_interval: tuple[float, float]
     """holds the true rate with a probability of 95 %"""
     bler_interval: tuple[float, float]
-    stopped_by: str
-    """``"block errors"``, ``"blocks"`` or ``"time"``"""
+    stopped_by: Optional[str]
+    """``"block errors"``, ``"blocks"``, ``"time"``, or None where a sweep was interrupted"""
     per_iteration: Optional[list[dict[str, int]]] = None
     """``bit_errors`` and ``block_errors`` after each iteration"""
 
@@ -50,6 +51,9 @@ class Curve:
     units: Units
     algorithm: Algorithm
     iterations: int
+    quantiser: str
+    """``"llr"`` or ``"scale"``"""
+    scale: float
     points: list[Point] = field(default_factory=list)
 
     @property
@@ -68,39 +72,40 @@ class Curve:
         return np.array([point.bler for point in self.points])
 
     def __str__(self) -> str:
-        return f"K = {self.block_size}, {self.units} units, {self.algorithm}, {self.iterations} iterations"
+        return (
+            f"K = {self.block_size}, {self.units} units, {self.algorithm}, {self.iterations} iterations, "
+            f"{self.quantiser} {self.scale:g}"
+        )
 
 
 class SweepResult:
     """The result of a sweep, as in the files of the tool: ``quarzel sweep``, ``plot`` and ``verify-result``.
 
     >>> quarzel.sweep([0.4, 0.8], block_size=40, iterations=[2, 4], max_blocks=20)
-    <SweepResult: 2 curves of 2 points>
+    <SweepResult: 2 curves with 4 points>
     """
 
     def __init__(self, text: str) -> None:
         document = json.loads(text)
         self.text = text
         """the result file"""
-        self.configuration: dict[str, Any] = document["configuration"]
-        """what decides the result"""
-        self.curves: list[Curve] = [_curve(curve, curve["points"]) for curve in document["curves"]]
-        """a curve for each combination of block size, units, algorithm and iterations, in this order"""
+        self.seed: int = document["seed"]
+        """of bits and noise"""
+        self.curves: list[Curve] = [_curve(curve) for curve in document["curves"]]
+        """sorted by block size, units, algorithm, iterations and quantiser"""
 
     @classmethod
     def read(cls, path: Union[str, os.PathLike[str]]) -> SweepResult:
-        """Read a result file.
+        """Read a result file, of an older version of the format too.
 
         :raises ValueError: it is not a whole, unaltered result
 
         >>> quarzel.sweep(1.0, block_size=40, max_blocks=20).save("result.json")
-        >>> quarzel.SweepResult.read("result.json").configuration["max_blocks"]
+        >>> quarzel.SweepResult.read("result.json").curves[0].points[0].blocks
         20
         """
         with open(path, encoding="utf-8", newline="") as file:
-            text = file.read()
-        _extension().check(text)
-        return cls(text)
+            return cls(_extension().renew(file.read()))
 
     def save(self, path: Union[str, os.PathLike[str]]) -> None:
         """Write the result file; the tool writes the same bytes for the same configuration.
@@ -127,7 +132,9 @@ class SweepResult:
         return pandas.DataFrame([_row(curve, point) for curve in self.curves for point in curve.points])
 
     def plot(self, axes: Any = None, rate: Literal["ber", "bler"] = "bler") -> Any:
-        """Draw the curves with their 95 % intervals; points without an error are left out. Needs Matplotlib.
+        """Draw a rate of the curves with 95 % intervals; a triangle is the upper bound where no error was seen.
+
+        ``quarzel.plot`` draws whole figures. Needs Matplotlib.
 
         :param axes: Matplotlib axes to draw into; new ones when not given
         :param rate: ``"bler"`` or ``"ber"``
@@ -136,25 +143,19 @@ class SweepResult:
 
         >>> axes = quarzel.sweep(1.0, block_size=40, max_blocks=20).plot(rate="ber")
         """
+        from ._figure import draw, new_figure
+
         if rate not in ("ber", "bler"):
             raise ValueError(f"there is no rate {rate!r}; choose 'ber' or 'bler'")
         if axes is None:
-            pyplot = _optional("matplotlib.pyplot", "plot needs Matplotlib; install it, or use 'quarzel plot'")
-            axes = pyplot.figure(layout="constrained").add_subplot()
-        for curve in self.curves:
-            seen = [point for point in curve.points if getattr(point, rate) > 0]
-            rates = np.array([getattr(point, rate) for point in seen])
-            intervals = np.array([getattr(point, f"{rate}_interval") for point in seen]).reshape(-1, 2)
-            bars = np.abs(intervals - rates[:, None]).T
-            axes.errorbar([point.ebn0_db for point in seen], rates, bars, marker="o", capsize=2, label=str(curve))
-        axes.set_yscale("log")
-        axes.set(xlabel="Eb/N0 [dB]", ylabel="bit error rate" if rate == "ber" else "block error rate")
-        axes.grid(True, which="both", alpha=0.3)
+            axes = new_figure().add_subplot()
+        draw(axes, [(str(curve), curve) for curve in self.curves], rate)
         axes.legend(fontsize="small")
         return axes
 
     def __repr__(self) -> str:
-        return f"<SweepResult: {len(self.curves)} curves of {len(self.configuration['ebn0_db'])} points>"
+        points = sum(len(curve.points) for curve in self.curves)
+        return f"<SweepResult: {len(self.curves)} curves with {points} points>"
 
 
 def sweep(
@@ -164,8 +165,8 @@ def sweep(
     units: Union[Units, Iterable[Units]] = 2,
     algorithm: Union[AlgorithmOrNumber, Iterable[AlgorithmOrNumber]] = "scaled-max-log",
     iterations: Union[int, Iterable[int]] = 6,
-    llr: Optional[float] = None,
-    scale: Optional[float] = None,
+    llr: Union[float, Iterable[float], None] = None,
+    scale: Union[float, Iterable[float], None] = None,
     seed: int = 1,
     max_blocks: int = 10000,
     max_block_errors: int = 100,
@@ -179,8 +180,8 @@ def sweep(
     :param ebn0_db: Eb/N0 of an information bit at rate 1/3, one or many, in dB
     :param block_size: K, one or many; likewise ``units``, ``algorithm`` and ``iterations``: every combination
         gives a curve
-    :param llr: units for a log-likelihood ratio of 1; 4 when neither this nor ``scale`` is given
-    :param scale: units for the amplitude 1 that is sent, instead of ``llr``
+    :param llr: units for a log-likelihood ratio of 1, one or many; 4 when neither this nor ``scale`` is given
+    :param scale: units for the amplitude 1 that is sent, one or many, instead of ``llr``
     :param max_blocks: a point ends after so many blocks,
     :param max_block_errors: or with this block error (0: however many there are),
     :param max_seconds: or after this time (0: however long it takes); the result then depends on the clock
@@ -198,7 +199,7 @@ def sweep(
     if llr is not None and scale is not None:
         raise ValueError("llr and scale are two quantisers; give one of them")
     kind = "llr" if scale is None else "scale"
-    units_of_one = scale if scale is not None else llr if llr is not None else 4
+    units_of_one = scale if scale is not None else llr if llr is not None else _core.llr_scale
     count = len(os.sched_getaffinity(0)) if threads is None else whole("threads", threads, 1, _MAX_THREADS)
     configuration = {
         "seed": whole("seed", seed, 0, _MAX_COUNT),
@@ -206,21 +207,20 @@ def sweep(
         "max_block_errors": whole("max_block_errors", max_block_errors, 0, _MAX_COUNT),
         "max_seconds": whole("max_seconds", max_seconds, 0, _MAX_COUNT),
         "per_iteration": bool(per_iteration),
-        "quantiser": {
-            "kind": kind,
-            "scale": real(kind, units_of_one),
-        },
+        "quantiser": kind,
+        "scale": [real(kind, value) for value in _listed(units_of_one)],
         "block_size": [whole("block_size", value, 40, 6144) for value in _listed(block_size)],
         "units": [choice("units", value, (2, 4, 8)) for value in _listed(units)],
         "algorithm": [algorithm_number(value) for value in _listed(algorithm)],
         "iterations": [whole("iterations", value, 1, 15) for value in _listed(iterations)],
         "ebn0_db": _decibels(ebn0_db),
     }
-    heads = _heads(configuration)
 
-    def tell(curve: int, point: str) -> None:
+    def tell(text: str) -> None:
         assert on_point is not None
-        on_point(heads[curve], _point(json.loads(point)))
+        head = json.loads(text)
+        (point,) = head["points"]
+        on_point(_curve({**head, "points": []}), _point(point))
 
     return SweepResult(_extension().run(json.dumps(configuration), count, tell if on_point else None))
 
@@ -259,27 +259,15 @@ def _listed(values: Any) -> list[Any]:
     return list(values) if isinstance(values, Iterable) and not isinstance(values, str) else [values]
 
 
-def _heads(configuration: dict[str, Any]) -> list[Curve]:
-    """The curves in the order of the engine, without points."""
-    return [
-        Curve(block_size, units, algorithms[algorithm], iterations)
-        for block_size in configuration["block_size"]
-        for units in configuration["units"]
-        for algorithm in configuration["algorithm"]
-        for iterations in configuration["iterations"]
-    ]
-
-
-def _curve(head: dict[str, Any], points: list[dict[str, Any]]) -> Curve:
-    return Curve(
-        head["block_size"], head["units"], algorithms[head["algorithm"]], head["iterations"],
-        [_point(point) for point in points],
-    )  # fmt: skip
+def _curve(values: dict[str, Any]) -> Curve:
+    points = [_point(point) for point in values["points"]]
+    return Curve(**{**values, "algorithm": algorithms[values["algorithm"]], "points": points})
 
 
 def _point(values: dict[str, Any]) -> Point:
     intervals = {name: tuple(values[name]) for name in ("ber_interval", "bler_interval")}
-    return Point(**{**values, **intervals})
+    known = {name: value for name, value in values.items() if name in Point.__dataclass_fields__}
+    return Point(**{**known, **intervals})
 
 
 def _row(curve: Curve, point: Point) -> dict[str, Any]:

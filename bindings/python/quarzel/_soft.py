@@ -9,6 +9,7 @@ from typing import Any, NamedTuple, Optional
 import numpy as np
 from numpy.typing import ArrayLike, NDArray
 
+from . import _core
 from ._checks import array_of, real
 
 
@@ -21,15 +22,17 @@ class SoftBlocks(NamedTuple):
     """of the blocks; () for a single one"""
 
 
-def quantise(llr: ArrayLike, scale: float = 4.0) -> NDArray[np.int8]:
-    """Turn log-likelihood ratios into soft values: multiply, round to the nearest, clip to -128 ... 127.
+def quantise(llr: ArrayLike, scale: float = _core.llr_scale) -> NDArray[np.int8]:
+    """Turn log-likelihood ratios or samples into soft values: multiply, round to the nearest, clip to -128 ... 127.
 
     Positive means bit 1, here as in the soft values: ``llr = log(P(bit = 1) / P(bit = 0))``. Change the sign first
-    where yours is the other way round.
+    where yours is the other way round. Halves are rounded to the even number. All hosts of the model have this
+    function.
 
     :param llr: real numbers in an array of any shape; infinities become the ends of the range
-    :param scale: units of 1/8 for a ratio of 1; the default is that of :func:`sweep`
-    :raises TypeError: the ratios are masked, or not real numbers
+    :param scale: units of 1/8 for a value of 1; the default, 4, is the best one for log-likelihood ratios. For
+        samples of +1 and -1 with noise of the variance v it is 8 / v
+    :raises TypeError: the values are masked, or not real numbers
     :raises ValueError: some are not a number (NaN), or the scale is not above 0
 
     >>> quarzel.quantise([-0.6, 0.0, 2.5, 1000.0])
@@ -38,12 +41,8 @@ def quantise(llr: ArrayLike, scale: float = 4.0) -> NDArray[np.int8]:
     array = array_of("llr", llr)
     if array.dtype.kind not in "fiu":
         raise TypeError(f"llr must hold real numbers, not {array.dtype}")
-    scaled = array * real("scale", scale)
-    wrong = np.count_nonzero(np.isnan(scaled))
-    if wrong:
-        raise ValueError(f"{wrong} of {scaled.size} ratios are not a number (NaN); 0 says that a bit is unknown")
-    quantised: NDArray[np.int8] = np.clip(np.rint(scaled), -128, 127).astype(np.int8)
-    return quantised
+    floating = np.float32 if array.dtype == np.float32 else np.float64
+    return _core.quantise(array.astype(floating, order="C", copy=False), real("scale", scale))
 
 
 def soft_blocks(systematic: ArrayLike, parity1: Optional[ArrayLike], parity2: Optional[ArrayLike]) -> SoftBlocks:

@@ -2,9 +2,9 @@
 #include "decode_arrays.hpp"
 
 #include <algorithm>
-#include <chrono>
 #include <vector>
 
+#include "look_for_signals.hpp"
 #include "raise.hpp"
 
 namespace quarzel::python {
@@ -36,24 +36,6 @@ ArrayBlocks blocksOf(const py::array& systematic, const py::array& parity1, cons
                              systematic.strides(0) / size,
                              systematic.strides(1) / size};
 }
-
-/// Whether the user has pressed Ctrl-C; looks every tenth of a second, since that takes the GIL.
-class LookForSignals {
-  public:
-    bool operator()() {
-        const auto now = std::chrono::steady_clock::now();
-        if (now < itsNext) {
-            return false;
-        }
-        itsNext = now + std::chrono::milliseconds(100);
-        const py::gil_scoped_acquire gil;
-        return PyErr_CheckSignals() != 0;
-    }
-
-  private:
-    std::chrono::steady_clock::time_point itsNext =
-        std::chrono::steady_clock::now() + std::chrono::milliseconds(100);
-};
 
 }  // namespace
 

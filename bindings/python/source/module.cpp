@@ -10,7 +10,9 @@
 
 #include "common/encoding.hpp"
 #include "common/host_core.hpp"
+#include "common/quantising.hpp"
 #include "decode_arrays.hpp"
+#include "lte_arrays.hpp"
 #include "plain_decode.hpp"
 #include "raise.hpp"
 #include "trace_arrays.hpp"
@@ -43,6 +45,22 @@ Bytes encode(const Bytes& bits) {
     }
     raise(outcome);
     return code;
+}
+
+/// @param values  an array of any shape, in C order
+template <class Real>
+py::array_t<std::int8_t> quantise(const py::array_t<Real, py::array::c_style>& values, double scale) {
+    py::array_t<std::int8_t> soft(std::vector<py::ssize_t>(values.shape(), values.shape() + values.ndim()));
+    const auto size = static_cast<std::size_t>(values.size());
+    const std::span<const Real> from(values.data(), size);
+    const std::span<std::int8_t> to(soft.mutable_data(), size);
+    quarzel::bindings::Outcome outcome;
+    {
+        const py::gil_scoped_release release;
+        outcome = quarzel::bindings::quantise(from, scale, to);
+    }
+    raise(outcome);
+    return soft;
 }
 
 std::vector<std::uint32_t> blockSizes() {
@@ -96,8 +114,12 @@ PYBIND11_MODULE(_core, module) {
         .def("close", [](HostCore& core) { raise(core.close()); });
     module.def("implementations", &quarzel::implementations);
     module.def("encode", &encode, py::arg("bits"));
+    module.attr("llr_scale") = quarzel::llrScale;
+    module.def("quantise", &quantise<float>, py::arg("values").noconvert(), py::arg("scale"));
+    module.def("quantise", &quantise<double>, py::arg("values").noconvert(), py::arg("scale"));
     module.def("block_sizes", &blockSizes);
     module.def("qpp", &qpp, py::arg("K"));
     module.def("layout", &layout, py::arg("K"), py::arg("units"));
     module.def("signals", &signals);
+    addLte(module);
 }

@@ -2,14 +2,15 @@
 // The extension behind quarzel.sweep: a configuration in, a result out, both as the JSON of the tool's files.
 #include <pybind11/functional.h>
 
+#include <cmath>
 #include <functional>
 #include <optional>
 #include <string>
 
 #include "common/outcome.hpp"
 #include "raise.hpp"
-#include "sweep/document.hpp"
 #include "sweep/error.hpp"
+#include "sweep/point_json.hpp"
 #include "sweep/run.hpp"
 
 namespace py = pybind11;
@@ -20,8 +21,8 @@ using namespace quarzel::sweep;
 using quarzel::bindings::BindingError;
 using quarzel::bindings::Fault;
 
-/// Called with the number of a curve and the JSON of a point of it.
-using OnPoint = std::function<void(std::size_t, const std::string&)>;
+/// Called with the JSON of a curve that has one point.
+using OnPoint = std::function<void(const std::string&)>;
 
 /// Do something with the engine of the sweep. What it throws becomes what Python raises.
 template <class Work>
@@ -72,9 +73,7 @@ class PythonObserver : public Observer {
   private:
     void tell(const Dispatcher& dispatcher) {
         if (itsOnPoint) {
-            const Configuration& configuration = dispatcher.configuration();
-            itsOnPoint(itsNext / configuration.ebN0.size(),
-                       pointText(configuration, itsNext, dispatcher.stateOf(itsNext)));
+            itsOnPoint(pointText(dispatcher.plan().points[itsNext].setup, dispatcher.stateOf(itsNext)));
         }
     }
 
@@ -83,15 +82,37 @@ class PythonObserver : public Observer {
     std::optional<py::error_already_set> itsError;
 };
 
+Configuration configurationFrom(const Json& json) {
+    Configuration configuration;
+    json.at("seed").get_to(configuration.seed);
+    json.at("max_blocks").get_to(configuration.stopRule.maxBlocks);
+    json.at("max_block_errors").get_to(configuration.stopRule.maxBlockErrors);
+    json.at("max_seconds").get_to(configuration.stopRule.maxSeconds);
+    json.at("per_iteration").get_to(configuration.perIteration);
+    json.at("block_size").get_to(configuration.blockSizes);
+    json.at("units").get_to(configuration.units);
+    json.at("algorithm").get_to(configuration.algorithms);
+    json.at("iterations").get_to(configuration.iterations);
+    configuration.quantisers.clear();
+    for (const Json& scale : json.at("scale")) {
+        configuration.quantisers.push_back(
+            {quantiserKindOf(json.at("quantiser").get<std::string>()).value(), scale.get<double>()});
+    }
+    for (const double value : json.at("ebn0_db")) {
+        configuration.ebN0.push_back({static_cast<std::int32_t>(std::lround(value * 1e6))});
+    }
+    return configuration;
+}
+
 std::string run(const std::string& configurationText, unsigned threads, const OnPoint& onPoint) {
     PythonObserver observer(onPoint);
     std::string text;
     raising([&] {
         const Configuration configuration = configurationFrom(Json::parse(configurationText));
-        Dispatcher dispatcher(Plan{configuration, {}, {}, {}});
+        Dispatcher dispatcher(planOf(configuration));
         ThreadWorkers(threads).run(dispatcher, observer);
         if (dispatcher.hasFinished()) {
-            text = resultText({configuration, dispatcher.states()});
+            text = resultText({configuration.seed, dispatcher.points(), {}});
         }
     });
     if (observer.error()) {
@@ -100,8 +121,10 @@ std::string run(const std::string& configurationText, unsigned threads, const On
     return text;
 }
 
-void check(const std::string& resultText) {
-    raising([&] { readResult(resultText); });
+std::string renew(const std::string& text) {
+    std::string renewed;
+    raising([&] { renewed = resultText(readResult(text)); });
+    return renewed;
 }
 
 }  // namespace
@@ -109,7 +132,9 @@ void check(const std::string& resultText) {
 PYBIND11_MODULE(_sweep, module) {
     module.doc() = "The extension behind quarzel.sweep; use that.";
     module.def("run", &run, py::arg("configuration"), py::arg("threads"), py::arg("on_point"),
-               "Run a sweep. on_point(curve, point) is called as points end.");
-    module.def("check", &check, py::arg("text"),
-               "Raise a ValueError unless a text is a whole, unaltered result.");
+               "Run a sweep. on_point(curve), with one point, is called as points end.");
+    module.def(
+        "renew", &renew, py::arg("text"),
+        "A result in the present version of the format. Raises a ValueError unless the text is whole and "
+        "unaltered.");
 }

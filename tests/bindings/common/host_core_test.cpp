@@ -296,6 +296,7 @@ TEST(HostCore, HandsOverNoPassAfterAFailure) {
 TEST(Guarded, LetsNothingThrough) {
     EXPECT_EQ(guarded([] { throw std::bad_alloc(); }).fault, Fault::memory);
     EXPECT_EQ(guarded([] { throw 1; }).fault, Fault::model);
+    EXPECT_EQ(guarded([] { throw std::invalid_argument("odd"); }).fault, Fault::value);
     EXPECT_EQ(guarded([] { throw quarzel::Error("no memory", 99); }).fault, Fault::memory);
     const Outcome outcome = guarded([] { throw std::runtime_error("odd"); });
     EXPECT_EQ(outcome.fault, Fault::model);

@@ -1,6 +1,7 @@
 # SPDX-License-Identifier: MIT
 """What the tests of the Python package share."""
 
+import json
 import os
 import random
 from pathlib import Path
@@ -13,7 +14,7 @@ hypothesis.settings.register_profile("quick", max_examples=40, deadline=None, da
 hypothesis.settings.load_profile("quick")
 
 # A build without sweeps has nothing to simulate with.
-collect_ignore = [] if os.environ["QUARZEL_SWEEP"] == "ON" else ["test_simulation.py"]
+collect_ignore = [] if os.environ["QUARZEL_SWEEP"] == "ON" else ["test_figure.py", "test_simulation.py"]
 
 
 @pytest.fixture
@@ -35,6 +36,17 @@ def tool():
     if "QUARZEL_TOOL" not in os.environ:
         pytest.skip("the tool has not been built")
     return os.environ["QUARZEL_TOOL"]
+
+
+def stored_cases(name):
+    """The lines of a file of stored cases."""
+    lines = (Path(__file__).parents[2] / "data" / name).read_text().splitlines()
+    return [json.loads(line) for line in lines]
+
+
+def bits_of_hex(digits, count):
+    """The first bits of hexadecimal digits, highest first."""
+    return np.unpackbits(np.frombuffer(bytes.fromhex(digits), np.uint8))[:count]
 
 
 def soft_of(code, amplitude=8):

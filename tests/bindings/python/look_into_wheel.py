@@ -45,6 +45,8 @@ def main():
     for file in Path(folder.name, "quarzel").glob("*.so*" if "--alone" in options else "_core.*.so"):
         missing = [name for name in needed(file) if not EVERYWHERE.fullmatch(name) and f"quarzel/{name}" not in names]
         expect(not missing, f"lacks {', '.join(missing)} for {file.name}")
+    for file in Path(folder.name, "quarzel").glob("lib*.so.*"):
+        expect(f"quarzel/licences/{file.name}.txt" in names, f"does not carry the licence of {file.name}")
     print(f"ok: {Path(wheel).name}")
 
 

@@ -256,12 +256,14 @@ def test_settings_cannot_be_set():
         named.units = 4
 
 
-def test_the_package_is_the_only_public_module():
+def test_the_package_and_its_coding_chain_are_the_only_public_modules():
     package = Path(quarzel.__file__).parent
-    sources = (Path(__file__).parents[3] / "bindings/python/quarzel").glob("*.py")
-    assert all((package / source.name).exists() and source.name.startswith("_") for source in sources)
-    for name in quarzel.__all__:
-        assert getattr(getattr(quarzel, name), "__module__", "quarzel") in ("quarzel", "typing")
+    sources = [source.name for source in (Path(__file__).parents[3] / "bindings/python/quarzel").glob("*.py")]
+    assert all((package / name).exists() for name in sources)
+    assert [name for name in sources if not name.startswith("_")] == ["lte.py"]
+    for module in (quarzel, quarzel.lte):
+        for name in module.__all__:
+            assert getattr(getattr(module, name), "__module__", module.__name__) in (module.__name__, "typing")
 
 
 def test_quantise_rounds_and_clips():
@@ -269,12 +271,22 @@ def test_quantise_rounds_and_clips():
     ratios = np.array([np.inf, -np.inf, 0.375], dtype=np.float32)
     assert quarzel.quantise(ratios, scale=8).tolist() == [127, -128, 3]
     assert quarzel.quantise([]).dtype == np.int8
+    assert quarzel.quantise(2.5).shape == ()
+    assert quarzel.quantise([0.125, 0.375, -0.125, -0.375]).tolist() == [0, 2, 0, -2]
+
+
+@pytest.mark.parametrize("dtype", [np.float16, np.float32, np.float64, np.longdouble, ">f4", np.int8, np.uint32])
+def test_quantise_takes_every_real_type_and_layout(dtype):
+    ratios = np.arange(24).astype(dtype).reshape(2, 3, 4)
+    expected = np.clip(4 * np.arange(24).reshape(2, 3, 4), -128, 127)
+    assert (quarzel.quantise(ratios) == expected).all()
+    assert (quarzel.quantise(ratios[:, ::-2].T) == expected[:, ::-2].T).all()
 
 
 @pytest.mark.parametrize(
     "ratios, scale, error, text",
     [
-        ([1.0, float("nan")], 4, ValueError, r"1 of 2 ratios are not a number \(NaN\)"),
+        ([1.0, float("nan")], 4, ValueError, r"1 of 2 values are not a number \(NaN\); 0 says that a bit is unknown"),
         ([1.0], 0, ValueError, "scale must be above 0 and finite, not 0"),
         ([1.0], float("inf"), ValueError, "scale must be above 0 and finite, not inf"),
         ([1.0], "4", TypeError, "scale must be a number, not str"),

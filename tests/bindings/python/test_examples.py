@@ -11,7 +11,7 @@ import pytest
 
 import quarzel
 
-NEEDS = {"SweepResult.plot": "matplotlib", "SweepResult.to_dataframe": "pandas"}
+NEEDS = {"plot": "matplotlib", "SweepResult.plot": "matplotlib", "SweepResult.to_dataframe": "pandas"}
 
 
 def documented():
@@ -24,6 +24,9 @@ def documented():
             for method, code in vars(thing).items():
                 if not method.startswith("_") and (inspect.isfunction(code) or isinstance(code, classmethod)):
                     yield f"{name}.{method}", getattr(thing, method)
+    for name in quarzel.lte.__all__:
+        if inspect.isfunction(getattr(quarzel.lte, name)):
+            yield f"lte.{name}", getattr(quarzel.lte, name)
 
 
 @pytest.mark.parametrize("name, thing", documented(), ids=[name for name, _ in documented()])

@@ -1,8 +1,10 @@
 # SPDX-License-Identifier: MIT
 """Sweeps: the same file as the tool's, callbacks, interruptions, refusals, pictures."""
 
+import json
 import subprocess
 import sys
+from pathlib import Path
 
 import numpy as np
 import pytest
@@ -35,8 +37,8 @@ def test_threads_do_not_matter(result):
 
 def test_rates_are_those_of_decoding_one_by_one(result):
     assert [str(curve) for curve in result.curves][:2] == [
-        "K = 40, 2 units, max-log, 4 iterations",
-        "K = 40, 2 units, max-star, 4 iterations",
+        "K = 40, 2 units, max-log, 4 iterations, llr 4",
+        "K = 40, 2 units, max-star, 4 iterations, llr 4",
     ]
     for curve in result.curves:
         assert (curve.ebn0_db == [0.4, 1.2]).all()
@@ -46,6 +48,19 @@ def test_rates_are_those_of_decoding_one_by_one(result):
             low, high = point.bler_interval
             assert low < point.bler < high
     assert (result.curves[0].bler > result.curves[1].bler).all(), "max-log loses against max-star"
+
+
+def test_quantisers_are_a_dimension():
+    result = quarzel.sweep(1.0, block_size=40, max_blocks=100, llr=[2, 0.5])
+    assert [(curve.quantiser, curve.scale) for curve in result.curves] == [("llr", 0.5), ("llr", 2)]
+    assert quarzel.sweep(1.0, block_size=40, max_blocks=100, llr=2).curves == result.curves[1:]
+
+
+def test_a_result_of_an_older_version_is_read():
+    old = quarzel.SweepResult.read(Path(__file__).parents[2] / "sweep" / "data" / "small_sweep.json")
+    assert json.loads(old.text)["version"] == 2
+    assert (old.seed, len(old.curves), old.curves[0].points[0].blocks) == (7, 4, 98)
+    assert old.curves[0].scale == 8
 
 
 def test_points_are_told_in_order_as_they_end(result):

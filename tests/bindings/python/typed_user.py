@@ -45,3 +45,14 @@ for name in quarzel.algorithms:
     result = quarzel.sweep([0.4, 0.8], units=[2, 8], algorithm=name, on_point=told)
     rates: NDArray[np.float64] = result.curves[0].ber
     result.plot(rate="wer")  # type: ignore[arg-type]
+
+scheme: quarzel.lte.Scheme = "64qam"
+blocks, filler = quarzel.lte.segment([0, 1, 1])
+streams: NDArray[np.uint8] = quarzel.lte.turbo_encode(blocks[0], filler)
+buffer = np.zeros(quarzel.lte.whole_buffer_size(40), np.int16)
+recovered: NDArray[np.int8] = quarzel.lte.rate_recover(soft, 40, rv=2, buffer=buffer)
+quarzel.lte.rate_match(streams, 96, rv=4)  # type: ignore[arg-type]
+ratios: NDArray[np.float64] = quarzel.lte.demodulate(quarzel.lte.modulate([0] * 6, scheme), scheme, 0.1, "exact")
+quarzel.lte.demodulate([1j], "8psk", 0.1)  # type: ignore[arg-type]
+decided, ok, buffers = quarzel.lte.decode_transport_block(soft, 40)
+decided, ok, buffers = quarzel.lte.decode_transport_block(soft, 40, rv=2, buffers=buffers)

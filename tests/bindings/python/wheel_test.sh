@@ -18,17 +18,24 @@ cd "$work/empty"
 for page in "$@"; do
     "$python" "$source/tests/bindings/run_page.py" "$source/docs/$page.md"
 done
-rows=$("$python" "$source/examples/python_waterfall.py" --blocks 20 | wc -l)
-if [ "$rows" -ne 12 ]; then
-    echo "the example printed $rows lines, not a heading and 11 points" >&2
-    exit 1
-fi
-echo "ok: the example"
+# run_example NAME BLOCKS POINTS
+run_example() {
+    rows=$("$python" "$source/examples/$1.py" --blocks "$2" | wc -l)
+    if [ "$rows" -ne $(($3 + 1)) ]; then
+        echo "$1.py printed $rows lines, not a heading and $3 points" >&2
+        exit 1
+    fi
+    echo "ok: $1.py"
+}
+run_example python_waterfall 20 11
+run_example python_throughput 2 27
 # Matplotlib is large, and nothing but the picture needs it.
 if "$python" -c "import matplotlib" 2>/dev/null; then
-    "$python" "$source/examples/python_waterfall.py" --blocks 2 --picture waterfall.svg >/dev/null
-    grep -q "</svg>" waterfall.svg
-    echo "ok: the picture of the example"
+    for name in python_waterfall python_throughput; do
+        "$python" "$source/examples/$name.py" --blocks 2 --picture $name.svg >/dev/null
+        grep -q "</svg>" $name.svg
+    done
+    echo "ok: the pictures of the examples"
 else
-    echo "not tried, for want of Matplotlib: the picture of the example"
+    echo "not tried, for want of Matplotlib: the pictures of the examples"
 fi

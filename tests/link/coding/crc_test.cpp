@@ -49,6 +49,27 @@ TEST(Crc, IsTheRemainderOfLongDivisionAtEveryLength) {
     }
 }
 
+TEST(Crc, IsWrittenForEightBlocksAtOnce) {
+    std::mt19937 random = quarzel::test::seededRandom();
+    for (const Case& one : cases()) {
+        for (std::size_t size = 0; size < 100; ++size) {
+            Bytes together(size);
+            std::generate(together.begin(), together.end(),
+                          [&] { return static_cast<std::uint8_t>(random()); });
+            Bytes parity(crcLength(one.crc));
+            writeCrc(one.crc, together, parity);
+            for (unsigned block = 0; block < 8; ++block) {
+                Bytes alone(together.begin(), together.end());
+                alone.insert(alone.end(), parity.begin(), parity.end());
+                for (std::uint8_t& bit : alone) {
+                    bit = bit >> block & 1U;
+                }
+                ASSERT_TRUE(crcHolds(one.crc, alone)) << size << ' ' << block;
+            }
+        }
+    }
+}
+
 TEST(Crc, HoldsUntilOneBitIsWrong) {
     std::mt19937 random = quarzel::test::seededRandom();
     for (const Case& one : cases()) {

@@ -56,4 +56,15 @@ TEST(Modulation, NamesTheBitsThatFit) {
                 testing::ThrowsMessage<std::invalid_argument>("there must be 12 bits, not 11"));
 }
 
+TEST(Modulation, HasANameForEachScheme) {
+    EXPECT_EQ(modulationOf("bpsk"), Modulation::bpsk);
+    EXPECT_EQ(modulationOf("qpsk"), Modulation::qpsk);
+    EXPECT_EQ(modulationOf("16qam"), Modulation::qam16);
+    EXPECT_EQ(modulationOf("64qam"), Modulation::qam64);
+    EXPECT_EQ(modulationOf("256qam"), Modulation::qam256);
+    EXPECT_THAT([] { modulationOf("8psk"); },
+                testing::ThrowsMessage<std::invalid_argument>(
+                    "there is no modulation '8psk'; choose one of bpsk, qpsk, 16qam, 64qam, 256qam"));
+}
+
 }  // namespace

@@ -8,7 +8,6 @@
 #include <xtensor/xadapt.hpp>
 #include <xtensor/xnpy.hpp>
 
-#include "captures/npy_header.hpp"
 #include "files/output_file.hpp"
 #include "tool_error.hpp"
 
@@ -26,7 +25,11 @@ void PackedBits::set(std::size_t block, const unsigned char* bits) {
 
 PackedBits readBits(std::istream& stream, const std::string& file, std::size_t blocks,
                     std::size_t bytesPerBlock) {
-    const NpyHeader header = readNpyHeader(stream, file);
+    return readBitsAfter(readNpyHeader(stream, file), stream, file, blocks, bytesPerBlock);
+}
+
+PackedBits readBitsAfter(const NpyHeader& header, std::istream& stream, const std::string& file,
+                         std::size_t blocks, std::size_t bytesPerBlock) {
     if (header.type != "|u1") {
         throw fileError(file, fmt::format("holds values of type '{}'", header.type),
                         "save bits as uint8 with numpy.packbits(bits, axis=1)");
@@ -38,10 +41,13 @@ PackedBits readBits(std::istream& stream, const std::string& file, std::size_t b
             file, "has shape " + shapeText(header.shape),
             fmt::format("for this capture it must be {}, that is (blocks, K/8)", shapeText(shape)));
     }
-    PackedBits bits(blocks, 8 * bytesPerBlock);
-    if (!stream.read(reinterpret_cast<char*>(bits.bytes.data()),
-                     static_cast<std::streamsize>(bits.bytes.size()))) {
-        throw fileError(file, "ends within its array", "copy it again, it was cut short");
+    PackedBits bits(0, 8 * bytesPerBlock);
+    std::vector<char> row(bytesPerBlock);
+    for (std::size_t block = 0; block < blocks; ++block) {
+        if (!stream.read(row.data(), static_cast<std::streamsize>(row.size()))) {
+            throw fileError(file, "ends within its array", "copy it again, it was cut short");
+        }
+        bits.bytes.insert(bits.bytes.end(), row.begin(), row.end());
     }
     requireEnd(stream, file);
     return bits;

@@ -7,6 +7,8 @@
 #include <string>
 #include <vector>
 
+#include "captures/npy_header.hpp"
+
 namespace quarzel::tool {
 
 /// The information bits of code blocks, 8 to a byte, the first bit highest: the order of numpy.packbits.
@@ -30,6 +32,10 @@ struct PackedBits {
 /// @throws ToolError when it is not well-formed or has another type or shape
 PackedBits readBits(std::istream& stream, const std::string& file, std::size_t blocks,
                     std::size_t bytesPerBlock);
+
+/// The same, whose header was read. Memory grows with what the file holds, not with what its header claims.
+PackedBits readBitsAfter(const NpyHeader& header, std::istream& stream, const std::string& file,
+                         std::size_t blocks, std::size_t bytesPerBlock);
 
 /// The bytes of an npy file of uint8 values of shape (blocks, bytesPerBlock).
 std::string npyOf(const PackedBits& bits);

@@ -11,6 +11,7 @@
 
 #include "captures/capture_readers.hpp"
 #include "options/block_sizes.hpp"
+#include "options/quantiser_options.hpp"
 #include "tool_error.hpp"
 
 namespace quarzel::tool {
@@ -50,15 +51,35 @@ using Reader = io::CSVReader<3, io::trim_chars<' ', '\t'>, io::no_quote_escape<'
 
 constexpr std::array<const char*, 3> columns = {"systematic", "parity1", "parity2"};
 
-std::int32_t toInteger(const char* field, std::size_t column, unsigned line, const std::string& file) {
-    std::int32_t value = 0;
+/// A field as a number of the type Number; nothing when it is no such number.
+template <class Number>
+std::optional<Number> toNumber(const char* field) {
+    Number value = 0;
     const char* const end = field + std::strlen(field);
     const auto [stop, error] = std::from_chars(field, end, value);
-    if (error != std::errc() || stop != end) {
-        throw fileError(file, fmt::format("line {}: {} is '{:.20}'", line, columns[column], field),
-                        "give a whole number of at most 32 bits, in units of 1/8");
+    return error == std::errc() && stop == end && value == value ? std::optional(value) : std::nullopt;
+}
+
+/// The soft value of a field; nothing when it holds none.
+/// @param scale  there when fields are real numbers
+std::optional<std::int32_t> softOf(const char* field, std::optional<double> scale) {
+    if (!scale) {
+        return toNumber<std::int32_t>(field);
     }
-    return value;
+    const std::optional<double> value = toNumber<double>(field);
+    if (!value) {
+        return std::nullopt;
+    }
+    std::int8_t soft = 0;
+    quantise(std::span(&*value, 1), std::span(&soft, 1), *scale);
+    return soft;
+}
+
+/// What to do about a field that holds no soft value.
+std::string remedyOf(std::optional<double> scale) {
+    return scale ? "give a real number, 0 for a bit that is unknown"
+                 : "give a whole number of at most 32 bits, in units of 1/8; for real numbers " +
+                       realNumbersRemedy();
 }
 
 /// A block while its lines come in.
@@ -88,7 +109,7 @@ struct OpenBlock {
     }
 };
 
-Capture readBlocks(Reader& reader, const std::string& file) {
+Capture readBlocks(Reader& reader, const std::string& file, std::optional<double> scale) {
     Capture capture;
     OpenBlock block;
     unsigned lastLine = 0;
@@ -101,7 +122,13 @@ Capture readBlocks(Reader& reader, const std::string& file) {
         }
         lastLine = line;
         for (std::size_t column = 0; column < 3; ++column) {
-            block.streams[column].push_back(toInteger(fields[column], column, line, file));
+            const std::optional<std::int32_t> soft = softOf(fields[column], scale);
+            if (!soft) {
+                throw fileError(file,
+                                fmt::format("line {}: {} is '{:.20}'", line, columns[column], fields[column]),
+                                remedyOf(scale));
+            }
+            block.streams[column].push_back(*soft);
         }
     }
     block.close(capture, file);
@@ -110,13 +137,13 @@ Capture readBlocks(Reader& reader, const std::string& file) {
 
 }  // namespace
 
-Capture readCsvCapture(std::istream& stream, const std::string& file) {
+Capture readCsvCapture(std::istream& stream, const std::string& file, std::optional<double> scale) {
     constexpr const char* lineRemedy = "give systematic,parity1,parity2 in every line";
     Capture capture;
     try {
         Reader reader(file, std::make_unique<TextSource>(stream, file));
         reader.read_header(io::ignore_no_column, columns[0], columns[1], columns[2]);
-        capture = readBlocks(reader, file);
+        capture = readBlocks(reader, file, scale);
     } catch (const io::error::too_few_columns& error) {
         throw fileError(file, fmt::format("line {}: fewer than 3 values", error.file_line), lineRemedy);
     } catch (const io::error::too_many_columns& error) {

@@ -6,8 +6,9 @@
 
 namespace quarzel::tool {
 
-Capture readCapture(std::istream& stream, const std::string& file) {
-    Capture capture = isNpy(stream, file) ? readNpyCapture(stream, file) : readCsvCapture(stream, file);
+Capture readCapture(std::istream& stream, const std::string& file, std::optional<double> scale) {
+    Capture capture =
+        isNpy(stream, file) ? readNpyCapture(stream, file, scale) : readCsvCapture(stream, file, scale);
     capture.file = file;
     return capture;
 }

@@ -4,6 +4,7 @@
 #include <cstddef>
 #include <cstdint>
 #include <istream>
+#include <optional>
 #include <span>
 #include <string>
 #include <vector>
@@ -29,11 +30,12 @@ struct Capture {
     }
 };
 
-/// Read a capture: an npy file of int8, int16 or int32 values of shape (blocks, 3, K + 4), or CSV. Memory
-/// grows with what the file holds, not with what its header claims.
+/// Read a capture: an npy file of shape (blocks, 3, K + 4), or CSV. Memory grows with what the file holds,
+/// not with what its header claims.
 ///
-/// @param file  its name, also for error messages; one that ends with .npy tells the format
+/// @param file   its name, also for error messages; one that ends with .npy tells the format
+/// @param scale  without it, the file holds soft values; with it, real numbers that are quantised with it
 /// @throws ToolError when it is not well-formed, holds no block or has a K that LTE does not have
-Capture readCapture(std::istream& stream, const std::string& file);
+Capture readCapture(std::istream& stream, const std::string& file, std::optional<double> scale = {});
 
 }  // namespace quarzel::tool

@@ -1,11 +1,15 @@
 // SPDX-License-Identifier: MIT
 #include <fmt/format.h>
 
+#include <algorithm>
+#include <array>
+#include <concepts>
 #include <cstdint>
 
 #include "captures/capture_readers.hpp"
 #include "captures/npy_header.hpp"
 #include "options/block_sizes.hpp"
+#include "options/quantiser_options.hpp"
 #include "tool_error.hpp"
 
 namespace quarzel::tool {
@@ -13,9 +17,10 @@ namespace quarzel::tool {
 namespace {
 
 /// Read blocks of `values` elements of the type Element, in the machine's (little-endian) byte order.
+/// @param scale  that of real numbers
 template <class Element>
 std::vector<std::int32_t> readBlocks(std::istream& stream, std::uint64_t count, std::size_t values,
-                                     const std::string& file) {
+                                     const std::string& file, double scale) {
     std::vector<std::int32_t> soft;
     std::vector<Element> elements(values);
     const auto bytes = static_cast<std::streamsize>(values * sizeof(Element));
@@ -24,23 +29,61 @@ std::vector<std::int32_t> readBlocks(std::istream& stream, std::uint64_t count, 
             throw fileError(file, fmt::format("ends within block {} of {}", block + 1, count),
                             "copy it again, it was cut short");
         }
-        soft.insert(soft.end(), elements.begin(), elements.end());
+        if constexpr (std::floating_point<Element>) {
+            std::vector<std::int8_t> quantised(values);
+            try {
+                quantise(elements, quantised, scale);
+            } catch (const std::invalid_argument&) {
+                throw fileError(
+                    file,
+                    fmt::format("block {} of {} has values that are not a number (NaN)", block + 1, count),
+                    "give 0 for a bit that is unknown");
+            }
+            soft.insert(soft.end(), quantised.begin(), quantised.end());
+        } else {
+            soft.insert(soft.end(), elements.begin(), elements.end());
+        }
     }
     return soft;
 }
 
+/// A type of elements that captures may have.
+struct Type {
+    const char* name;  ///< in headers
+    bool isReal;
+    std::vector<std::int32_t> (*read)(std::istream&, std::uint64_t, std::size_t, const std::string&, double);
+};
+
+constexpr std::array<Type, 5> types = {{{"|i1", false, &readBlocks<std::int8_t>},
+                                        {"<i2", false, &readBlocks<std::int16_t>},
+                                        {"<i4", false, &readBlocks<std::int32_t>},
+                                        {"<f4", true, &readBlocks<float>},
+                                        {"<f8", true, &readBlocks<double>}}};
+
+/// The type that a header names.
+/// @param isScaled  whether there is a scale, as real numbers need it
+const Type& typeOf(const NpyHeader& header, const std::string& file, bool isScaled) {
+    const auto type = std::find_if(types.begin(), types.end(),
+                                   [&header](const Type& known) { return known.name == header.type; });
+    const std::string problem = fmt::format("holds values of type '{}'", header.type);
+    if (type == types.end()) {
+        throw fileError(file, problem,
+                        "save soft values as int8, int16 or int32, real numbers as float32 or float64, "
+                        "little-endian");
+    }
+    if (type->isReal != isScaled) {
+        throw fileError(
+            file, problem,
+            isScaled ? "integers are soft values already; leave out --llr and --scale" : realNumbersRemedy());
+    }
+    return *type;
+}
+
 }  // namespace
 
-Capture readNpyCapture(std::istream& stream, const std::string& file) {
+Capture readNpyCapture(std::istream& stream, const std::string& file, std::optional<double> scale) {
     const NpyHeader header = readNpyHeader(stream, file);
-    const auto reader = header.type == "|i1"   ? &readBlocks<std::int8_t>
-                        : header.type == "<i2" ? &readBlocks<std::int16_t>
-                        : header.type == "<i4" ? &readBlocks<std::int32_t>
-                                               : nullptr;
-    if (reader == nullptr) {
-        throw fileError(file, fmt::format("holds values of type '{}'", header.type),
-                        "save int8, int16 or int32 (little-endian), with numpy's astype('<i2') for example");
-    }
+    const Type& type = typeOf(header, file, scale.has_value());
     requireCOrder(header, file);
     if (header.shape.size() != 3 || header.shape[1] != 3) {
         throw fileError(
@@ -52,7 +95,8 @@ Capture readNpyCapture(std::istream& stream, const std::string& file) {
     if (header.shape[0] == 0) {
         throw fileError(file, "holds no block", "record at least one");
     }
-    capture.soft = reader(stream, header.shape[0], 3 * capture.positions(), file);
+    capture.soft =
+        type.read(stream, header.shape[0], 3 * capture.positions(), file, scale.value_or(llrScale));
     requireEnd(stream, file);
     return capture;
 }

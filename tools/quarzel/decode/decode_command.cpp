@@ -19,6 +19,7 @@
 #include "files/input_file.hpp"
 #include "files/output_file.hpp"
 #include "options/core_options.hpp"
+#include "options/quantiser_options.hpp"
 #include "options/threads_option.hpp"
 #include "tool_error.hpp"
 #include "trace/trace_file.hpp"
@@ -32,6 +33,7 @@ struct DecodeOptions {
     std::string capture;
     std::optional<std::string> reference;
     std::optional<std::string> output;
+    std::optional<double> scale;  ///< of real numbers
     CoreOptions core;
     TraceOptions trace;
     unsigned threads = allCores();
@@ -42,12 +44,17 @@ constexpr const char* description = "Decode the code blocks of a capture";
 
 constexpr const char* footer = R"(Soft values:
   Integers in units of 1/8: 8 stands for 1.0. The sign is the bit: POSITIVE
-  MEANS BIT 1, negative means bit 0. A log-likelihood ratio ln(P(1)/P(0)) times
-  8 fits. The core takes -128 to 127; it saturates what lies outside, with a
-  warning at the first such value.
+  MEANS BIT 1, negative means bit 0. The core takes -128 to 127; it saturates
+  what lies outside, with a warning at the first such value.
+
+Real numbers:
+  Log-likelihood ratios ln(P(1)/P(0)) become soft values with --llr 4. Samples
+  of +1 for bit 1 and -1 for bit 0 with noise of the variance v need --scale S
+  with S = 8 / v. Both multiply, round to the nearest and clip to -128..127.
 
 Files:
-  CAPTURE  npy (numpy.save) of int8, int16 or int32, shape (blocks, 3, K + 4).
+  CAPTURE  npy (numpy.save) of int8, int16 or int32, or of float32 or float64
+           with --llr or --scale. Its shape is (blocks, 3, K + 4).
            Axis 1 is the systematic stream, the parity of the first and the
            parity of the second constituent code. The last 4 positions hold the
            12 tail values in the order of 3GPP TS 36.212, section 5.1.3.2.2.
@@ -56,7 +63,8 @@ Files:
            a line, an empty line between blocks.
   BITS     npy of uint8, shape (blocks, K/8): 8 bits to a byte, the first bit
            highest, as numpy.packbits(bits, axis=1) makes them.
-  OUT      the same. It is written whole or not at all.
+  OUT      the same. It is written whole or not at all. With - it goes to
+           standard output, and the report to standard error.
   FILE     every value of every trellis step of the passes traced, as text for
            'quarzel trace-diff' or as rows of block, pass, step, signal, state,
            raw and real value. It is written whole or not at all, too.
@@ -64,11 +72,13 @@ Files:
 Examples:
   quarzel decode capture.npy --units 8 --reference sent.npy -o decided.npy
   quarzel decode capture.npy --units 8 --trace 12 --trace-block 5
+  quarzel decode ratios.npy --llr 4
 
   The first decodes capture.npy as a core with 8 processing units does, compares
   the decisions with the bits that were sent and keeps them in decided.npy. Bit
   errors are a result, not a failure: the exit code is 0. The second prints the
-  trace of 12 passes, which are 6 iterations, of the fifth block.
+  trace of 12 passes, which are 6 iterations, of the fifth block. The third
+  decodes log-likelihood ratios.
 )";
 
 /// Throw when the file could not be written, or writing it would replace a file that is read.
@@ -92,6 +102,10 @@ void checkOutputs(const DecodeOptions& options) {
         return;
     }
     if (trace.isToStandardOutput()) {
+        if (options.output && isStandardStream(*options.output)) {
+            throw ToolError(ExitCode::usage, "-o", "the trace goes to standard output",
+                            "name a file for it with --trace-file");
+        }
         if (options.json) {
             throw ToolError(ExitCode::usage, "--json", "the trace goes to standard output",
                             "name a file for it with --trace-file");
@@ -152,7 +166,7 @@ PackedBits decodeBlocks(const Capture& capture, const DecodeOptions& options, Tr
 void decode(const DecodeOptions& options, std::ostream& results) {
     checkOutputs(options);
     std::ifstream soft = openInput(options.capture);
-    const Capture capture = readCapture(soft, options.capture);
+    const Capture capture = readCapture(soft, options.capture, options.scale);
     std::optional<PackedBits> reference;
     if (options.reference) {
         std::ifstream bits = openInput(*options.reference);
@@ -172,9 +186,10 @@ void decode(const DecodeOptions& options, std::ostream& results) {
     if (reference) {
         report.errors = countErrors(decisions, *reference);
     }
-    // Standard output that holds a trace holds nothing else.
-    const bool isTraceInResults = trace != nullptr && options.trace.isToStandardOutput();
-    (options.json ? printJson : printText)(isTraceInResults ? std::cerr : results, report);
+    // Standard output that holds a trace or the decisions holds nothing else.
+    const bool isTaken = (trace != nullptr && options.trace.isToStandardOutput()) ||
+                         (options.output && isStandardStream(*options.output));
+    (options.json ? printJson : printText)(isTaken ? std::cerr : results, report);
 }
 
 }  // namespace
@@ -184,6 +199,7 @@ void addDecodeCommand(CLI::App& app, std::ostream& results) {
     CLI::App* command = app.add_subcommand("decode", description)->group("Commands");
     command->footer(std::string(footer) + '\n' + exitCodesHelp);
     command->add_option("CAPTURE", options->capture, "Soft values to decode")->required()->type_name("");
+    addRealNumberOptions(*command, options->scale);
     addCoreOptions(*command, options->core);
     command->add_option("--reference", options->reference, "Count errors against the bits in this file")
         ->type_name("BITS");

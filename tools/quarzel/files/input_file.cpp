@@ -11,10 +11,10 @@ namespace quarzel::tool {
 
 std::ifstream openInput(const std::string& file) {
     std::error_code ignored;
-    if (std::filesystem::is_directory(file, ignored)) {
+    if (!isStandardStream(file) && std::filesystem::is_directory(file, ignored)) {
         throw fileError(file, "is a directory", "give the name of a file");
     }
-    std::ifstream stream(file, std::ios::binary);
+    std::ifstream stream(isStandardStream(file) ? "/dev/stdin" : file, std::ios::binary);
     if (!stream) {
         const int cause = errno;
         throw fileError(file, std::string("cannot be opened: ") + std::strerror(cause),

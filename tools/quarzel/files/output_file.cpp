@@ -2,12 +2,14 @@
 #include "files/output_file.hpp"
 
 #include <fcntl.h>
-#include <fmt/format.h>
+#include <sys/stat.h>
 #include <unistd.h>
 
-#include <array>
+#include <cerrno>
+#include <cstdlib>
 #include <filesystem>
 
+#include "files/input_file.hpp"
 #include "files/open_file.hpp"
 #include "tool_error.hpp"
 
@@ -17,23 +19,36 @@ namespace quarzel::tool {
 
 namespace {
 
-/// The file that a name stands for: links are followed, so that they stay links.
+/// The file that a name stands for: links are followed, so that they stay links, wherever they lead.
 fs::path targetOf(const std::string& file) {
-    std::error_code error;
-    const fs::path target = fs::canonical(file, error);
-    return error ? fs::path(file) : target;
-}
-
-/// A name that no other process uses, not even one on another machine that sees the same directory.
-std::string temporaryName() {
-    std::array<char, 256> host{};
-    ::gethostname(host.data(), host.size() - 1);
-    return fmt::format(".quarzel-{}-{}.tmp", host.data(), ::getpid());
+    constexpr int longestChain = 40;
+    std::error_code ignored;
+    fs::path target = file;
+    for (int links = 0; fs::is_symlink(target, ignored); ++links) {
+        if (links == longestChain) {
+            errno = ELOOP;
+            throw writeError(file);
+        }
+        target = target.parent_path() / fs::read_symlink(target, ignored);
+    }
+    return target;
 }
 
 bool isWrittenDirectly(const fs::path& target) {
     std::error_code ignored;
     return fs::exists(target, ignored) && !fs::is_regular_file(target, ignored);
+}
+
+/// What a name in the directory of a file begins with until the file takes its place.
+std::string temporaryTemplate(const fs::path& target) {
+    return (target.parent_path() / ".quarzel-XXXXXX").string();
+}
+
+/// The permissions of the file that is there, or else those of a new one.
+mode_t permissionsOf(const fs::path& target) {
+    struct stat status {};
+    constexpr mode_t all = 07777;
+    return ::stat(target.c_str(), &status) == 0 ? status.st_mode & all : permissionsOfNew(0666);
 }
 
 }  // namespace
@@ -43,11 +58,11 @@ class OutputFile::Target {
   public:
     explicit Target(const std::string& shown)
         : itsTarget(targetOf(shown)),
-          itsTemporaryName(isWrittenDirectly(itsTarget) ? fs::path()
-                                                        : itsTarget.parent_path() / temporaryName()),
+          itsTemporaryName(isStandardStream(shown) || isWrittenDirectly(itsTarget)
+                               ? std::string()
+                               : temporaryTemplate(itsTarget)),
           itsShown(shown),
-          itsFile(itsTemporaryName.empty() ? OpenFile(itsTarget.string(), 0, shown)
-                                           : OpenFile(itsTemporaryName.string(), O_CREAT | O_EXCL, shown)) {}
+          itsFile(open(), shown) {}
     Target(const Target&) = delete;
     Target& operator=(const Target&) = delete;
     ~Target() {
@@ -63,17 +78,28 @@ class OutputFile::Target {
             itsFile.close();
             return;
         }
+        itsFile.setPermissions(permissionsOf(itsTarget));
         itsFile.sync();
         itsFile.close();
         if (::rename(itsTemporaryName.c_str(), itsTarget.c_str()) != 0) {
             throw writeError(itsShown);
         }
         itsTemporaryName.clear();
+        const fs::path directory = itsTarget.parent_path();
+        syncDirectory(directory.empty() ? "." : directory.string(), itsShown);
     }
 
   private:
+    int open() {
+        if (isStandardStream(itsShown)) {
+            return ::fcntl(STDOUT_FILENO, F_DUPFD_CLOEXEC, 0);
+        }
+        return itsTemporaryName.empty() ? ::open(itsTarget.c_str(), O_WRONLY | O_CLOEXEC)
+                                        : ::mkostemp(itsTemporaryName.data(), O_CLOEXEC);
+    }
+
     fs::path itsTarget;
-    fs::path itsTemporaryName;  ///< empty: none
+    std::string itsTemporaryName;  ///< empty: none
     std::string itsShown;
     OpenFile itsFile;
 };
@@ -90,14 +116,24 @@ void OutputFile::finish() {
 }
 
 bool isSameFile(const std::string& a, const std::string& b) {
+    if (isStandardStream(a) || isStandardStream(b)) {
+        return false;
+    }
     std::error_code ignored;
     // Absolute first: of a relative name that is not there yet nothing would be canonical.
-    const fs::path first = fs::weakly_canonical(fs::absolute(a, ignored), ignored);
+    const fs::path first = fs::weakly_canonical(fs::absolute(targetOf(a), ignored), ignored);
     return fs::equivalent(a, b, ignored) ||
-           (!first.empty() && first == fs::weakly_canonical(fs::absolute(b, ignored), ignored));
+           (!first.empty() && first == fs::weakly_canonical(fs::absolute(targetOf(b), ignored), ignored));
+}
+
+bool isWhole(const std::string& file) {
+    return !isStandardStream(file) && !isWrittenDirectly(targetOf(file));
 }
 
 void probeOutput(const std::string& file) {
+    if (isStandardStream(file)) {
+        return;
+    }
     const fs::path target = targetOf(file);
     std::error_code ignored;
     if (fs::is_directory(target, ignored)) {
@@ -108,6 +144,7 @@ void probeOutput(const std::string& file) {
     }
     if (!isWrittenDirectly(target)) {
         const OutputFile probe(file);
+        probeRename(target.string(), file);
     }
 }
 

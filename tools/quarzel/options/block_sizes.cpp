@@ -3,6 +3,9 @@
 
 #include <fmt/format.h>
 
+#include <algorithm>
+
+#include "options/whole_number.hpp"
 #include "tool_error.hpp"
 
 namespace quarzel::tool {
@@ -13,6 +16,25 @@ BlockSize knownBlockSize(std::uint64_t K, const std::string& subject) {
     }
     throw ToolError(ExitCode::usage, subject, fmt::format("{} is not a block size of LTE", K),
                     "the nearest: " + link::nearestBlockSizesText(K));
+}
+
+CLI::Validator blockSizeOrAll() {
+    const CLI::Validator number = wholeNumber([](std::uint64_t) { return true; }, "a whole number");
+    return {[number](std::string& text) { return text == "all" ? std::string() : number(text); }, ""};
+}
+
+std::vector<std::uint32_t> blockSizesOf(const std::vector<std::string>& texts, const std::string& subject) {
+    std::vector<std::uint32_t> sizes;
+    if (std::find(texts.begin(), texts.end(), "all") != texts.end()) {
+        for (const BlockSize& size : blockSizes()) {
+            sizes.push_back(size.K);
+        }
+        return sizes;
+    }
+    for (const std::string& text : texts) {
+        sizes.push_back(knownBlockSize(readWholeNumber(text).value(), subject).K);
+    }
+    return sizes;
 }
 
 std::uint32_t blockSizeOf(std::uint64_t positions, const std::string& where) {

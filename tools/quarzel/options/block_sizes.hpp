@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: MIT
 #pragma once
 
+#include <CLI/CLI.hpp>
 #include <cstdint>
 #include <string>
 #include <vector>
@@ -13,6 +14,14 @@ namespace quarzel::tool {
 /// @param subject  the argument or option that he gave it with
 /// @throws ToolError naming the nearest valid ones when LTE has no such size
 BlockSize knownBlockSize(std::uint64_t K, const std::string& subject);
+
+/// A check that a text is a whole number or "all", the word for all block sizes.
+CLI::Validator blockSizeOrAll();
+
+/// The block sizes that the user gave, of texts that have passed this check.
+/// @param subject  as in `knownBlockSize`
+/// @throws ToolError as there
+std::vector<std::uint32_t> blockSizesOf(const std::vector<std::string>& texts, const std::string& subject);
 
 /// The block size K whose blocks have this many positions, K + 4, in each stream.
 /// @param where  the file, and the line when it is known, for the error message

@@ -3,7 +3,9 @@
 
 #include <fmt/format.h>
 
+#include <algorithm>
 #include <cstdint>
+#include <vector>
 
 #include "options/choices.hpp"
 #include "options/whole_number.hpp"
@@ -16,7 +18,20 @@ CLI::Validator unitsCheck() {
 }
 
 CLI::Validator algorithmCheck() {
-    return withChoices(wholeNumber([](std::uint64_t n) { return n <= 2; }, "0, 1 or 2"), {"0", "1", "2"});
+    static const std::vector<std::string> names = {"max-log", "scaled-max-log", "max-star"};
+    const CLI::Validator number = wholeNumber([](std::uint64_t n) { return n <= 2; }, "");
+    const auto check = [number](std::string& text) {
+        const auto found = std::find(names.begin(), names.end(), text);
+        if (found != names.end()) {
+            text = std::to_string(found - names.begin());
+            return std::string();
+        }
+        return number(text).empty() ? std::string()
+                                    : fmt::format("'{}' is not 0, 1, 2, {}", text, fmt::join(names, ", "));
+    };
+    std::vector<std::string> choices = {"0", "1", "2"};
+    choices.insert(choices.end(), names.begin(), names.end());
+    return withChoices({check, ""}, choices);
 }
 
 CLI::Validator iterationsCheck() {
@@ -37,7 +52,8 @@ void addCoreOptions(CLI::App& command, CoreOptions& options) {
     };
     add("--units", options.units, "Processing units of the core: 2, 4 or 8", unitsCheck());
     add("--algorithm", options.algorithm,
-        "0 max-log, 1 max-log with extrinsic values\nscaled by 0.75, 2 max-star", algorithmCheck());
+        "0 max-log, 1 scaled-max-log (extrinsic values\nscaled by 0.75), 2 max-star; number or name",
+        algorithmCheck());
     add("--iterations", options.iterations, "Iterations, 1 to 15; every one of them runs", iterationsCheck());
     const std::vector<std::string> names = implementations();
     command

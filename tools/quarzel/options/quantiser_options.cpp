@@ -5,9 +5,9 @@
 
 #include <string>
 
-namespace quarzel::tool {
+#include "quarzel/quantise.hpp"
 
-namespace {
+namespace quarzel::tool {
 
 CLI::Validator scaleCheck() {
     const auto check = [](std::string& text) {
@@ -20,8 +20,6 @@ CLI::Validator scaleCheck() {
     };
     return {check, ""};
 }
-
-}  // namespace
 
 void addQuantiserOptions(CLI::App& command, link::Quantiser& quantiser) {
     const auto add = [&](const char* name, link::Quantiser::Kind kind, const std::string& text) {
@@ -36,6 +34,21 @@ void addQuantiserOptions(CLI::App& command, link::Quantiser& quantiser) {
         fmt::format("Soft value round(S L), L the log-likelihood ratio\n2 y / sigma^2 (default, with S = {})",
                     quantiser.scale))
         ->excludes(scale);
+}
+
+void addRealNumberOptions(CLI::App& command, std::optional<double>& scale) {
+    const auto add = [&](const char* name, const std::string& text) {
+        return command.add_option(name, scale, text)->type_name("S")->transform(scaleCheck());
+    };
+    CLI::Option* const samples = add("--scale", "CAPTURE holds samples: soft value round(S y)");
+    add("--llr", fmt::format("CAPTURE holds log-likelihood ratios: soft value\nround(S L); {} is the best S",
+                             llrScale))
+        ->excludes(samples);
+}
+
+std::string realNumbersRemedy() {
+    return fmt::format("give --llr {} when they are log-likelihood ratios, --scale S when they are samples",
+                       llrScale);
 }
 
 }  // namespace quarzel::tool

@@ -5,8 +5,11 @@
 
 #include <algorithm>
 #include <filesystem>
+#include <functional>
 #include <memory>
 #include <string>
+#include <tuple>
+#include <utility>
 #include <vector>
 
 #include "files/output_file.hpp"
@@ -14,7 +17,10 @@
 #include "options/core_options.hpp"
 #include "options/list_option.hpp"
 #include "options/whole_number.hpp"
+#include "plot/figure_options.hpp"
 #include "plot/gnuplot.hpp"
+#include "plot/picture_csv.hpp"
+#include "plot/plot_inputs.hpp"
 #include "plot/plot_script.hpp"
 #include "tool_error.hpp"
 
@@ -22,36 +28,38 @@ namespace quarzel::tool {
 
 namespace {
 
-struct PlotOptions {
-    std::vector<std::string> results;
-    std::string output;
-    std::vector<std::string> references;
-    std::vector<std::uint32_t> blockSizes;
-    std::vector<int> units;
-    std::vector<int> algorithms;
-    std::vector<int> iterations;
-    bool perIteration = false;
-    std::string title;
-};
-
 constexpr const char* description = "Draw the error rates of stored sweeps";
 
 constexpr const char* footer =
     R"(The picture shows bit and block error rate over Eb/N0 on logarithmic axes, with
 intervals that hold the true rate with a probability of 95 %. Where no error was
 seen, a triangle stands at the upper end of the interval, and no line leads
-there. The legend tells in what the curves differ, the title what they share.
+there. The bound of the bit error rate takes a wrong block to have as many wrong
+bits as at the nearest point with errors. The legend tells in what the curves
+differ, the title what they share. Curves that were measured alike over several
+ranges of Eb/N0 are one line.
 
   RESULT     what 'quarzel sweep -o' wrote; the curves of all are drawn together
-  OUT        its ending tells the format: .svg, .png or .pdf. It is written
-             whole or not at all
+  OUT        its ending tells the format: .svg, .png (300 dots per inch) or .pdf
+             (fonts embedded). It is written whole or not at all
   REFERENCE  FILE or LABEL=FILE: CSV with a header and the columns ebn0_db and
-             ber, bler or both; drawn as a dashed line. Lines that begin with #
-             are comments
+             ber, bler or both, or in their place K, blocks, bit_errors and
+             block_errors; drawn as a dashed line with marks. Rows that differ
+             in source, K, code_bits, channel, modulation, decoder or iterations
+             are curves of their own; --block-size chooses among those with a K.
+             Lines that begin with # are comments
+  SIZE       WIDTHin, WIDTHmm, WIDTHxHEIGHTin or WIDTHxHEIGHTmm
+  RANGE      FIRST:LAST
+  PLACE      right, below, top-left, top-right, bottom-left, bottom-right, none;
+             without it right or below, as there is room
 
-With --per-iteration a single curve is drawn, with a line for each iteration;
-the sweep must have counted them (quarzel sweep --per-iteration). Points without
-an error are left out there.
+With --per-iteration a single curve is drawn, with a line for each iteration, or
+for those that --iterations names; the sweep must have counted them (quarzel
+sweep --per-iteration). Of curves that differ in the iterations alone the
+longest is taken. Points without an error are left out there.
+
+Es/N0 is that of a symbol of the channel. A reference must tell its code rate
+for it, by K and code_bits.
 
 gnuplot draws the picture and must be installed (Debian: gnuplot-nox).
 
@@ -59,6 +67,8 @@ Examples:
   quarzel plot result.json -o curves.svg
   quarzel plot a.json b.json --block-size 40 --reference theory=ml.csv -o k.png
   quarzel plot result.json --algorithm 1 --per-iteration -o gain.pdf
+  quarzel plot result.json --panel bler --size 3.5x2.6in --font-size 8 \
+      --title '' --legend bottom-left -o paper.pdf
 )";
 
 /// The format that the ending of a file stands for.
@@ -71,65 +81,43 @@ std::string terminalOf(const std::string& file) {
     return ending.substr(1);
 }
 
-template <class Value>
-bool isWanted(const std::vector<Value>& wanted, Value value) {
-    return wanted.empty() || std::find(wanted.begin(), wanted.end(), value) != wanted.end();
-}
-
-/// The curves of all results that the user wants.
-std::vector<SweepCurve> readCurves(const PlotOptions& options) {
-    std::vector<SweepCurve> curves;
-    for (const std::string& result : options.results) {
-        for (SweepCurve& curve : readSweepCurves(result)) {
-            if (isWanted(options.blockSizes, curve.blockSize) && isWanted(options.units, curve.units) &&
-                isWanted(options.algorithms, curve.algorithm) &&
-                isWanted(options.iterations, curve.iterations)) {
-                curves.push_back(std::move(curve));
-            }
+/// Check that no output is an input or another output.
+void checkOutputs(const PlotOptions& options) {
+    for (const auto& [option, output] : {std::pair("-o", options.output), std::pair("--csv", options.csv)}) {
+        if (!output.empty() && std::any_of(options.results.begin(), options.results.end(),
+                                           [&output = output](const std::string& result) {
+                                               return isSameFile(result, output);
+                                           })) {
+            throw ToolError(ExitCode::usage, option, fmt::format("{} is also read", output),
+                            "give another name");
         }
     }
-    if (curves.empty()) {
-        throw ToolError(ExitCode::usage, "", "the results have no curve that was asked for",
-                        "leave out --block-size, --units, --algorithm and --iterations");
-    }
-    return curves;
-}
-
-Picture pictureOf(const PlotOptions& options, const std::vector<SweepCurve>& curves) {
-    std::vector<ReferenceCurve> references;
-    for (const std::string& reference : options.references) {
-        references.push_back(readReferenceCurve(reference));
-    }
-    if (!options.perIteration) {
-        return ratesPicture(curves, references);
-    }
-    if (curves.size() > 1) {
-        throw ToolError(ExitCode::usage, "--per-iteration", fmt::format("there are {} curves", curves.size()),
-                        "choose one with --block-size, --units, --algorithm and --iterations");
-    }
-    const std::vector<MeasuredPoint>& points = curves.front().points;
-    if (std::any_of(points.begin(), points.end(),
-                    [](const MeasuredPoint& point) { return point.berAfter.empty(); })) {
-        throw fileError(curves.front().file, "has no error rates per iteration",
-                        "make it with 'quarzel sweep --per-iteration'");
-    }
-    return iterationsPicture(curves.front(), references);
-}
-
-void plot(const PlotOptions& options) {
-    const std::string terminal = terminalOf(options.output);
-    const std::vector<std::string>& results = options.results;
-    if (std::any_of(results.begin(), results.end(),
-                    [&](const std::string& result) { return isSameFile(result, options.output); })) {
-        throw ToolError(ExitCode::usage, "-o", fmt::format("{} is also read", options.output),
+    if (!options.csv.empty() && isSameFile(options.csv, options.output)) {
+        throw ToolError(ExitCode::usage, "--csv", fmt::format("{} is also the picture", options.csv),
                         "give another name");
     }
-    probeOutput(options.output);
-    Picture picture = pictureOf(options, readCurves(options));
-    if (!options.title.empty()) {
-        picture.title = options.title;
+}
+
+void plot(PlotOptions& options) {
+    const std::string terminal = terminalOf(options.output);
+    if (options.figure.yLabel && options.picture.panels.size() > 1) {
+        throw ToolError(ExitCode::usage, "--y-label", "there are two vertical axes",
+                        "choose one with --panel");
     }
-    writeOutput(options.output, runGnuplot(plotScript(picture, terminal)));
+    checkOutputs(options);
+    probeOutput(options.output);
+    if (!options.csv.empty()) {
+        probeOutput(options.csv);
+    }
+    options.picture.x = options.figure.x;
+    options.picture.iterations = options.iterations;
+    const std::vector<SweepCurve> curves = readCurves(options);
+    const Picture picture = pictureOf(options.picture, curves, readReferences(options));
+    const std::string drawn = runGnuplot(plotScript(picture, options.figure, terminal));
+    if (!options.csv.empty()) {
+        writeOutput(options.csv, pictureCsv(picture, axesOf(picture, options.figure)));
+    }
+    writeOutput(options.output, drawn);
 }
 
 }  // namespace
@@ -142,6 +130,8 @@ void addPlotCommand(CLI::App& app) {
     command->add_option("-o,--output", options->output, "Write the picture to this file")
         ->required()
         ->type_name("OUT");
+    command->add_option("--csv", options->csv, "Write the points that are drawn to this file")
+        ->type_name("FILE");
     command->add_option("--reference", options->references, "Draw a curve from elsewhere too; repeatable")
         ->type_name("REFERENCE")
         ->allow_extra_args(false);
@@ -152,12 +142,37 @@ void addPlotCommand(CLI::App& app) {
     addListOption(*command, "--algorithm", options->algorithms, "Draw only curves of these algorithms",
                   "N,...", algorithmCheck());
     addListOption(*command, "--iterations", options->iterations,
-                  "Draw only curves of these numbers of\niterations", "N,...", iterationsCheck());
-    command->add_flag("--per-iteration", options->perIteration,
+                  "Draw only curves of these numbers of\niterations; with --per-iteration, only these lines",
+                  "N,...", iterationsCheck());
+    command->add_flag("--per-iteration", options->picture.perIteration,
                       "Draw a line for each iteration of one curve");
-    command->add_option("--title", options->title, "Title (default: what the curves share)")
+    const auto addChoice = [&](const char* name, const char* text, const std::vector<std::string>& choices,
+                               const std::function<void(const std::string&)>& read) {
+        command->add_option_function<std::string>(name, read, text)
+            ->type_name("NAME")
+            ->check(withChoices(CLI::IsMember(choices).description(""), choices));
+    };
+    PictureChoice& picture = options->picture;
+    picture.panels = {"ber", "bler"};
+    addChoice("--panel", "Draw the bit error rate (ber), the block error rate\n(bler) or both (default both)",
+              {"ber", "bler", "both"}, [&picture](const std::string& name) {
+                  if (name != "both") {
+                      picture.panels = {name};
+                  }
+              });
+    addChoice("--x", "Draw over ebn0 or esn0 (default ebn0)", {"ebn0", "esn0"},
+              [&picture](const std::string& name) { picture.isOverEsN0 = name == "esn0"; });
+    command->add_flag("--uncoded", picture.uncoded, "Draw BPSK without a code too");
+    command->add_option("--title", picture.title, "Title (default: what the curves share)")
         ->type_name("TEXT")
         ->check(anyText());
+    command
+        ->add_option("--label", picture.labels,
+                     "Label of a curve; repeat it for each, in the order of\nthe legend")
+        ->type_name("TEXT")
+        ->allow_extra_args(false)
+        ->check(anyText());
+    addFigureOptions(*command, options->figure);
     command->callback([options] { plot(*options); });
 }
 

@@ -4,195 +4,150 @@
 #include <fmt/format.h>
 
 #include <algorithm>
-#include <array>
 #include <cmath>
-#include <iterator>
-#include <limits>
+
+#include "plot/figure_text.hpp"
+#include "plot/legend_script.hpp"
+#include "plot/script.hpp"
+#include "plot/script_pen.hpp"
 
 namespace quarzel::tool {
 
 namespace {
 
-/// Colours that people with any kind of colour vision tell apart (M. Okabe and K. Ito, 2008).
-constexpr std::array<const char*, 7> colours = {"#0072b2", "#d55e00", "#009e73", "#cc79a7",
-                                                "#e69f00", "#56b4e9", "#000000"};
-constexpr std::array<int, 7> marks = {7, 5, 9, 13, 11, 4, 6};
-constexpr int boundMark = 10;  ///< a triangle that points down
-
-/// Text as gnuplot takes it: in single quotes nothing has a meaning.
-std::string quoted(const std::string& text) {
-    std::string result = "'";
-    for (const char c : text) {
-        result += c == '\'' ? "''" : static_cast<unsigned char>(c) < ' ' ? " " : std::string(1, c);
-    }
-    return result + '\'';
-}
-
-/// The start of a script: the terminal, and sizes of marks that suit it.
-std::string terminalCommand(const std::string& terminal) {
-    if (terminal == "svg") {
-        return "set terminal svg size 1100,480 font 'Arial,14' background '#ffffff'\n"
-               "small = 0.4; large = 0.7\n";
-    }
-    return (terminal == "png" ? "set terminal pngcairo size 1650,720 font 'Sans,14'\n"
-                              : "set terminal pdfcairo size 11in,4.8in font 'Sans,12'\n") +
-           std::string("small = 0.7; large = 1.2\n");
-}
-
-bool isBound(const DrawnCurve& curve, const std::pair<double, MeasuredRate>& point) {
-    return curve.hasIntervals && point.second.rate == 0;
-}
-
-/// Whether a picture has a curve with a point for which this holds.
-template <class Predicate>
-bool hasPoint(const Picture& picture, const Predicate& predicate) {
-    for (const Panel& panel : picture.panels) {
-        for (const DrawnCurve& curve : panel.curves) {
-            for (const auto& point : curve.points) {
-                if (predicate(curve, point)) {
-                    return true;
-                }
-            }
+/// The smallest of 1, 2 and 5 times a power of ten that divides a range into at most so many parts.
+double stepOf(const Range& range, double parts) {
+    const double least = (range.last - range.first) / parts;
+    const double power = std::pow(10, std::floor(std::log10(least)));
+    for (const double digit : {1.0, 2.0, 5.0}) {
+        if (digit * power >= least * 0.999) {
+            return digit * power;
         }
     }
-    return false;
+    return 10 * power;
 }
 
-/// The Eb/N0 that the horizontal axes show, a little more than the points need.
-std::pair<double, double> rangeOf(const Picture& picture) {
-    double first = std::numeric_limits<double>::infinity();
-    double last = -first;
-    hasPoint(picture, [&](const DrawnCurve&, const std::pair<double, MeasuredRate>& point) {
-        first = std::min(first, point.first);
-        last = std::max(last, point.first);
-        return false;
-    });
-    const double margin = first == last ? 0.5 : 0.04 * (last - first);
-    return {first - margin, last + margin};
-}
-
-/// The power of ten below every mark of a panel.
-double floorOf(const Panel& panel) {
-    double lowest = 1;
-    for (const DrawnCurve& curve : panel.curves) {
-        for (const auto& [ebN0, rate] : curve.points) {
-            const double mark = rate.rate > 0 ? rate.rate : rate.high;
-            lowest = mark > 0 ? std::min(lowest, mark) : lowest;
+/// Numbers at the axes as close as there is room for them.
+void addAxes(Script& script, const Box& box, const Range& x, const Range& y, double fontSize) {
+    script.add("set xrange [{}:{}]\nset xtics {:.6g}\n", x.first, x.last,
+               stepOf(x, std::max(2.0, box.width / (3.6 * fontSize))));
+    const double decades = std::log10(y.last / y.first);
+    script.add("set yrange [{}:{}]\n", y.first, y.last);
+    if (decades >= 1) {
+        script.add("set format y '10^{{%T}}'\nset ytics {:.6g}\n",
+                   std::pow(10, std::ceil(decades * 1.8 * fontSize / box.height)));
+        return;
+    }
+    std::vector<double> numbers;
+    for (double power = std::pow(10, std::floor(std::log10(y.first))); power <= y.last; power *= 10) {
+        for (const double digit : {1, 2, 3, 5, 7}) {
+            numbers.push_back(digit * power);
         }
     }
-    return std::pow(10, std::min(-1.0, std::floor(std::log10(lowest / 1.2))));
+    script.add("set format y '%g'\nset ytics ({:.6g})\n", fmt::join(numbers, ","));
 }
 
-/// The data of a curve: one block of points with their intervals, one of upper bounds.
-std::string dataOf(const DrawnCurve& curve, const std::string& name, double floor) {
-    std::string points;
-    std::string bounds;
-    for (const auto& point : curve.points) {
-        const auto& [ebN0, rate] = point;
-        if (rate.rate > 0) {
-            fmt::format_to(std::back_inserter(points), "{} {} {} {}\n", ebN0, rate.rate,
-                           std::max(rate.low, floor), rate.high);
-        } else if (isBound(curve, point)) {
-            fmt::format_to(std::back_inserter(bounds), "{} {}\n", ebN0, rate.high);
+/// A curve's data: its points for marks and lines, and its bounds.
+void addData(Script& script, const DrawnCurve& curve, const std::string& name, double floor) {
+    script.add("$points_{} << end\n", name);
+    for (const DrawnPoint& point : curve.points) {
+        if (point.rate > 0) {
+            script.add("{} {} {} {}\n", point.x, point.rate, std::max(point.low, floor), point.high);
         }
     }
-    return fmt::format("$points_{0} << end\n{1}end\n$bounds_{0} << end\n{2}end\n", name, points, bounds);
-}
-
-std::string styleOf(const DrawnCurve& curve, std::size_t index) {
-    if (curve.isReference) {
-        return fmt::format("dashtype {} linewidth 1.5 linecolor rgb '#707070'", 2 + index % 4);
-    }
-    return fmt::format("dashtype {} linewidth 1.5 linecolor rgb '{}' pointtype {} pointsize small",
-                       1 + index / colours.size(), colours[index % colours.size()],
-                       marks[index % marks.size()]);
-}
-
-/// The parts of a plot command that draw a curve.
-void appendPlots(std::vector<std::string>& plots, const DrawnCurve& curve, std::size_t index,
-                 const std::string& name) {
-    const bool hasPoints = std::any_of(curve.points.begin(), curve.points.end(),
-                                       [](const auto& point) { return point.second.rate > 0; });
-    const bool hasBounds = std::any_of(curve.points.begin(), curve.points.end(),
-                                       [&](const auto& point) { return isBound(curve, point); });
-    const std::string style = styleOf(curve, index);
-    if (hasPoints) {
-        plots.push_back(fmt::format("$points_{} using 1:2 with {} {} notitle", name,
-                                    curve.isReference ? "lines" : "linespoints", style));
-        if (curve.hasIntervals) {
-            plots.push_back(fmt::format("$points_{} using 1:2:3:4 with yerrorbars {} notitle", name, style));
+    script.add("end\n$bounds_{} << end\n", name);
+    for (const DrawnPoint& point : curve.points) {
+        if (point.rate == 0) {
+            script.add("{} {}\n", point.x, point.high);
         }
     }
-    if (hasBounds) {
+    script.add("end\n");
+}
+
+/// The parts of a plot command that draw a curve: bars below, marks above.
+void appendPlots(std::vector<std::string>& plots, const DrawnCurve& curve, const std::string& name,
+                 const CurveStyle& style, const ScriptPen& pen) {
+    const auto seen = [](const DrawnPoint& point) { return point.rate > 0; };
+    const bool isMeasured = curve.kind == CurveKind::measured;
+    if (std::any_of(curve.points.begin(), curve.points.end(), seen)) {
+        if (isMeasured) {
+            plots.push_back(
+                fmt::format("$points_{} using 1:3:(0):($4-$3) with vectors {}", name, pen.bars(style)));
+        }
+        plots.push_back(fmt::format("$points_{} using 1:2 with lines {}", name, pen.line(style)));
+        if (style.mark != 0) {
+            plots.push_back(
+                fmt::format("$points_{} using 1:2 with points {}", name, pen.mark(style.colour, style.mark)));
+        }
+    }
+    if (isMeasured && !std::all_of(curve.points.begin(), curve.points.end(), seen)) {
         plots.push_back(
-            fmt::format("$bounds_{} using 1:2 with points linecolor rgb '{}' pointtype {} "
-                        "pointsize large notitle",
-                        name, colours[index % colours.size()], boundMark));
+            fmt::format("$bounds_{} using 1:2 with points {}", name, pen.mark(style.colour, boundMark)));
     }
 }
 
-/// The legend stands beside the last panel and holds what all panels have in common.
-void appendLegend(std::vector<std::string>& plots, const Picture& picture) {
-    const std::vector<DrawnCurve>& curves = picture.panels.back().curves;
-    for (std::size_t i = 0; i < curves.size(); ++i) {
-        plots.push_back(fmt::format("keyentry with {} {} title {}",
-                                    curves[i].isReference ? "lines" : "linespoints", styleOf(curves[i], i),
-                                    quoted(curves[i].label)));
+void addPanel(Script& script, const Panel& panel, const std::string& name, double floor,
+              const ScriptPen& pen) {
+    const std::vector<CurveStyle> styles = stylesOf(panel);
+    std::vector<std::string> plots;
+    for (std::size_t i = 0; i < panel.curves.size(); ++i) {
+        const std::string data = fmt::format("{}_{}", name, i);
+        addData(script, panel.curves[i], data, floor);
+        appendPlots(plots, panel.curves[i], data, styles[i], pen);
     }
-    const auto hasInterval = [](const DrawnCurve& curve, const auto&) { return curve.hasIntervals; };
-    if (hasPoint(picture, hasInterval)) {
-        plots.emplace_back("keyentry with lines linecolor rgb '#ffffff' title 'bars: 95 % intervals'");
+    if (plots.empty()) {
+        plots.emplace_back("NaN");  // axes without a curve
     }
-    if (hasPoint(picture, isBound)) {
-        plots.push_back(
-            fmt::format("keyentry with points linecolor rgb '#000000' pointtype {} pointsize large "
-                        "title 'no error: 95 % upper bound'",
-                        boundMark));
-    }
-    const auto isLeftOut = [](const DrawnCurve& curve, const auto& point) {
-        return !curve.hasIntervals && point.second.rate == 0;
+    script.add("plot {}\n", fmt::join(plots, ", \\\n     "));
+}
+
+/// The labels of the axes, in places of their own: terminals put those of gnuplot in different ones.
+void addAxisLabels(Script& script, const Picture& picture, std::size_t panel, const FigureLayout& layout,
+                   const FigureChoice& choice) {
+    const auto textOf = [](const std::optional<std::string>& label, const std::string& usual) {
+        return label ? scriptText(mendedText(*label)) + " noenhanced" : '\'' + usual + '\'';
     };
-    if (hasPoint(picture, isLeftOut)) {
-        plots.emplace_back(
-            "keyentry with lines linecolor rgb '#ffffff' title 'points without an error: left out'");
-    }
+    const Box& box = layout.panels[panel];
+    const std::string x =
+        fmt::format("{{/:Italic E}}_{}/{{/:Italic N}}_0\u00a0(dB)", picture.isOverEsN0 ? "s" : "b");
+    script.add("set label 1 {} at graph 0.5, screen {:.5f} center\n", textOf(choice.xLabel, x),
+               (box.bottom - 2.6 * choice.fontSize) / layout.height);
+    script.add(
+        "set label 2 {} at screen {:.5f}, graph 0.5 center rotate by 90\n",
+        textOf(choice.yLabel, picture.panels[panel].name == "ber" ? "Bit error rate" : "Block error rate"),
+        (box.left - 3.8 * choice.fontSize) / layout.width);
 }
 
 }  // namespace
 
-std::string plotScript(const Picture& picture, const std::string& terminal) {
-    const std::pair<double, double> range = rangeOf(picture);
-    std::string script = terminalCommand(terminal);
-    fmt::format_to(std::back_inserter(script),
-                   "set encoding utf8\n"
-                   "set pointintervalbox 0\n"
-                   "set multiplot layout 1,{} title {} noenhanced margins 0.075,0.74,0.13,0.85 spacing 0.09\n"
-                   "set logscale y\n"
-                   "set format y '10^{{%T}}'\n"
-                   "set grid xtics ytics linetype 1 linewidth 0.5 linecolor rgb '#d0d0d0'\n"
-                   "set xlabel 'Eb/N0 in dB'\n"
-                   "set xrange [{}:{}]\n"
-                   "set key noenhanced at screen 0.75, 0.85 left top Left reverse samplen 2 spacing 1.2\n",
-                   picture.panels.size(), quoted(picture.title), range.first, range.second);
+std::string plotScript(const Picture& picture, const FigureChoice& choice, const std::string& terminal) {
+    const FigureLayout layout = layoutOf(picture, choice);
+    const FigureAxes axes = axesOf(picture, choice);
+    const ScriptPen pen(terminal, layout, choice);
+    Script script;
+    script.add(
+        "{}set encoding utf8\nset multiplot\nunset key\nset logscale y\nset border {}\nset tics scale "
+        "0.6,0.3\n"
+        "set grid xtics ytics linetype 1 {} linecolor rgb '{}'\n",
+        pen.terminalCommand(), pen.width(0.6), pen.width(0.4), ruleColour);
+    for (std::size_t i = 0; i < layout.title.size(); ++i) {
+        script.add("set label {} {} at screen 0.5,{:.5f} center noenhanced\n", 3 + i,
+                   scriptText(layout.title[i]),
+                   1 - (0.3 + (static_cast<double>(i) + 0.5) * lineHeight) * choice.fontSize / layout.height);
+    }
     for (std::size_t p = 0; p < picture.panels.size(); ++p) {
         const Panel& panel = picture.panels[p];
-        const double floor = floorOf(panel);
-        std::vector<std::string> plots;
-        for (std::size_t i = 0; i < panel.curves.size(); ++i) {
-            const std::string name = fmt::format("{}_{}", p, i);
-            script += dataOf(panel.curves[i], name, floor);
-            appendPlots(plots, panel.curves[i], i, name);
-        }
-        if (plots.empty()) {
-            plots.emplace_back("NaN notitle");  // axes without a curve
-        }
-        if (p + 1 == picture.panels.size()) {
-            appendLegend(plots, picture);
-        }
-        fmt::format_to(std::back_inserter(script), "set title {}\nset yrange [{}:1]\nplot {}\n",
-                       quoted(panel.name), floor, fmt::join(plots, ", \\\n     "));
+        addMargins(script, layout, layout.panels[p]);
+        addAxes(script, layout.panels[p], axes.x, axes.y[p], choice.fontSize);
+        addAxisLabels(script, picture, p, layout, choice);
+        addPanel(script, panel, std::to_string(p), axes.y[p].first, pen);
+        script.add("unset label\n");
     }
-    return script + "unset multiplot\n";
+    if (!layout.legend.entries.empty()) {
+        addLegend(script, layout, stylesOf(picture.panels.front()), pen, choice.fontSize);
+    }
+    script.add("unset multiplot\n");
+    return script.text();
 }
 
 }  // namespace quarzel::tool

@@ -1,83 +1,123 @@
 // SPDX-License-Identifier: MIT
-#define CSV_IO_NO_THREAD  // the files are small
 #include "plot/reference_curve.hpp"
 
 #include <fmt/format.h>
-#include <libfccp/csv.h>
 
-#include <charconv>
-#include <cstring>
+#include <algorithm>
+#include <array>
 #include <filesystem>
+#include <set>
+#include <string_view>
 
 #include "files/input_file.hpp"
+#include "plot/reference_rows.hpp"
 #include "tool_error.hpp"
 
 namespace quarzel::tool {
 
 namespace {
 
-constexpr const char* remedy = "give CSV with the columns ebn0_db and ber, bler or both";
+using Setup = decltype(ReferenceRow::setup);
 
-using Reader = io::CSVReader<3, io::trim_chars<' ', '\t', '\r'>, io::no_quote_escape<','>,
-                             io::throw_on_overflow, io::single_and_empty_line_comment<'#'>>;
+/// The curves of a file and what each was measured with.
+struct Curves {
+    std::vector<Setup> setups;
+    std::vector<ReferenceCurve> curves;
+};
 
-double numberOf(const char* field, const std::string& where) {
-    double value = 0;
-    const char* const end = field + std::strlen(field);
-    const auto [stop, error] = std::from_chars(field, end, value);
-    if (error != std::errc() || stop != end) {
-        throw fileError(where, fmt::format("'{:.20}' is not a number", field), remedy);
+int bitsOf(std::string_view modulation, const std::string& file) {
+    constexpr std::array<std::pair<std::string_view, int>, 6> known = {
+        {{"", 1}, {"BPSK", 1}, {"QPSK", 2}, {"16QAM", 4}, {"64QAM", 6}, {"256QAM", 8}}};
+    const auto* const found = std::find_if(known.begin(), known.end(),
+                                           [&](const auto& entry) { return entry.first == modulation; });
+    if (found == known.end()) {
+        throw fileError(file, fmt::format("'{:.20}' is not a modulation", modulation),
+                        "give BPSK, QPSK, 16QAM, 64QAM or 256QAM");
     }
-    return value;
+    return found->second;
 }
 
-void append(RatePoints& points, double ebN0, const char* field, const std::string& where) {
-    if (field == nullptr || *field == '\0') {
-        return;
+ReferenceCurve curveOf(const Setup& setup, const std::string& file) {
+    ReferenceCurve curve;
+    if (!setup[referenceK].empty()) {
+        curve.blockSize = countFrom(setup[referenceK], file);
     }
-    const double rate = numberOf(field, where);
-    if (!(rate > 0 && rate <= 1)) {
-        throw fileError(where, fmt::format("{} is not an error rate on a logarithmic axis", field),
-                        "give a number above 0 and up to 1, or leave it out");
+    if (curve.blockSize && !setup[referenceCodeBits].empty()) {
+        curve.bitsPerSymbol = static_cast<double>(*curve.blockSize) /
+                              static_cast<double>(countFrom(setup[referenceCodeBits], file)) *
+                              bitsOf(setup[referenceModulation], file);
     }
-    points.emplace_back(ebN0, rate);
+    return curve;
 }
 
-void readRows(std::istream& stream, const std::string& file, ReferenceCurve& curve) {
-    Reader reader(file, stream);
-    reader.read_header(io::ignore_missing_column | io::ignore_extra_column, "ebn0_db", "ber", "bler");
-    if (!reader.has_column("ebn0_db") || !(reader.has_column("ber") || reader.has_column("bler"))) {
-        throw fileError(file, "is missing a column", remedy);
+Curves curvesOf(const std::vector<ReferenceRow>& rows, const std::string& file) {
+    Curves result;
+    for (const ReferenceRow& row : rows) {
+        const auto same = std::find(result.setups.begin(), result.setups.end(), row.setup);
+        const auto index = static_cast<std::size_t>(same - result.setups.begin());
+        if (same == result.setups.end()) {
+            result.setups.push_back(row.setup);
+            result.curves.push_back(curveOf(row.setup, file));
+        }
+        ReferenceCurve& curve = result.curves[index];
+        if (row.ber) {
+            curve.ber.emplace_back(row.ebN0, *row.ber);
+        }
+        if (row.bler) {
+            curve.bler.emplace_back(row.ebN0, *row.bler);
+        }
     }
-    const char* ebN0 = nullptr;
-    const char* ber = nullptr;
-    const char* bler = nullptr;
-    while (reader.read_row(ebN0, ber, bler)) {
-        const std::string where = fmt::format("{}: line {}", file, reader.get_file_line());
-        const double x = numberOf(ebN0, where);
-        append(curve.ber, x, ber, where);
-        append(curve.bler, x, bler, where);
+    return result;
+}
+
+std::string textOf(std::size_t column, const std::string& field) {
+    switch (column) {
+        case referenceK:
+            return "K = " + field;
+        case referenceIterations:
+            return field + " iterations";
+        case referenceCodeBits:
+            return field + " code bits";
+        default:
+            return field;
+    }
+}
+
+/// Tell the curves of a file apart by as few columns as are enough.
+void addLabels(Curves& file) {
+    std::set<std::string> labels;
+    for (std::size_t column = 0; column < referenceColumns && labels.size() < file.curves.size(); ++column) {
+        const auto isShared = [&](const Setup& setup) { return setup[column] == file.setups[0][column]; };
+        if (std::all_of(file.setups.begin(), file.setups.end(), isShared)) {
+            continue;
+        }
+        labels.clear();
+        for (std::size_t i = 0; i < file.curves.size(); ++i) {
+            file.curves[i].label += ", " + textOf(column, file.setups[i][column]);
+            labels.insert(file.curves[i].label);
+        }
     }
 }
 
 }  // namespace
 
-ReferenceCurve readReferenceCurve(const std::string& argument) {
+std::vector<ReferenceCurve> readReferenceCurves(const std::string& argument) {
     const std::size_t equals = argument.find('=');
-    const bool hasLabel = equals != std::string::npos && !std::filesystem::exists(argument);
+    std::error_code ignored;  // a long label is not a file name
+    const bool hasLabel = equals != std::string::npos && !std::filesystem::exists(argument, ignored);
     const std::string file = hasLabel ? argument.substr(equals + 1) : argument;
-    ReferenceCurve curve{
-        hasLabel ? argument.substr(0, equals) : std::filesystem::path(file).stem().string(), {}, {}};
     std::ifstream stream = openInput(file);
-    try {
-        readRows(stream, file, curve);
-    } catch (const io::error::base&) {
-        throw fileError(file, "is not a well-formed reference curve", remedy);
+    Curves result = curvesOf(readReferenceRows(stream, file), file);
+    for (ReferenceCurve& curve : result.curves) {
+        curve.label = hasLabel ? argument.substr(0, equals) : std::filesystem::path(file).stem().string();
     }
-    if (curve.ber.empty() && curve.bler.empty()) {
-        throw fileError(file, "holds no point", remedy);
+    addLabels(result);
+    std::erase_if(result.curves,
+                  [](const ReferenceCurve& curve) { return curve.ber.empty() && curve.bler.empty(); });
+    if (result.curves.empty()) {
+        throw fileError(file, "holds no point", referenceRemedy);
     }
-    return curve;
+    return result.curves;
 }
 
 }  // namespace quarzel::tool

@@ -1,6 +1,8 @@
 // SPDX-License-Identifier: MIT
 #pragma once
 
+#include <cstdint>
+#include <optional>
 #include <string>
 #include <utility>
 #include <vector>
@@ -13,14 +15,18 @@ using RatePoints = std::vector<std::pair<double, double>>;
 /// Error rates from elsewhere, to be drawn beside measured ones.
 struct ReferenceCurve {
     std::string label;
-    RatePoints ber;   ///< may be empty
-    RatePoints bler;  ///< may be empty
+    std::optional<std::uint32_t> blockSize;  ///< K, where the file has it
+    std::optional<double> bitsPerSymbol;     ///< information bits a symbol, where the file tells it
+    RatePoints ber;                          ///< may be empty
+    RatePoints bler;                         ///< may be empty
 };
 
-/// Read a reference curve: CSV with a header that names ebn0_db and ber, bler or both. An empty field is no
-/// point.
+/// Read reference curves: CSV with a header that names ebn0_db and the rates ber and bler, or the counts
+/// blocks, bit_errors and block_errors, of which one is enough. An empty field, or a count of 0, is no point.
+/// Rows that differ in source, K, code_bits, channel, modulation, decoder or iterations, where the file has
+/// these, are points of different curves.
 /// @param argument  "LABEL=FILE", or a file whose name without its ending is the label
 /// @throws ToolError when it cannot be read or is not well-formed
-ReferenceCurve readReferenceCurve(const std::string& argument);
+std::vector<ReferenceCurve> readReferenceCurves(const std::string& argument);
 
 }  // namespace quarzel::tool

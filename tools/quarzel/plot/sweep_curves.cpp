@@ -6,7 +6,6 @@
 #include <iterator>
 
 #include "files/input_file.hpp"
-#include "sweep/document.hpp"
 #include "sweep/error.hpp"
 #include "sweep/result.hpp"
 #include "tool_error.hpp"
@@ -15,28 +14,12 @@ namespace quarzel::tool {
 
 namespace {
 
-using sweep::Json;
+/// BPSK, and the code rate is taken as 1/3.
+constexpr double bitsPerSymbol = 1.0 / 3;
 
-MeasuredRate rateFrom(const Json& point, const std::string& name) {
-    const Json& interval = point.at(name + "_interval");
-    return {point.at(name), interval.at(0), interval.at(1)};
-}
-
-MeasuredPoint pointFrom(const Json& json) {
-    MeasuredPoint point{json.at("ebn0_db"), rateFrom(json, "ber"), rateFrom(json, "bler"), {}, {}};
-    if (const auto counts = json.find("per_iteration"); counts != json.end()) {
-        for (const Json& count : *counts) {
-            point.berAfter.push_back(count.at("bit_errors").get<double>() / json.at("bits").get<double>());
-            point.blerAfter.push_back(count.at("block_errors").get<double>() /
-                                      json.at("blocks").get<double>());
-        }
-    }
-    return point;
-}
-
-std::string quantiserText(const Json& quantiser) {
-    return fmt::format("{} \u00d7 {}", quantiser.at("kind") == "llr" ? "LLR" : "amplitude",
-                       quantiser.at("scale").get<double>());
+std::string quantiserText(const link::Quantiser& quantiser) {
+    return fmt::format("{} \u00d7 {}", quantiser.kind == link::Quantiser::Kind::llr ? "LLR" : "amplitude",
+                       quantiser.scale);
 }
 
 }  // namespace
@@ -45,28 +28,27 @@ std::vector<SweepCurve> readSweepCurves(const std::string& file) {
     std::ifstream stream = openInput(file);
     const std::string text(std::istreambuf_iterator<char>(stream), {});
     try {
-        const Json document = sweep::readDocument(text, sweep::resultFormat, sweep::resultIndent);
-        const Json& configuration = document.at("configuration");
+        const sweep::Result result = sweep::readResult(text);
         std::vector<SweepCurve> curves;
-        for (const Json& json : document.at("curves")) {
-            SweepCurve& curve = curves.emplace_back(SweepCurve{file,
-                                                               json.at("block_size"),
-                                                               json.at("units"),
-                                                               json.at("algorithm"),
-                                                               json.at("iterations"),
-                                                               quantiserText(configuration.at("quantiser")),
-                                                               configuration.at("seed"),
-                                                               {}});
-            for (const Json& point : json.at("points")) {
-                curve.points.push_back(pointFrom(point));
+        const sweep::Setup* last = nullptr;
+        for (const auto& [setup, point] : result.points) {
+            if (last == nullptr || !sweep::isSameCurve(setup, *last)) {
+                curves.push_back({file,
+                                  setup.blockSize,
+                                  setup.units,
+                                  setup.algorithm,
+                                  setup.iterations,
+                                  quantiserText(setup.quantiser),
+                                  result.seed,
+                                  bitsPerSymbol,
+                                  {}});
             }
+            curves.back().points.push_back({setup.ebN0.value(), point});
+            last = &setup;
         }
         return curves;
     } catch (const sweep::Error& error) {
         throw fileError(file, error.problem(), error.remedy());
-    } catch (const Json::exception&) {
-        throw fileError(file, "is not a well-formed sweep result",
-                        "give a file that 'quarzel sweep -o' wrote");
     }
 }
 

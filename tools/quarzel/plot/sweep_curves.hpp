@@ -5,21 +5,13 @@
 #include <string>
 #include <vector>
 
+#include "sweep/point_state.hpp"
+
 namespace quarzel::tool {
 
-/// An error rate and the interval that holds the true one with a probability of 95 %.
-struct MeasuredRate {
-    double rate;
-    double low;
-    double high;
-};
-
 struct MeasuredPoint {
-    double ebN0;  ///< in dB
-    MeasuredRate ber;
-    MeasuredRate bler;
-    std::vector<double> berAfter;   ///< after each iteration; empty when only the last one was counted
-    std::vector<double> blerAfter;  ///< likewise
+    double ebN0;              ///< in dB
+    sweep::PointState state;  ///< its counts; after every iteration or the last one alone
 };
 
 /// A curve of a stored sweep and what it was measured with.
@@ -31,6 +23,7 @@ struct SweepCurve {
     int iterations;
     std::string quantiser;  ///< for people: "LLR x 8"
     std::uint64_t seed;
+    double bitsPerSymbol;  ///< information bits that a symbol of the channel carries: Es/N0 over Eb/N0
     std::vector<MeasuredPoint> points;
 };
 

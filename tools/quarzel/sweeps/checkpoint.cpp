@@ -6,12 +6,21 @@
 #include <utility>
 
 #include "files/output_file.hpp"
-#include "sweeps/sweep_files.hpp"
+#include "tool_error.hpp"
 
 namespace quarzel::tool {
 
-Checkpoint::Checkpoint(std::string file, std::chrono::seconds period)
-    : itsFile(std::move(file)), itsPeriod(period), itsNextTime(Clock::now() + period) {}
+Checkpoint::Checkpoint(std::string file, std::chrono::seconds period, std::optional<sweep::Part> part)
+    : itsFile(std::move(file)),
+      itsPeriod(period),
+      itsPart(std::move(part)),
+      itsNextTime(Clock::now() + period) {}
+
+void Checkpoint::lock() {
+    if (!itsFile.empty()) {
+        itsLock.emplace(itsFile);
+    }
+}
 
 void Checkpoint::probe() const {
     if (!itsFile.empty()) {
@@ -22,14 +31,6 @@ void Checkpoint::probe() const {
 bool Checkpoint::exists() const {
     std::error_code ignored;
     return !itsFile.empty() && std::filesystem::exists(itsFile, ignored);
-}
-
-sweep::Part Checkpoint::load(const sweep::Configuration& configuration, const sweep::Shard& shard) const {
-    return aboutFile(itsFile, [&] {
-        sweep::Part part = sweep::readPart(readBytes(itsFile));
-        sweep::requireSameRun(part, configuration, shard);
-        return part;
-    });
 }
 
 void Checkpoint::update(const sweep::Dispatcher& dispatcher, Clock::time_point now) {
@@ -44,8 +45,7 @@ bool Checkpoint::save(const sweep::Dispatcher& dispatcher) {
         return false;
     }
     try {
-        writeOutput(itsFile,
-                    sweep::partText({dispatcher.configuration(), dispatcher.shard(), dispatcher.states()}));
+        writeOutput(itsFile, sweep::resultText({dispatcher.plan().seed, dispatcher.points(), itsPart}));
         return true;
     } catch (const ToolError& error) {
         if (!std::exchange(itsFailureIsReported, true)) {
@@ -56,8 +56,10 @@ bool Checkpoint::save(const sweep::Dispatcher& dispatcher) {
 }
 
 void Checkpoint::remove() const {
-    std::error_code ignored;
-    std::filesystem::remove(itsFile, ignored);
+    if (!itsFile.empty()) {
+        std::error_code ignored;
+        std::filesystem::remove(itsFile, ignored);
+    }
 }
 
 }  // namespace quarzel::tool

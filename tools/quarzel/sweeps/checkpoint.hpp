@@ -5,8 +5,9 @@
 #include <optional>
 #include <string>
 
+#include "files/file_lock.hpp"
 #include "sweep/dispatcher.hpp"
-#include "sweep/part.hpp"
+#include "sweep/result.hpp"
 
 namespace quarzel::tool {
 
@@ -17,17 +18,18 @@ class Checkpoint {
 
     /// @param file    empty: there is none
     /// @param period  how often it is renewed
-    Checkpoint(std::string file, std::chrono::seconds period);
+    /// @param part    which part of a sweep it is of
+    Checkpoint(std::string file, std::chrono::seconds period, std::optional<sweep::Part> part = {});
+
+    /// Keep other sweeps from it while this lives.
+    /// @throws ToolError when another one has it
+    void lock();
 
     /// @throws ToolError when it could not be written
     void probe() const;
 
     /// Whether an earlier run has left one.
     bool exists() const;
-
-    /// Read what an earlier run has left.
-    /// @throws ToolError when it is broken or belongs to another run
-    sweep::Part load(const sweep::Configuration& configuration, const sweep::Shard& shard) const;
 
     /// Renew it when it is due. A failure is reported on standard error, once, and does not stop the sweep.
     void update(const sweep::Dispatcher& dispatcher, Clock::time_point now = Clock::now());
@@ -43,7 +45,9 @@ class Checkpoint {
 
   private:
     std::string itsFile;
+    std::optional<FileLock> itsLock;
     std::chrono::seconds itsPeriod;
+    std::optional<sweep::Part> itsPart;
     Clock::time_point itsNextTime;
     bool itsFailureIsReported = false;
 };

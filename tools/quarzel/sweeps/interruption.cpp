@@ -34,13 +34,18 @@ Interruption::Interruption() {
     struct sigaction action {};
     action.sa_handler = noteSignal;
     action.sa_flags = SA_RESTART;
-    ::sigaction(SIGINT, &action, &itsFormerInterrupt);
-    ::sigaction(SIGTERM, &action, &itsFormerTermination);
+    for (std::size_t i = 0; i < signals.size(); ++i) {
+        ::sigaction(signals[i], nullptr, &itsFormer[i]);
+        if (itsFormer[i].sa_handler != SIG_IGN) {
+            ::sigaction(signals[i], &action, nullptr);
+        }
+    }
 }
 
 Interruption::~Interruption() {
-    ::sigaction(SIGINT, &itsFormerInterrupt, nullptr);
-    ::sigaction(SIGTERM, &itsFormerTermination, nullptr);
+    for (std::size_t i = 0; i < signals.size(); ++i) {
+        ::sigaction(signals[i], &itsFormer[i], nullptr);
+    }
 }
 
 bool Interruption::hasCome() const {

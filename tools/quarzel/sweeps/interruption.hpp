@@ -1,12 +1,14 @@
 // SPDX-License-Identifier: MIT
 #pragma once
 
+#include <array>
 #include <csignal>
 
 namespace quarzel::tool {
 
-/// While it lives, the first SIGINT or SIGTERM is noted and does not end the process; one that comes more
-/// than a second later does. There may be one of these at a time.
+/// While it lives, the first SIGINT, SIGTERM or SIGHUP is noted and does not end the process; one that comes
+/// more than a second later does. Those that the process was started to ignore stay ignored. There may be one
+/// of these at a time.
 class Interruption {
   public:
     Interruption();
@@ -18,8 +20,9 @@ class Interruption {
     bool hasCome() const;
 
   private:
-    struct sigaction itsFormerInterrupt {};
-    struct sigaction itsFormerTermination {};
+    static constexpr std::array signals = {SIGINT, SIGTERM, SIGHUP};
+
+    std::array<struct sigaction, signals.size()> itsFormer{};
 };
 
 }  // namespace quarzel::tool

@@ -1,46 +1,43 @@
 // SPDX-License-Identifier: MIT
 #pragma once
 
-#include <chrono>
 #include <cstddef>
+#include <functional>
+#include <optional>
 #include <ostream>
 #include <string>
 
-#include "sweep/dispatcher.hpp"
+#include "sweeps/sweep_display.hpp"
+#include "sweeps/sweep_progress.hpp"
 
 namespace quarzel::tool {
 
-/// A table on a terminal that shows the progress of a sweep: a row for each point that has ended, and one for
-/// the current point, which changes.
-class LiveTable {
+/// The table of a sweep as it grows on a terminal. Below the points that have ended stand the current one and
+/// a line for the whole sweep, which change.
+class LiveTable : public SweepDisplay {
   public:
-    using Clock = std::chrono::steady_clock;
+    /// @param terminal  where it is drawn; must outlive it
+    /// @param width     tells the columns of the terminal, which may change; 0: unknown
+    LiveTable(std::ostream& terminal, std::function<std::size_t()> width,
+              Clock::time_point start = Clock::now())
+        : itsTerminal(terminal), itsWidth(std::move(width)), itsNextDrawing(start + patience) {}
 
-    /// @param terminal  where it is drawn
-    /// @param visible   whether it is drawn at all
-    /// @param width     columns of the terminal; 0: unknown
-    LiveTable(std::ostream& terminal, bool visible, std::size_t width,
-              Clock::time_point start = Clock::now());
-    LiveTable(const LiveTable&) = delete;
-    LiveTable& operator=(const LiveTable&) = delete;
-    ~LiveTable();
-
-    /// Show how far the sweep is. Cheap: it draws at most five times a second, and the points that have
-    /// ended.
-    void update(const sweep::Dispatcher& dispatcher, Clock::time_point now = Clock::now());
+    /// Cheap: it draws at most five times a second, and the points that have ended.
+    void update(const sweep::Dispatcher& dispatcher, Clock::time_point now = Clock::now()) override;
+    bool finish(const sweep::Dispatcher& dispatcher) override;
 
   private:
-    void draw(const std::string& row, char end);
     void drawPoint(const sweep::Dispatcher& dispatcher, std::size_t point);
-    std::string timesOf(const sweep::PointState& point, const sweep::Dispatcher& dispatcher,
-                        const sweep::Curve& curve) const;
+    void drawStatus(const sweep::Dispatcher& dispatcher, std::size_t current, Clock::time_point now);
 
     std::ostream& itsTerminal;
-    bool itsVisible;
-    std::size_t itsWidth;
+    std::function<std::size_t()> itsWidth;
     Clock::time_point itsNextDrawing;
+    ProgressMeter itsMeter;
+    bool itsHasBegun = false;
+    bool itsIsDrawn = false;
     std::size_t itsPointsDrawn = 0;
-    std::size_t itsHeadingsDrawn = 0;  ///< for this many curves
+    std::optional<sweep::Setup> itsLast;  ///< the last one, whose curve has its headings
 };
 
 }  // namespace quarzel::tool

@@ -6,7 +6,7 @@
 
 namespace quarzel::tool {
 
-/// Add `quarzel merge`, which joins the parts of a sweep.
+/// Add `quarzel merge`, which joins results and parts of sweeps.
 /// @param results  where it writes its report; must outlive the parse
 void addMergeCommand(CLI::App& app, std::ostream& results);
 

@@ -3,14 +3,17 @@
 
 #include <fmt/format.h>
 #include <filesystem>
+#include <iostream>
 #include <optional>
 #include <string>
 #include <utility>
 
+#include "files/file_lock.hpp"
+#include "files/input_file.hpp"
 #include "files/output_file.hpp"
 #include "options/threads_option.hpp"
 #include "options/whole_number.hpp"
-#include "sweep/part.hpp"
+#include "report_text.hpp"
 #include "sweeps/checkpoint.hpp"
 #include "sweeps/sweep_files.hpp"
 #include "sweeps/sweep_options.hpp"
@@ -42,25 +45,36 @@ the core, decoded and compared. Eb/N0 is for an information bit at rate 1/3: the
 noise has the variance 1.5 / (Eb/N0); the 12 tail bits are not counted. All
 cores and quantisers get the same bits and the same noise.
 
-The result depends only on the options above --shard: not on threads,
-parts, interruptions or the machine. (With --max-time it depends on the clock.)
-The interval holds the true block error rate with a probability of 95 %.
+What is counted at a point depends only on the seed, the point and the number of
+its blocks: not on threads, parts, interruptions or the machine. (That number
+depends on the clock with --max-time.) The interval holds the true block error
+rate with a probability of 95 %.
 
 Files:
-  OUT         the result, JSON: for 'quarzel plot' and 'quarzel verify-result'.
-              With --shard a part of it, for 'quarzel merge'. It is written at
-              the end, whole or not at all.
+  OUT         the result, JSON: for 'quarzel show', 'quarzel plot' and 'quarzel
+              verify-result'. A result that is already there is extended: new
+              points are added, points with fewer blocks than asked for go on
+              where they ended, nothing is decoded twice and no point is lost.
+              With --shard it is a part of a result, for 'quarzel merge'. It is
+              written at the end, whole or not at all. With - it goes to
+              standard output, and the table to standard error.
   FILE        what is done so far, renewed while the sweep runs and when it is
-              interrupted (SIGINT, SIGTERM), removed at the end. --resume goes
-              on from it, or begins at the beginning when there is none.
+              interrupted (SIGINT, SIGTERM, SIGHUP), removed once the result is
+              in its place. --resume goes on from it, or begins at the beginning
+              when there is none. FILE.lock keeps other sweeps from it.
+
+A sweep of more than a second tells on standard error how far it is: on a
+terminal as a growing table, elsewhere as a line for each point that has ended
+and one a minute for the whole. Without OUT an interruption prints what is done.
 
 Examples:
   quarzel sweep --ebn0 0:0.2:1 --iterations 8 -o result.json
   quarzel sweep --ebn0 0:0.2:1 --algorithm 0,1,2 --block-size 40,6144 --csv
+  quarzel sweep --ebn0 0:0.1:1.4 --iterations 8 -o result.json
   quarzel sweep --ebn0 1:0.1:2 --max-blocks 1000000 --shard 3/16 -o part3.json
 )";
 
-void checkOptions(const Options& options, const Checkpoint& checkpoint) {
+void checkOptions(const Options& options, Checkpoint& checkpoint) {
     if (options.output && options.output->empty()) {
         throw ToolError(ExitCode::usage, "-o", "the name of the file is empty", "give one");
     }
@@ -74,45 +88,46 @@ void checkOptions(const Options& options, const Checkpoint& checkpoint) {
     if (options.output && !checkpoint.file().empty() && isSameFile(*options.output, checkpoint.file())) {
         throw ToolError(ExitCode::usage, "--checkpoint", "it is also the output of -o", "give another name");
     }
+    if (options.output) {
+        probeOutput(*options.output);
+    }
+    checkpoint.lock();
     if (!options.resume && checkpoint.exists()) {
         throw fileError(checkpoint.file(), "is the checkpoint of an interrupted sweep",
                         "go on from it with --resume, or remove it to begin anew");
     }
-    if (options.output) {
-        probeOutput(*options.output);
-    }
     checkpoint.probe();
 }
 
-/// What the output holds, if it exists and --resume has no checkpoint to go on from.
-std::optional<sweep::Result> finishedResult(const Options& options, const Checkpoint& checkpoint,
-                                            const sweep::Configuration& configuration,
-                                            const sweep::Shard& shard) {
-    std::error_code ignored;
-    if (!options.resume || checkpoint.exists() || !options.output ||
-        !std::filesystem::is_regular_file(*options.output, ignored)) {
-        return std::nullopt;
-    }
-    return aboutFile(*options.output, [&] {
-        const std::string text = readBytes(*options.output);
-        if (!shard.isWhole()) {
-            sweep::Part part = sweep::readPart(text);
-            sweep::requireSameRun(part, configuration, shard);
-            return sweep::Result{part.configuration, std::move(part.points)};
+/// What the output and the checkpoint already hold.
+sweep::Result knownResult(const Options& options, const Checkpoint& checkpoint, std::uint64_t seed,
+                          const std::optional<sweep::Part>& part) {
+    sweep::NamedResult known{options.output.value_or(""), {seed, {}, part}};
+    for (const std::string& file : {known.name, checkpoint.file()}) {
+        std::error_code ignored;
+        if (!isStandardStream(file) && std::filesystem::is_regular_file(file, ignored)) {
+            joinSweepFile(known, file);
         }
-        sweep::Result result = sweep::readResult(text);
-        sweep::requireSameRun({result.configuration, shard, {}}, configuration, shard);
-        return result;
-    });
+    }
+    return known.result;
+}
+
+/// The plan of a sweep that goes on from what is known.
+sweep::Plan planOf(const Options& options, const sweep::Configuration& configuration,
+                   const sweep::Shard& shard, const sweep::Points& known) {
+    try {
+        return sweep::planOf(configuration, shard, known);
+    } catch (const sweep::Error& error) {
+        throw fileError(options.output.value_or(""), error.problem(), error.remedy());
+    }
 }
 
 [[noreturn]] void failInterrupted(const sweep::Dispatcher& dispatcher, bool isKept,
                                   const Checkpoint& checkpoint) {
-    const std::string problem =
-        fmt::format("interrupted when {} of {} points were done", dispatcher.firstUnfinished(),
-                    dispatcher.configuration().points());
+    const std::string problem = fmt::format("interrupted when {} of {} points were done",
+                                            dispatcher.firstUnfinished(), dispatcher.plan().points.size());
     if (checkpoint.file().empty()) {
-        throw ToolError(ExitCode::interrupted, "", problem, "next time name an output with -o to keep them");
+        throw ToolError(ExitCode::interrupted, "", problem, "next time name a file with -o to keep them");
     }
     if (!isKept) {
         throw ToolError(
@@ -136,65 +151,97 @@ void writeResult(const Options& options, const sweep::Dispatcher& dispatcher, co
     if (options.output) {
         const bool isKept = checkpoint.save(dispatcher);
         try {
-            writeOutput(*options.output,
-                        dispatcher.shard().isWhole()
-                            ? sweep::resultText(result)
-                            : sweep::partText({result.configuration, dispatcher.shard(), result.points}));
+            writeOutput(*options.output, sweep::resultText(result));
         } catch (const ToolError& error) {
             throw ToolError(error.code(), "", error.what(), remedyForResult(isKept, checkpoint));
         }
+        checkpoint.remove();
     }
-    checkpoint.remove();
 }
 
-void printResult(const Options& options, const sweep::Shard& shard, const sweep::Result& result,
-                 std::ostream& results) {
-    if (!shard.isWhole()) {
-        std::uint64_t blocks = 0;
-        for (const sweep::PointState& point : result.points) {
-            blocks += point.blocks;
-        }
-        results << fmt::format("{}: part {} of {}, {} blocks\n", *options.output, shard.index + 1,
-                               shard.count, blocks);
+/// Where the report goes: standard output that holds the result holds nothing else.
+std::ostream& reportStream(const Options& options, std::ostream& results) {
+    return options.output && isStandardStream(*options.output) ? std::cerr : results;
+}
+
+void printResult(const Options& options, const sweep::Result& result, std::ostream& results) {
+    std::ostream& stream = reportStream(options, results);
+    if (!result.part) {
+        printSweep(stream, result, options.form);
         return;
     }
-    printSweep(results, result, options.form);
+    std::uint64_t blocks = 0;
+    for (const auto& [setup, point] : result.points) {
+        blocks += point.blocks;
+    }
+    const sweep::Shard& shard = result.part->shard;
+    stream << fmt::format("{}: part {} of {}, {} with {} blocks\n", *options.output, shard.index + 1,
+                          shard.count, counted(result.points.size(), "point", "points"), blocks);
+}
+
+/// Where an interruption loses nothing; empty: nowhere.
+std::string checkpointOf(const Options& options) {
+    if (options.checkpoint) {
+        return *options.checkpoint;
+    }
+    return options.output && isWhole(*options.output) ? *options.output + ".checkpoint" : "";
 }
 
 void runSweep(const Options& options, std::ostream& results, const MakeWorkers& makeWorkers) {
     const sweep::Configuration configuration = configurationOf(options.sweep);
     const sweep::Shard shard = shardOf(options.sweep);
-    Checkpoint checkpoint(options.checkpoint ? *options.checkpoint
-                          : options.output   ? *options.output + ".checkpoint"
-                                             : "",
-                          std::chrono::seconds(options.checkpointSeconds));
+    const std::optional<sweep::Part> part = sweep::partOf(configuration, shard);
+    Checkpoint checkpoint(checkpointOf(options), std::chrono::seconds(options.checkpointSeconds), part);
     checkOptions(options, checkpoint);
-    if (const auto result = finishedResult(options, checkpoint, configuration, shard)) {
-        printResult(options, shard, *result, results);
+    // What the output has meanwhile received would be lost, too.
+    std::optional<FileLock> lock;
+    if (options.checkpoint && options.output && isWhole(*options.output)) {
+        lock.emplace(*options.output);
+    }
+    sweep::Result result = knownResult(options, checkpoint, configuration.seed, part);
+    sweep::Dispatcher dispatcher(planOf(options, configuration, shard, result.points));
+    const bool isThere = !result.points.empty() && !checkpoint.exists();
+    if (dispatcher.hasFinished() && isThere) {
+        printResult(options, result, results);
         return;
     }
-    sweep::Plan plan{configuration, shard, {}, {}};
-    if (checkpoint.exists()) {
-        plan.start = checkpoint.load(configuration, shard).points;
-    }
-    sweep::Dispatcher dispatcher(std::move(plan));
+    bool isShown = false;
     {
         SweepWatch watch(checkpoint);
         makeWorkers(options.threads)->run(dispatcher, watch);
+        isShown = watch.finish(dispatcher) && options.form == SweepForm::table && !part;
     }
     if (!dispatcher.hasFinished()) {
+        if ((!options.output || checkpoint.file().empty()) && !isShown) {
+            printSweep(reportStream(options, results), {result.seed, dispatcher.points(), part},
+                       options.form);
+        }
         failInterrupted(dispatcher, checkpoint.save(dispatcher), checkpoint);
     }
-    const sweep::Result result{configuration, dispatcher.states()};
+    for (std::size_t i = 0; i < dispatcher.plan().points.size(); ++i) {
+        const auto known = result.points.find(dispatcher.plan().points[i].setup);
+        if (dispatcher.isLeftOut(i) && known != result.points.end() && !known->second.stoppedBy) {
+            result.points.erase(known);  // begun by a run that was interrupted
+        }
+    }
+    for (const auto& [setup, point] : dispatcher.points()) {
+        result.points.insert_or_assign(setup, point);
+    }
+    isShown = isShown && result.points.size() == dispatcher.plan().points.size();
     try {
         writeResult(options, dispatcher, result, checkpoint);
     } catch (const ToolError&) {
-        if (shard.isWhole()) {
-            printSweep(results, result, options.form);  // perhaps all that is left of it
+        if (!result.part && !isShown) {
+            printResult(options, result, results);  // perhaps all that is left of it
         }
         throw;
     }
-    printResult(options, shard, result, results);
+    if (!isShown) {
+        printResult(options, result, results);
+    }
+    if (!options.output && results.flush()) {
+        checkpoint.remove();
+    }
 }
 
 }  // namespace

@@ -5,6 +5,7 @@
 #include <utility>
 
 #include "sweep/error.hpp"
+#include "sweep/merge.hpp"
 #include "tool_error.hpp"
 
 namespace quarzel::tool {
@@ -22,5 +23,14 @@ auto aboutFile(const std::string& file, Function&& function) {
         throw fileError(file, error.problem(), error.remedy());
     }
 }
+
+/// Read a result of a sweep or a part of one.
+/// @throws ToolError when it cannot be read or is neither
+sweep::NamedResult readSweepFile(const std::string& file);
+
+/// Put what a file holds into a result that it belongs to.
+/// @param known  has the seed and the part that are expected
+/// @throws ToolError that says what to do when the file does not belong to it
+void joinSweepFile(sweep::NamedResult& known, const std::string& file);
 
 }  // namespace quarzel::tool

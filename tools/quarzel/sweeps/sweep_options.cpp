@@ -24,51 +24,84 @@ CLI::Validator atLeast(std::uint64_t least) {
                        least == 0 ? "a whole number" : fmt::format("a whole number from {}", least));
 }
 
+std::vector<link::Quantiser> quantisersOf(const SweepOptions& options) {
+    std::vector<link::Quantiser> quantisers;
+    for (const double scale : options.llrScales) {
+        quantisers.push_back({link::Quantiser::Kind::llr, scale});
+    }
+    for (const double scale : options.amplitudeScales) {
+        quantisers.push_back({link::Quantiser::Kind::amplitude, scale});
+    }
+    return quantisers.empty() ? std::vector{link::Quantiser{}} : quantisers;
+}
+
 }  // namespace
+
+CLI::Validator between(double low, double high) {
+    const auto check = [low, high](std::string& text) {
+        double value = 0;
+        const bool isGood = CLI::detail::lexical_cast(text, value) && value >= low && value <= high;
+        return isGood ? std::string() : fmt::format("'{}' is not a number from {} to {}", text, low, high);
+    };
+    return {check, ""};
+}
+
+void addCurveOptions(CLI::App& command, SweepOptions& options) {
+    addListOption(command, "--block-size", options.blockSizes, "K, as 1024, 40,6144 or all (default 1024)",
+                  "LIST", blockSizeOrAll());
+    addListOption(command, "--units", options.units, "Processing units: 2, 4 or 8 (default 2)", "LIST",
+                  unitsCheck());
+    addListOption(command, "--algorithm", options.algorithms,
+                  "0 max-log, 1 scaled-max-log (extrinsic values\nscaled by 0.75), 2 max-star; numbers or "
+                  "names\n(default 1)",
+                  "LIST", algorithmCheck());
+    addListOption(command, "--iterations", options.iterations, "Iterations, 1 to 15 (default 6)", "LIST",
+                  iterationsCheck());
+    addListOption(command, "--scale", options.amplitudeScales, "Soft value round(S y), y = +-1 + noise",
+                  "LIST", scaleCheck());
+    addListOption(command, "--llr", options.llrScales,
+                  "Soft value round(S L), L the log-likelihood ratio\n2 y / sigma^2 (default, with S = 4)",
+                  "LIST", scaleCheck());
+    command.add_option("--seed", options.seed, "Of bits and noise (default 1)")
+        ->type_name("N")
+        ->transform(atLeast(0));
+}
 
 void addSweepOptions(CLI::App& command, SweepOptions& options) {
     const auto add = [&command](const char* name, auto& value, const char* type, const char* text) {
         return command.add_option(name, value, text)->type_name(type)->check(anyText());
     };
     add("--ebn0", options.ebN0, "LIST", "Eb/N0 in dB: 0.5 or 0:0.1:1.5 or 0,1:0.5:3")->required();
-    addListOption(command, "--block-size", options.blockSizes, "K, as 1024 or 40,6144 (default 1024)", "LIST",
-                  atLeast(0));
-    addListOption(command, "--units", options.units, "Processing units: 2, 4 or 8 (default 2)", "LIST",
-                  unitsCheck());
-    addListOption(command, "--algorithm", options.algorithms,
-                  "0 max-log, 1 max-log with extrinsic values\nscaled by 0.75, 2 max-star (default 1)",
-                  "LIST", algorithmCheck());
-    addListOption(command, "--iterations", options.iterations, "Iterations, 1 to 15 (default 6)", "LIST",
-                  iterationsCheck());
-    addQuantiserOptions(command, options.quantiser);
-    add("--seed", options.seed, "N", "Of bits and noise (default 1)")->transform(atLeast(0));
+    addCurveOptions(command, options);
     command.add_flag("--per-iteration", options.perIteration, "Count errors after every iteration");
-    add("--max-block-errors", options.maxBlockErrors, "N",
+    add("--max-block-errors", options.stopRule.maxBlockErrors, "N",
         "End a point at its Nth block error (default 100;\n0: never)")
         ->transform(atLeast(0));
-    add("--max-blocks", options.maxBlocks, "N", "End a point after N blocks (default 10000)")
+    add("--max-blocks", options.stopRule.maxBlocks, "N", "End a point after N blocks (default 10000)")
         ->transform(atLeast(1));
-    add("--max-time", options.maxSeconds, "SECONDS", "End a point after this time")->transform(atLeast(1));
-    command.add_option("--shard", options.shard, "Decode part I of N only, for 'quarzel merge'")
+    add("--max-time", options.stopRule.maxSeconds, "SECONDS", "End a point after this time")
+        ->transform(atLeast(1));
+    command
+        .add_option("--target-bler", options.targetBler,
+                    "End a curve at its first point with a block error\nrate below P")
+        ->type_name("P")
+        ->transform(between(0, 1));
+    command.add_option("--shard", options.shard, "Do part I of N only, for 'quarzel merge'")
         ->type_name("I/N")
         ->check(anyText());
 }
 
 sweep::Configuration configurationOf(const SweepOptions& options) {
     sweep::Configuration configuration;
-    configuration.blockSizes.clear();
-    for (const std::uint64_t K : options.blockSizes) {
-        configuration.blockSizes.push_back(knownBlockSize(K, "--block-size").K);
-    }
+    configuration.blockSizes = blockSizesOf(options.blockSizes, "--block-size");
     configuration.units = options.units;
     configuration.algorithms = options.algorithms;
     configuration.iterations = options.iterations;
     configuration.ebN0 = readEbN0List("--ebn0", options.ebN0);
-    configuration.quantiser = options.quantiser;
+    configuration.quantisers = quantisersOf(options);
     configuration.seed = options.seed;
-    configuration.maxBlocks = options.maxBlocks;
-    configuration.maxBlockErrors = options.maxBlockErrors;
-    configuration.maxSeconds = options.maxSeconds;
+    configuration.stopRule = options.stopRule;
+    configuration.targetBler = options.targetBler;
     configuration.perIteration = options.perIteration;
     try {
         configuration.check();
@@ -79,7 +112,6 @@ sweep::Configuration configurationOf(const SweepOptions& options) {
 }
 
 sweep::Shard shardOf(const SweepOptions& options) {
-    constexpr std::uint64_t maxShards = 1'000'000;
     const std::size_t slash = options.shard.find('/');
     const ToolError bad(ExitCode::usage, "--shard", fmt::format("'{}' is not I/N", options.shard),
                         "give the number of the part, from 1, and how many there are, as 1/8");
@@ -89,12 +121,16 @@ sweep::Shard shardOf(const SweepOptions& options) {
     const std::string_view text = options.shard;
     const std::optional<std::uint64_t> number = readWholeNumber(text.substr(0, slash));
     const std::optional<std::uint64_t> count = readWholeNumber(text.substr(slash + 1));
-    if (!number || !count || *number < 1 || *number > *count || *count > maxShards) {
+    if (!number || !count || *number < 1 || *number > *count || *count > sweep::Shard::highestCount) {
         throw bad;
     }
-    if (*count > 1 && options.maxSeconds != 0) {
+    if (*count > 1 && options.stopRule.maxSeconds != 0) {
         throw ToolError(ExitCode::usage, "--max-time", "parts that end by time cannot be joined",
                         "leave out --max-time or --shard");
+    }
+    if (*count > 1 && options.targetBler != 0) {
+        throw ToolError(ExitCode::usage, "--target-bler", "parts do not know where the curves of others end",
+                        "leave out --target-bler or --shard");
     }
     return {*number - 1, *count};
 }

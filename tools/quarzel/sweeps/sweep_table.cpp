@@ -9,84 +9,97 @@ namespace quarzel::tool {
 
 namespace {
 
-using sweep::Curve;
 using sweep::PointState;
 using sweep::Rates;
+using sweep::Setup;
+
+constexpr const char* headings = "  Eb/N0    blocks bit errors  block e.       BER      BLER  95 % of BLER";
 
 double rate(std::uint64_t part, std::uint64_t whole) {
     return static_cast<double>(part) / static_cast<double>(whole);
 }
 
-/// Call a function for each point: what it is of, and whether it is the first of its curve.
-template <class Function>
-void forEachPoint(const sweep::Result& result, Function function) {
-    std::size_t next = 0;
-    for (const Curve& curve : result.configuration.curves()) {
-        for (std::size_t i = 0; i < result.configuration.ebN0.size(); ++i) {
-            function(curve, result.configuration.ebN0[i], result.points.at(next++), i == 0);
-        }
-    }
-}
-
-void printIterations(std::ostream& stream, const PointState& point, const Curve& curve) {
+void printIterations(std::ostream& stream, const Setup& setup, const PointState& point) {
     for (std::size_t i = 0; i < point.counts.size(); ++i) {
         stream << fmt::format("  after {:2}{:>14}{:>10}{:>10.2e}{:>10.2e}\n", i + 1,
                               point.counts[i].bitErrors, point.counts[i].blockErrors,
-                              rate(point.counts[i].bitErrors, point.blocks * curve.blockSize),
+                              rate(point.counts[i].bitErrors, point.blocks * setup.blockSize),
                               rate(point.counts[i].blockErrors, point.blocks));
     }
 }
 
-}  // namespace
-
-const char* const sweepHeadings = "  Eb/N0    blocks bit errors  block e.       BER      BLER  95 % of BLER";
-
-std::string curveText(const Curve& curve) {
-    return fmt::format("K {}, {} units, algorithm {}, {} iteration{}", curve.blockSize, curve.units,
-                       curve.algorithm, curve.iterations, curve.iterations == 1 ? "" : "s");
+template <class Value>
+std::string fieldText(const Value& value) {
+    return fmt::format("{}", value);
 }
 
-std::string rowText(const PointState& point, link::Decibels ebN0, const Curve& curve) {
-    const Rates rates = sweep::ratesOf(point, curve.blockSize);
-    return fmt::format("{:>7}{:>10}{:>11}{:>10}{:>10.2e}{:>10.2e}  {:.2e} {:.2e}", ebN0.value(), point.blocks,
-                       point.last().bitErrors, point.last().blockErrors, rates.ber, rates.bler,
+std::string fieldText(link::Quantiser::Kind kind) {
+    return std::string(sweep::nameOf(kind));
+}
+
+std::string reasonText(const PointState& point) {
+    return point.stoppedBy ? std::string(sweep::nameOf(*point.stoppedBy)) : "";
+}
+
+}  // namespace
+
+std::string rowText(const Setup& setup, const PointState& point) {
+    const Rates rates = sweep::ratesOf(point, setup.blockSize);
+    return fmt::format("{:>7}{:>10}{:>11}{:>10}{:>10.2e}{:>10.2e}  {:.2e} {:.2e}", setup.ebN0.value(),
+                       point.blocks, point.last().bitErrors, point.last().blockErrors, rates.ber, rates.bler,
                        rates.blerInterval.low, rates.blerInterval.high);
 }
 
+void printFieldNames(std::ostream& stream) {
+    const Setup any;
+    sweep::forEachField(any, [&stream](const char* name, const auto&) { stream << name << ','; });
+}
+
+void printFields(std::ostream& stream, const Setup& curve) {
+    sweep::forEachField(curve,
+                        [&stream](const char*, const auto& value) { stream << fieldText(value) << ','; });
+}
+
+void printPoint(std::ostream& stream, const Setup& setup, const PointState& point, bool isFirst) {
+    if (isFirst) {
+        stream << sweep::curveText(setup) << '\n' << headings << '\n';
+    }
+    stream << rowText(setup, point) << '\n';
+    if (point.counts.size() > 1) {
+        printIterations(stream, setup, point);
+    }
+}
+
 void printTable(std::ostream& stream, const sweep::Result& result) {
-    forEachPoint(result, [&](const Curve& curve, link::Decibels ebN0, const PointState& point, bool isFirst) {
-        if (isFirst) {
-            stream << curveText(curve) << '\n' << sweepHeadings << '\n';
-        }
-        stream << rowText(point, ebN0, curve) << '\n';
-        if (result.configuration.perIteration) {
-            printIterations(stream, point, curve);
-        }
-    });
+    const Setup* last = nullptr;
+    for (const auto& [setup, point] : result.points) {
+        printPoint(stream, setup, point, last == nullptr || !sweep::isSameCurve(setup, *last));
+        last = &setup;
+    }
 }
 
 void printCsv(std::ostream& stream, const sweep::Result& result) {
-    stream << "block_size,units,algorithm,iterations,ebn0_db,iteration,blocks,bits,bit_errors,block_errors,"
-              "ber,bler,"
-              "ber_low,ber_high,bler_low,bler_high,stopped_by\n";
-    forEachPoint(result, [&](const Curve& curve, link::Decibels ebN0, const PointState& point, bool) {
-        const Rates rates = sweep::ratesOf(point, curve.blockSize);
-        const std::uint64_t bits = point.blocks * curve.blockSize;
+    printFieldNames(stream);
+    stream << "ebn0_db,iteration,blocks,bits,bit_errors,block_errors,ber,bler,ber_low,ber_high,bler_low,"
+              "bler_high,stopped_by\n";
+    for (const auto& [setup, point] : result.points) {
+        const Rates rates = sweep::ratesOf(point, setup.blockSize);
+        const std::uint64_t bits = point.blocks * setup.blockSize;
         for (std::size_t i = 0; i < point.counts.size(); ++i) {
             const sweep::ErrorCount& count = point.counts[i];
             const bool isLast = i + 1 == point.counts.size();
             const std::size_t iteration =
-                static_cast<std::size_t>(curve.iterations) - point.counts.size() + i + 1;
-            stream << fmt::format("{},{},{},{},{},{},{},{},{},{},{},{},", curve.blockSize, curve.units,
-                                  curve.algorithm, curve.iterations, ebN0.value(), iteration, point.blocks,
+                static_cast<std::size_t>(setup.iterations) - point.counts.size() + i + 1;
+            printFields(stream, setup);
+            stream << fmt::format("{},{},{},{},{},{},{},{},", setup.ebN0.value(), iteration, point.blocks,
                                   bits, count.bitErrors, count.blockErrors, rate(count.bitErrors, bits),
-                                  rate(count.blockErrors, point.blocks));
-            stream << (isLast ? fmt::format("{},{},{},{}", rates.berInterval.low, rates.berInterval.high,
+                                  rate(count.blockErrors, point.blocks))
+                   << (isLast ? fmt::format("{},{},{},{}", rates.berInterval.low, rates.berInterval.high,
                                             rates.blerInterval.low, rates.blerInterval.high)
                               : ",,,")
-                   << ',' << sweep::nameOf(point.stoppedBy.value()) << '\n';
+                   << ',' << reasonText(point) << '\n';
         }
-    });
+    }
 }
 
 void printSweep(std::ostream& stream, const sweep::Result& result, SweepForm form) {

@@ -10,12 +10,17 @@
 /// The forms in which a sweep's result is printed.
 namespace quarzel::tool {
 
-/// "K 1024, 2 units, algorithm 1, 8 iterations".
-std::string curveText(const sweep::Curve& curve);
+/// The row of a point; it fits 80 columns.
+std::string rowText(const sweep::Setup& setup, const sweep::PointState& point);
 
-/// The headings of the columns, and a point below them.
-extern const char* const sweepHeadings;
-std::string rowText(const sweep::PointState& point, link::Decibels ebN0, const sweep::Curve& curve);
+/// Print a point of a table.
+/// @param isFirst  of its curve: headings come before it
+void printPoint(std::ostream& stream, const sweep::Setup& setup, const sweep::PointState& point,
+                bool isFirst);
+
+/// The columns of CSV that tell a curve, each followed by a comma: their names, and what they hold.
+void printFieldNames(std::ostream& stream);
+void printFields(std::ostream& stream, const sweep::Setup& curve);
 
 void printTable(std::ostream& stream, const sweep::Result& result);
 

@@ -6,6 +6,9 @@
 
 #include <iostream>
 
+#include "sweeps/live_table.hpp"
+#include "sweeps/sweep_log.hpp"
+
 namespace quarzel::tool {
 
 namespace {
@@ -16,17 +19,27 @@ std::size_t terminalWidth() {
     return ::ioctl(STDERR_FILENO, TIOCGWINSZ, &size) == 0 ? size.ws_col : 0;
 }
 
+std::unique_ptr<SweepDisplay> makeDisplay() {
+    if (::isatty(STDERR_FILENO) != 0) {
+        return std::make_unique<LiveTable>(std::cerr, terminalWidth);
+    }
+    return std::make_unique<SweepLog>(std::cerr);
+}
+
 }  // namespace
 
-SweepWatch::SweepWatch(Checkpoint& checkpoint)
-    : itsTable(std::cerr, ::isatty(STDERR_FILENO) != 0, terminalWidth()), itsCheckpoint(checkpoint) {}
+SweepWatch::SweepWatch(Checkpoint& checkpoint) : itsDisplay(makeDisplay()), itsCheckpoint(checkpoint) {}
 
 void SweepWatch::tick(sweep::Dispatcher& dispatcher) {
     if (itsInterruption.hasCome()) {
         dispatcher.stop();
     }
-    itsTable.update(dispatcher);
+    itsDisplay->update(dispatcher);
     itsCheckpoint.update(dispatcher);
+}
+
+bool SweepWatch::finish(const sweep::Dispatcher& dispatcher) {
+    return itsDisplay->finish(dispatcher) && ::isatty(STDOUT_FILENO) != 0;
 }
 
 }  // namespace quarzel::tool

@@ -8,9 +8,9 @@
 #include <utility>
 
 #include "options/threads_option.hpp"
+#include "report_text.hpp"
 #include "sweep/result.hpp"
 #include "sweeps/sweep_files.hpp"
-#include "sweeps/sweep_table.hpp"
 #include "sweeps/sweep_watch.hpp"
 
 namespace quarzel::tool {
@@ -26,9 +26,9 @@ constexpr const char* description = "Run the sweep of a result file again";
 
 constexpr const char* footer =
     R"(RESULT is a file that 'quarzel sweep -o' or 'quarzel merge -o' has written. Its
-sweep is run once more, which takes as long as it took, and the two files are
-compared byte by byte. Points that --max-time has ended get the same number of
-blocks. The file may come from another version of quarzel.
+points are simulated once more, each up to its last block, which takes as long
+as it took, and the two files are compared byte by byte. The file may come from
+another version of quarzel; of one in an older format the numbers are compared.
 
 Example:
   quarzel verify-result result.json
@@ -36,51 +36,62 @@ Example:
 
 /// "K 1024, ..., 0.4 dB: 12 bit errors in 600 blocks, and 13 in 600 when run again": the first point that
 /// differs.
-std::string firstDifference(const sweep::Result& stored, const sweep::Result& again) {
-    const std::vector<sweep::Curve> curves = stored.configuration.curves();
-    const std::size_t pointsPerCurve = stored.configuration.ebN0.size();
-    for (std::size_t i = 0; i < stored.points.size(); ++i) {
-        const sweep::PointState& a = stored.points[i];
-        const sweep::PointState& b = again.points[i];
-        if (a.blocks != b.blocks || a.last().bitErrors != b.last().bitErrors ||
-            a.last().blockErrors != b.last().blockErrors) {
+std::string firstDifference(const sweep::Points& stored, const sweep::Points& again) {
+    for (const auto& [setup, a] : stored) {
+        const sweep::PointState& b = again.at(setup);
+        if (a.blocks != b.blocks || a.last() != b.last()) {
             return fmt::format(
-                "{}, {} dB: {} bit errors and {} block errors in {} blocks; when run again {} and {} in {}",
-                curveText(curves[i / pointsPerCurve]), stored.configuration.ebN0[i % pointsPerCurve].value(),
-                a.last().bitErrors, a.last().blockErrors, a.blocks, b.last().bitErrors, b.last().blockErrors,
-                b.blocks);
+                "{}: {} bit errors and {} block errors in {} blocks; when run again {} and {} in {}",
+                sweep::setupText(setup), a.last().bitErrors, a.last().blockErrors, a.blocks,
+                b.last().bitErrors, b.last().blockErrors, b.blocks);
         }
     }
-    return "the counts are the same, what is computed from them or its form is not";
+    return "the errors after the last iteration are the same, something else is not";
+}
+
+/// The points of a dispatcher, ended for the same reasons as the stored ones: what the clock or a signal has
+/// done cannot be repeated.
+sweep::Points repeated(const sweep::Dispatcher& dispatcher, const sweep::Points& stored) {
+    sweep::Points points = dispatcher.points();
+    for (auto& [setup, point] : points) {
+        const sweep::PointState& former = stored.at(setup);
+        if (point.stoppedBy == sweep::StopReason::blocks) {
+            point.stoppedBy = former.stoppedBy;
+        }
+        point.seconds = former.seconds;
+    }
+    return points;
 }
 
 ExitCode verify(const Options& options, std::ostream& results, const MakeWorkers& makeWorkers) {
     const std::string text = readBytes(options.file);
-    const sweep::Result stored = aboutFile(options.file, [&text] { return sweep::readResult(text); });
-    sweep::Plan plan{stored.configuration, {}, {}, {}};
-    std::uint64_t blocks = 0;
-    for (const sweep::PointState& point : stored.points) {
-        plan.timedOut.push_back(point.stoppedBy == sweep::StopReason::time ? point.blocks : 0);
-        blocks += point.blocks;
-    }
-    sweep::Dispatcher dispatcher(std::move(plan));
+    sweep::Result result = aboutFile(options.file, [&text] { return sweep::readResult(text); });
+    const sweep::Points stored = result.points;
+    const std::string renewed = sweep::resultText(result);
+    sweep::Dispatcher dispatcher(sweep::repetitionOf(result.seed, stored));
     {
         Checkpoint none("", std::chrono::seconds(0));
         SweepWatch watch(none);
         makeWorkers(options.threads)->run(dispatcher, watch);
+        watch.finish(dispatcher);
     }
     if (!dispatcher.hasFinished()) {
         throw ToolError(ExitCode::interrupted, options.file, "the verification was interrupted",
                         "run it again");
     }
-    const sweep::Result again{stored.configuration, dispatcher.states(), stored.quarzel};
-    if (sweep::resultText(again) == text) {
-        results << fmt::format("{}: the same byte for byte, {} points with {} blocks\n", options.file,
-                               stored.points.size(), blocks);
-        return ExitCode::done;
+    result.points = repeated(dispatcher, stored);
+    if (sweep::resultText(result) != renewed) {
+        results << fmt::format("{}: differs: {}\n", options.file, firstDifference(stored, result.points));
+        return ExitCode::resultsDiffer;
     }
-    results << fmt::format("{}: differs: {}\n", options.file, firstDifference(stored, again));
-    return ExitCode::resultsDiffer;
+    std::uint64_t blocks = 0;
+    for (const auto& [setup, point] : stored) {
+        blocks += point.blocks;
+    }
+    results << fmt::format("{}: the same {}, {} with {} blocks\n", options.file,
+                           renewed == text ? "byte for byte" : "in every number",
+                           counted(stored.size(), "point", "points"), blocks);
+    return ExitCode::done;
 }
 
 }  // namespace

@@ -62,21 +62,22 @@ struct CorePlace {
 };
 
 CorePlace placeOf(const std::string& name) {
+    std::error_code ignored;
     fs::path directory = fs::path(name).lexically_normal();
-    if (!fs::is_directory(directory)) {
+    if (!fs::is_directory(directory, ignored)) {
         directory = directory.has_parent_path() ? directory.parent_path() : fs::path(".");
     }
-    if (fs::exists(directory / manifestName)) {
+    if (fs::exists(directory / manifestName, ignored)) {
         return {directory.string(), ""};
     }
-    const fs::path core = fs::canonical(directory);
+    const fs::path core = fs::canonical(directory, ignored);
     // Beside the name that the user gave, where that is possible, so that messages show it.
     if (!directory.has_filename()) {
         directory = directory.parent_path();
     }
     const bool isNamed = directory.filename() == core.filename();
     const fs::path set = isNamed ? directory.parent_path() : core.parent_path();
-    if (!fs::exists(core.parent_path() / manifestName)) {
+    if (!fs::exists(core.parent_path() / manifestName, ignored)) {
         throw fileError(name, "is not part of a vector set",
                         "name the directory of a core that 'quarzel vectors' made");
     }
@@ -133,8 +134,7 @@ ExpectedDecisions readPacked(std::istream& stream, const std::string& file) {
             "expected bits have shape (blocks, K/8), 8 to a byte, as 'quarzel decode -o' makes them");
     }
     const auto bytes = static_cast<std::size_t>(header.shape[1]);
-    stream.seekg(0);
-    const PackedBits packed = readBits(stream, file, header.shape[0], bytes);
+    const PackedBits packed = readBitsAfter(header, stream, file, header.shape[0], bytes);
     ExpectedDecisions expected{file, {}, {}};
     for (std::size_t block = 0; block < packed.blocks(); ++block) {
         expected.blocks.push_back({static_cast<std::uint32_t>(8 * bytes), block * 8 * bytes, "", ""});

@@ -4,9 +4,11 @@
 #include <fmt/format.h>
 
 #include <algorithm>
+#include <iterator>
 #include <nlohmann/json.hpp>
 
 #include "files/input_file.hpp"
+#include "sweep/json_text.hpp"
 #include "tool_error.hpp"
 
 namespace quarzel::tool {
@@ -89,9 +91,10 @@ std::string manifestText(const Json& configuration, const Json& coverage, const 
 VectorContent readManifest(const std::string& directory) {
     const std::string file = directory + '/' + manifestName;
     std::ifstream stream = openInput(file);
+    const std::string text(std::istreambuf_iterator<char>(stream), {});
     constexpr const char* remedy = "make the set again with 'quarzel vectors'";
     try {
-        const Json manifest = Json::parse(stream);
+        const Json manifest = sweep::parseJson(text);
         if (manifest.at("format") != format) {
             throw fileError(file, "is not a manifest of test vectors", remedy);
         }

@@ -1,6 +1,9 @@
 // SPDX-License-Identifier: MIT
 #pragma once
 
+#include <sys/types.h>
+
+#include <optional>
 #include <string>
 #include <string_view>
 #include <vector>
@@ -13,11 +16,10 @@ namespace quarzel::tool {
 /// the end. Without `finish` nothing is left of it.
 class OutputDirectory {
   public:
-    /// @param name       of the directory, which is missing or empty
+    /// @param name        of the directory, which is missing or empty
     /// @param isReplaced  an older vector set of that name, and nothing else, may be there too; it goes once
-    /// the
-    ///                   new one is whole
-    /// @throws ToolError when something else is there, or it cannot be made
+    ///                    the new one is whole, but for files that have appeared in it meanwhile
+    /// @throws ToolError when something else is there, or the directory could not be put in its place
     OutputDirectory(const std::string& name, bool isReplaced);
     OutputDirectory(const OutputDirectory&) = delete;
     OutputDirectory& operator=(const OutputDirectory&) = delete;
@@ -33,9 +35,14 @@ class OutputDirectory {
     void finish();
 
   private:
-    std::string itsName;           ///< as the user gave it
-    std::string itsTarget;         ///< the same without a slash at the end, links followed
-    std::string itsTemporaryName;  ///< empty: gone
+    void prepare();
+    void exchange();
+
+    std::string itsName;                    ///< as the user gave it
+    std::string itsTarget;                  ///< the same without a slash at the end, links followed
+    std::optional<VectorContent> itsOlder;  ///< the set that is replaced
+    ino_t itsOlderInode = 0;                ///< of its directory
+    std::string itsTemporaryName;           ///< empty: gone
 };
 
 }  // namespace quarzel::tool

@@ -20,7 +20,7 @@ struct VectorRequest {
     std::size_t blocks = 0;  ///< of each stimulus
     bool cover = false;      ///< every block size once with each of its iterations in turn, and all stimuli
     link::Decibels ebN0;     ///< of the noise
-    link::Quantiser quantiser = {link::Quantiser::Kind::llr, 4};
+    link::Quantiser quantiser;
     std::uint64_t seed = 1;
 };
 

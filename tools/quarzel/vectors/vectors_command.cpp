@@ -88,25 +88,6 @@ std::vector<Value> orDefault(const std::vector<Value>& values, std::vector<Value
     return values.empty() ? std::move(standard) : values;
 }
 
-std::vector<std::uint32_t> allBlockSizes() {
-    std::vector<std::uint32_t> sizes;
-    for (const BlockSize& size : blockSizes()) {
-        sizes.push_back(size.K);
-    }
-    return sizes;
-}
-
-std::vector<std::uint32_t> blockSizesOf(const std::vector<std::string>& texts) {
-    std::vector<std::uint32_t> sizes;
-    for (const std::string& text : texts) {
-        if (text == "all") {
-            return allBlockSizes();
-        }
-        sizes.push_back(knownBlockSize(std::stoull(text), "--block-size").K);
-    }
-    return sizes;
-}
-
 std::vector<int> numbersTo(int last) {
     std::vector<int> numbers(static_cast<std::size_t>(last));
     std::iota(numbers.begin(), numbers.end(), 1);
@@ -125,7 +106,7 @@ VectorRequest requestOf(const VectorsOptions& options) {
     if (request.cover) {
         requireUnused(!options.blockSizes.empty(), "--block-size");
         requireUnused(!options.stimuli.empty(), "--stimulus");
-        request.blockSizes = allBlockSizes();
+        request.blockSizes = blockSizesOf({"all"}, "--block-size");
         request.units = orDefault(request.units, {2, 4, 8});
         request.algorithms = orDefault(request.algorithms, {0, 1, 2});
         request.iterations = orDefault(request.iterations, numbersTo(15));
@@ -133,7 +114,7 @@ VectorRequest requestOf(const VectorsOptions& options) {
             request.stimuli.push_back(static_cast<Stimulus>(i));
         }
     } else {
-        request.blockSizes = orDefault(blockSizesOf(options.blockSizes), {40});
+        request.blockSizes = orDefault(blockSizesOf(options.blockSizes, "--block-size"), {40});
         request.units = orDefault(request.units, {2});
         request.algorithms = orDefault(request.algorithms, {1});
         request.iterations = orDefault(request.iterations, {6});
@@ -202,12 +183,6 @@ CLI::Validator oneOfStimuli() {
                        : fmt::format("'{}' is none of {}", text, fmt::join(stimulusNames, ", "));
     };
     return withChoices({check, ""}, {stimulusNames.begin(), stimulusNames.end()});
-}
-
-/// A block size in decimal, or the word for all.
-CLI::Validator blockSizeOrAll() {
-    const CLI::Validator number = wholeNumber([](std::uint64_t) { return true; }, "a whole number");
-    return {[number](std::string& text) { return text == "all" ? std::string() : number(text); }, ""};
 }
 
 }  // namespace

@@ -1,0 +1,24 @@
+// SPDX-License-Identifier: MIT
+#include "link/channel/channel.hpp"
+
+#include "link/channel/fading_channel.hpp"
+#include "link/channel/pam_channel.hpp"
+#include "link/quantised_channel.hpp"
+
+namespace quarzel::link {
+
+bool isMemoryless(const ChannelSetup& setup) {
+    return setup.fading == Fading::none && amplitudes(setup.modulation).size() == 2;
+}
+
+std::unique_ptr<const Channel> makeChannel(const ChannelSetup& setup, Decibels ebN0, CodeRate rate) {
+    if (isMemoryless(setup)) {
+        return std::make_unique<QuantisedChannel>(setup.quantiser, ebN0, rate);
+    }
+    if (setup.fading == Fading::none) {
+        return std::make_unique<PamChannel>(setup, ebN0, rate);
+    }
+    return std::make_unique<FadingChannel>(setup, ebN0, rate);
+}
+
+}  // namespace quarzel::link

@@ -1,0 +1,66 @@
+// SPDX-License-Identifier: MIT
+#include "sweep/setup.hpp"
+
+#include <fmt/format.h>
+
+#include "quarzel/code.hpp"
+#include "sweep/error.hpp"
+
+namespace quarzel::sweep {
+
+namespace {
+
+constexpr link::Decibels lowestEbN0 = {-20'000'000};
+constexpr link::Decibels highestEbN0 = {40'000'000};
+
+template <class Value>
+void require(bool isPossible, const char* name, Value value, const char* wanted) {
+    if (!isPossible) {
+        throw Error(fmt::format("{} {} is not possible", name, value), fmt::format("give {}", wanted));
+    }
+}
+
+}  // namespace
+
+void Setup::check() const {
+    require(findBlockSize(blockSize).has_value(), "block size", blockSize,
+            "one of the 188 sizes of LTE, 40 to 6144");
+    require(units == 2 || units == 4 || units == 8, "units", units, "2, 4 or 8");
+    require(algorithm >= 0 && algorithm <= 2, "algorithm", algorithm, "0, 1 or 2");
+    require(iterations >= 1 && iterations <= 15, "iterations", iterations, "a number from 1 to 15");
+    require(quantiser.scale > 0 && quantiser.scale <= link::Quantiser::highestScale, "scale", quantiser.scale,
+            "a number above 0 and up to 1000000");
+    if (ebN0 < lowestEbN0 || ebN0 > highestEbN0) {
+        throw Error("Eb/N0 lies outside -20 to 40 dB", "give values inside");
+    }
+}
+
+std::string_view nameOf(link::Quantiser::Kind kind) {
+    return kind == link::Quantiser::Kind::llr ? "llr" : "scale";
+}
+
+std::optional<link::Quantiser::Kind> quantiserKindOf(std::string_view name) {
+    for (const auto kind : {link::Quantiser::Kind::llr, link::Quantiser::Kind::amplitude}) {
+        if (nameOf(kind) == name) {
+            return kind;
+        }
+    }
+    return std::nullopt;
+}
+
+bool isSameCurve(Setup a, const Setup& b) {
+    a.ebN0 = b.ebN0;
+    return a == b;
+}
+
+std::string curveText(const Setup& setup) {
+    return fmt::format("K {}, {} units, algorithm {}, {} iteration{}, {} {}", setup.blockSize, setup.units,
+                       setup.algorithm, setup.iterations, setup.iterations == 1 ? "" : "s",
+                       nameOf(setup.quantiser.kind), setup.quantiser.scale);
+}
+
+std::string setupText(const Setup& setup) {
+    return fmt::format("{}, {} dB", curveText(setup), setup.ebN0.value());
+}
+
+}  // namespace quarzel::sweep

@@ -1,0 +1,13 @@
+// SPDX-License-Identifier: MIT
+#pragma once
+
+#include <CLI/CLI.hpp>
+#include <ostream>
+
+namespace quarzel::tool {
+
+/// Add `quarzel show`, which prints a stored result of a sweep.
+/// @param results  where it prints it; must outlive the parse
+void addShowCommand(CLI::App& app, std::ostream& results);
+
+}  // namespace quarzel::tool

@@ -1,0 +1,15 @@
+// SPDX-License-Identifier: MIT
+#pragma once
+
+#include <CLI/CLI.hpp>
+#include <ostream>
+
+#include "sweeps/sweep_command.hpp"
+
+namespace quarzel::tool {
+
+/// Add `quarzel threshold`, which looks for the Eb/N0 at which a block error rate is reached.
+/// @param results  where it prints what it finds; must outlive the parse
+void addThresholdCommand(CLI::App& app, std::ostream& results, MakeWorkers makeWorkers);
+
+}  // namespace quarzel::tool
