@@ -1,14 +1,15 @@
 # SPDX-License-Identifier: MIT
 # The commands of the README. Each does its own set-up.
-.PHONY: help demo test test-long bench docs package format
+.PHONY: help demo test test-long bench docs package validate format
 
 help:
 	@echo "make demo       install what is missing, build, and decode the captures that come with the project"
 	@echo "make test       install what is missing, build, and run every test, the library's with sanitizers, too"
-	@echo "make test-long  the checks that take an hour or two: the tool with sanitizers, 64-bit Arm, whole domains, proofs, bindings without the tool, the analyser"
+	@echo "make test-long  the checks that take an hour or two: the tool with sanitizers, 64-bit Arm, whole domains, proofs, Slurm, bindings without the tool, the analyser"
 	@echo "make bench      build and run the benchmarks"
 	@echo "make docs       build the site of the pages and the headers in build/docs/site, with its links checked"
 	@echo "make package    build the Debian packages in build/package, and ask lintian about them"
+	@echo "make validate   simulate and draw docs/validation.md anew, a quarter of an hour"
 	@echo "make format     format the sources"
 
 demo:
@@ -31,6 +32,7 @@ test-long:
 	@scripts/build.sh release
 	@tests/style/lint.sh . build/release --analyse
 	@QUARZEL_TEST_EXHAUSTIVE=1 ctest --preset release -R 'Lane|DecodeGrid|PlainDecoder|CoveringBlocks|MaxStar|Wrap16|RateMatching|RateRecovery|Segmentation|TurboEncoding'
+	@tests/sweep/slurm_test.sh . build/release
 	@tests/bindings/without_tool.sh . build/without-tool
 	@tests/bindings/python/pip_test.sh . /usr/bin/python3 python lte cocotb python_sweeps
 	@scripts/package.sh
@@ -56,6 +58,12 @@ docs:
 package:
 	@scripts/install-packages.sh package
 	@scripts/package.sh
+
+validate:
+	@scripts/install-packages.sh test
+	@scripts/build.sh release
+	@scripts/build.sh bench
+	@scripts/validate.sh
 
 format:
 	@scripts/install-packages.sh test

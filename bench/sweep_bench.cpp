@@ -46,6 +46,7 @@ void sweepAndDecoder(benchmark::State& bench) {
                              static_cast<int>(bench.range(2)),
                              sweepIterations,
                              {},
+                             {},
                              ebN0};
     const std::vector<std::uint64_t> octets = octetsOf(setup.blockSize);
 
@@ -114,8 +115,8 @@ void chainAndDecoder(benchmark::State& bench) {
 void everyIteration(benchmark::State& bench) {
     sweep::Channels channels;
     sweep::BlockSimulator simulator(1, channels);
-    const sweep::Setup setup{static_cast<std::uint32_t>(bench.range(0)), 8,  1,
-                             static_cast<int>(bench.range(1)),           {}, ebN0};
+    const sweep::Setup setup{
+        static_cast<std::uint32_t>(bench.range(0)), 8, 1, static_cast<int>(bench.range(1)), {}, {}, ebN0};
     const std::vector<std::uint64_t> octets = octetsOf(setup.blockSize);
     const auto secondsOf = [&](std::size_t counts) {
         const double start = threadSeconds();

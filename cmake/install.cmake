@@ -3,10 +3,6 @@
 # examples, and what Python's and Octave's own installers take.
 include(CMakePackageConfigHelpers)
 
-# Everybody may read what is installed, whatever the umask of the one who installs it.
-set(CMAKE_INSTALL_DEFAULT_DIRECTORY_PERMISSIONS
-    OWNER_READ OWNER_WRITE OWNER_EXECUTE GROUP_READ GROUP_EXECUTE WORLD_READ WORLD_EXECUTE)
-
 set(package_dir ${CMAKE_INSTALL_LIBDIR}/cmake/vardel_ip_quarzel)
 install(TARGETS vardel_ip_quarzel vardel_ip_quarzel_static EXPORT vardel_ip_quarzel)
 install(FILES ${PROJECT_SOURCE_DIR}/include/vardel_ip_quarzel.h TYPE INCLUDE)

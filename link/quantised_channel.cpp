@@ -2,9 +2,9 @@
 #include "link/quantised_channel.hpp"
 
 #include <algorithm>
-#include <cstring>
+#include <bit>
 
-#include "link/refinement.hpp"
+#include "link/search_table.hpp"
 
 namespace quarzel::link {
 
@@ -22,9 +22,11 @@ std::uint32_t halfWordOf(const std::uint32_t* words, std::size_t value) {
 
 }  // namespace
 
-QuantisedChannel::QuantisedChannel(const Quantiser& quantiser, Decibels ebN0, CodeRate rate)
-    : itsThresholds(channelThresholds(quantiser, ebN0, rate)) {
+QuantisedChannel::QuantisedChannel(const Quantiser& quantiser, Decibels ebN0, CodeRate rate,
+                                   const DrawFunctions& draw)
+    : itsDraw(draw), itsThresholds(channelThresholds(quantiser, ebN0, rate)) {
     makeCells();
+    itsSearch = makeSearchTable(itsThresholds, itsCells);
 }
 
 /// The upper 16 bits of a random number decide its output unless a threshold lies inside the 2^32 numbers
@@ -58,44 +60,58 @@ int QuantisedChannel::outputOf(std::uint64_t random) const {
     return lowestOutput + static_cast<int>(above - itsThresholds.begin());
 }
 
-std::int8_t QuantisedChannel::softOf(std::uint64_t random, bool codeBit) const {
-    const int output = outputOf(random);
+/// The output for 16 random bits that may leave it open, and further ones if they do.
+std::int8_t QuantisedChannel::decide(std::uint32_t random, bool codeBit, Refinement& refinement) const {
+    const std::int32_t cell = itsCells[random >> 4];
+    const bool isOpen =
+        (cell & cellManyThresholds) != 0 || static_cast<std::int32_t>(random & 15U) == (cell & cellLowMask);
+    const std::uint64_t all = std::uint64_t{random} << refinementBits | (isOpen ? refinement.next() : 0);
+    int output = cell >> cellValueShift;
+    while (output < highestOutput && itsThresholds[static_cast<std::size_t>(output - lowestOutput)] <= all) {
+        ++output;
+    }
     return static_cast<std::int8_t>(std::min(codeBit ? output : -output, 127));
+}
+
+/// The outputs that 16 random bits decide, and which are still open.
+void QuantisedChannel::draw(const std::uint32_t* words, const std::uint8_t* codeBits, unsigned lane,
+                            std::size_t count, std::int8_t* soft, std::uint32_t* undecided) const {
+    if (itsDraw.search != nullptr && itsSearch.levels != 0) {
+        itsDraw.search(words, codeBits, lane, itsSearch, count, soft, undecided);
+        return;
+    }
+    const std::size_t times = count / valuesPerLookUp;
+    const std::size_t rest = count % valuesPerLookUp;
+    itsDraw.lookUp(words, codeBits, lane, itsCells.data(), times, soft, undecided);
+    if (rest != 0) {
+        std::array<std::uint8_t, valuesPerLookUp> lastBits{};
+        std::array<std::int8_t, valuesPerLookUp> lastSoft;
+        const std::size_t at = times * valuesPerLookUp;
+        std::copy_n(codeBits + at, rest, lastBits.begin());
+        itsDraw.lookUp(words + at / 2, lastBits.data(), lane, itsCells.data(), 1, lastSoft.data(),
+                       undecided + times);
+        undecided[times] &= (std::uint32_t{1} << rest) - 1;
+        std::copy_n(lastSoft.begin(), rest, soft + at);
+    }
 }
 
 void QuantisedChannel::transmit(const RandomSource& source, const std::uint8_t* codeBits, unsigned lane,
                                 std::size_t count, std::int8_t* soft) const {
-    const DrawFunctions& draw = drawFunctions();
     std::array<std::uint32_t, groupsAtOnce * wordsPerGroup> words;
-    std::array<std::uint8_t, valuesAtOnce> isUndecided;
-    std::array<std::uint8_t, valuesPerLookUp> lastBits{};
-    std::array<std::int8_t, valuesPerLookUp> lastSoft;
+    std::array<std::uint32_t, valuesAtOnce / valuesPerLookUp> undecided;
     Refinement refinement(source, Purpose::refinement);
     for (std::size_t start = 0; start < count; start += valuesAtOnce) {
         const std::size_t size = std::min(valuesAtOnce, count - start);
         source.words(Purpose::noise, static_cast<std::uint32_t>(start / (2 * wordsPerGroup)),
                      (size + 2 * wordsPerGroup - 1) / (2 * wordsPerGroup), words.data());
-        const std::size_t times = size / valuesPerLookUp;
-        const std::size_t rest = size % valuesPerLookUp;
-        draw.lookUp(words.data(), codeBits + start, lane, itsCells.data(), times, soft + start,
-                    isUndecided.data());
-        if (rest != 0) {
-            const std::size_t at = times * valuesPerLookUp;
-            std::copy_n(codeBits + start + at, rest, lastBits.begin());
-            draw.lookUp(words.data() + times * (valuesPerLookUp / 2), lastBits.data(), lane, itsCells.data(),
-                        1, lastSoft.data(), isUndecided.data() + at);
-            std::copy_n(lastSoft.begin(), rest, soft + start + at);
-        }
-        for (std::size_t i = 0; i < size; i += 8) {
-            std::uint64_t any = 0;
-            std::memcpy(&any, isUndecided.data() + i, 8);
-            for (std::size_t j = i; any != 0 && j < std::min(i + 8, size); ++j) {
-                if (isUndecided[j] != 0) {
-                    const std::size_t at = start + j;
-                    const std::uint64_t random =
-                        std::uint64_t{halfWordOf(words.data(), j)} << refinementBits | refinement.next();
-                    soft[at] = softOf(random, (codeBits[at] >> lane & 1U) != 0);
-                }
+        draw(words.data(), codeBits + start, lane, size, soft + start, undecided.data());
+        for (std::size_t time = 0; time * valuesPerLookUp < size; ++time) {
+            for (std::uint32_t bits = undecided[time]; bits != 0; bits &= bits - 1) {
+                const std::size_t value =
+                    time * valuesPerLookUp + static_cast<std::size_t>(std::countr_zero(bits));
+                const std::size_t at = start + value;
+                soft[at] =
+                    decide(halfWordOf(words.data(), value), (codeBits[at] >> lane & 1U) != 0, refinement);
             }
         }
     }

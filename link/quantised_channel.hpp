@@ -8,17 +8,21 @@
 #include "link/channel/channel.hpp"
 #include "link/channel_thresholds.hpp"
 #include "link/random_source.hpp"
+#include "link/refinement.hpp"
 
 namespace quarzel::link {
 
 /// BPSK (bit 1 is sent as +1, bit 0 as -1) or a component of QPSK over additive white Gaussian noise,
 /// quantised to the 8-bit inputs of the core, as one discrete channel: its output is drawn from the exact
-/// distribution, to 2^-48, by a table look-up.
+/// distribution, to 2^-48, by a search in
+/// registers or a table look-up.
 ///
 /// Thread rule: `transmit` may be called from several threads at once.
 class QuantisedChannel : public Channel {
   public:
-    QuantisedChannel(const Quantiser& quantiser, Decibels ebN0, CodeRate rate = {});
+    /// @param draw  not owned, must outlive the channel; all give the same outputs
+    QuantisedChannel(const Quantiser& quantiser, Decibels ebN0, CodeRate rate = {},
+                     const DrawFunctions& draw = drawFunctions());
 
     /// Send the code bits of a block.
     /// @param source    the block's random numbers; value i depends on them and on code bit i alone
@@ -33,11 +37,15 @@ class QuantisedChannel : public Channel {
 
   private:
     int outputOf(std::uint64_t random) const;
-    std::int8_t softOf(std::uint64_t random, bool codeBit) const;
     void makeCells();
+    void draw(const std::uint32_t* words, const std::uint8_t* codeBits, unsigned lane, std::size_t count,
+              std::int8_t* soft, std::uint32_t* undecided) const;
+    std::int8_t decide(std::uint32_t random, bool codeBit, Refinement& refinement) const;
 
+    const DrawFunctions& itsDraw;
     ChannelThresholds itsThresholds;
     std::array<std::int32_t, cellCount> itsCells{};
+    SearchTable itsSearch;
 };
 
 }  // namespace quarzel::link

@@ -1,6 +1,8 @@
 // SPDX-License-Identifier: MIT
 #include "link/random_source.hpp"
 
+#include <Random123/philox.h>
+
 #include <algorithm>
 #include <array>
 #include <cstring>
@@ -83,8 +85,21 @@ void RandomSource::words(Purpose purpose, std::uint32_t firstGroup, std::size_t 
 
 void RandomSource::informationBits(unsigned lane, std::uint8_t* bits) const {
     constexpr std::uint32_t bitsPerGroup = 32 * wordsPerGroup;
+    constexpr std::uint32_t fewBits = 4 * 32;
     std::array<std::uint32_t, wordsPerGroup> words;
     const std::uint32_t size = itsName.transportBlock != 0 ? itsName.transportBlock : itsName.blockSize;
+    if (size <= fewBits) {
+        // A group takes longer than the few numbers that are needed of it.
+        PhiloxInput next = input(Purpose::informationBits, 0);
+        for (std::uint32_t word = 0; 32 * word < size; ++word, ++next.counter[0]) {
+            const auto& [a, b, c, d] = next.counter;
+            words[word] =
+                philox4x32((philox4x32_ctr_t{{a, b, c, d}}), (philox4x32_key_t{{next.key[0], next.key[1]}}))
+                    .v[0];
+        }
+        spreadBits(words.data(), lane, size, bits);
+        return;
+    }
     for (std::uint32_t at = 0; at < size; at += bitsPerGroup) {
         this->words(Purpose::informationBits, at / bitsPerGroup, 1, words.data());
         const std::size_t count = std::min<std::size_t>(bitsPerGroup, size - at);

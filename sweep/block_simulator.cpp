@@ -5,21 +5,22 @@
 #include <span>
 
 #include "link/bit_errors.hpp"
+#include "sweep/link_simulation.hpp"
 
 namespace quarzel::sweep {
-
-std::shared_ptr<const link::QuantisedChannel> Channels::of(const Setup& setup) {
-    const std::lock_guard lock(itsMutex);
-    auto& channel = itsChannels[{setup.quantiser, setup.ebN0}];
-    if (channel == nullptr) {
-        channel = std::make_shared<const link::QuantisedChannel>(setup.quantiser, setup.ebN0);
-    }
-    return channel;
-}
 
 Core& BlockSimulator::coreOf(const Setup& setup) {
     return itsCores.try_emplace({setup.units, setup.algorithm}, CoreSettings{setup.units, setup.algorithm})
         .first->second;
+}
+
+link::LinkRun& BlockSimulator::runOf(const Setup& setup) {
+    const link::CodedLink& link = itsChannels.linkOf(setup);
+    if (itsLink != &link) {
+        itsLink = &link;
+        itsRun.emplace(link, itsSeed);
+    }
+    return *itsRun;
 }
 
 const link::Encoder& BlockSimulator::encoderOf(std::uint32_t blockSize) {
@@ -85,6 +86,9 @@ ErrorList BlockSimulator::count(std::size_t K, std::size_t counts,
 
 ErrorList BlockSimulator::simulate(const Setup& setup, std::size_t counts,
                                    const std::vector<std::uint64_t>& octets) {
+    if (!setup.sending.isPlain()) {
+        return simulateLink(setup, counts, runOf(setup), *itsChannels.of(setup), coreOf(setup), octets);
+    }
     send(setup, octets);
     decode(setup, counts, octets.size() * blocksPerOctet);
     return count(setup.blockSize, counts, octets);

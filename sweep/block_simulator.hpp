@@ -4,31 +4,18 @@
 #include <cstddef>
 #include <cstdint>
 #include <map>
-#include <memory>
-#include <mutex>
+#include <optional>
 #include <utility>
 #include <vector>
 
+#include "link/chain/link_run.hpp"
 #include "link/encoder.hpp"
-#include "link/quantised_channel.hpp"
 #include "quarzel/core.hpp"
+#include "sweep/channels.hpp"
 #include "sweep/point_state.hpp"
 #include "sweep/setup.hpp"
 
 namespace quarzel::sweep {
-
-/// The channels of a sweep, each made when it is first needed.
-///
-/// Thread rule: `at` may be called from several threads at once.
-class Channels {
-  public:
-    std::shared_ptr<const link::QuantisedChannel> of(const Setup& setup);
-
-  private:
-    std::mutex itsMutex;
-    std::map<std::pair<link::Quantiser, link::Decibels>, std::shared_ptr<const link::QuantisedChannel>>
-        itsChannels;
-};
 
 /// Sends blocks through encoder, channel and core, and counts the errors.
 ///
@@ -40,15 +27,16 @@ class BlockSimulator {
     BlockSimulator(std::uint64_t seed, Channels& channels) : itsSeed(seed), itsChannels(channels) {}
 
     /// Simulate octets of blocks of a point.
-    /// @param counts  how many times the errors of a block are counted: after every iteration, or once, after
-    ///                the last one
+    /// @param counts  how many times the errors of a block are counted: after every iteration of one
+    ///                transmission, or after the last one of each
     /// @param octets  their numbers, ascending
-    /// @return        the blocks in error
+    /// @return        the blocks in error; with a stop rule of the receiver all blocks
     /// @throws quarzel::Error when the library refuses
     ErrorList simulate(const Setup& setup, std::size_t counts, const std::vector<std::uint64_t>& octets);
 
   private:
     Core& coreOf(const Setup& setup);
+    link::LinkRun& runOf(const Setup& setup);
     const link::Encoder& encoderOf(std::uint32_t blockSize);
     void send(const Setup& setup, const std::vector<std::uint64_t>& octets);
     void decode(const Setup& setup, std::size_t counts, std::size_t blocks);
@@ -58,6 +46,8 @@ class BlockSimulator {
     Channels& itsChannels;
     std::map<std::pair<int, int>, Core> itsCores;  ///< by units and algorithm
     std::map<std::uint32_t, link::Encoder> itsEncoders;
+    const link::CodedLink* itsLink = nullptr;  ///< of the last point that was coded
+    std::optional<link::LinkRun> itsRun;       ///< over it
     std::vector<std::uint8_t>
         itsBits;  ///< information bits: K bytes an octet, a bit of each byte for each block
     std::vector<std::uint8_t> itsCodeBits;

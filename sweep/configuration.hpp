@@ -5,10 +5,19 @@
 #include <cstdint>
 #include <vector>
 
+#include "sweep/point_state.hpp"
 #include "sweep/setup.hpp"
 #include "sweep/stop_rule.hpp"
 
 namespace quarzel::sweep {
+
+/// The coded bits of a transmission, as a number or by the code rate.
+struct CodedSize {
+    std::uint32_t bits = 0;  ///< 0: by the rate
+    double rate = 0;         ///< 0: each code bit once
+
+    bool operator==(const CodedSize&) const = default;
+};
 
 /// What a user asks of a sweep: a point for every combination of the values in the lists.
 struct Configuration {
@@ -17,6 +26,13 @@ struct Configuration {
     std::vector<int> algorithms = {1};
     std::vector<int> iterations = {6};
     std::vector<link::Quantiser> quantisers = {link::Quantiser{}};
+    std::vector<std::uint32_t> transportBlocks;  ///< instead of the block sizes, if there are any
+    std::vector<CodedSize> codedSizes = {CodedSize{}};
+    std::vector<link::Modulation> modulations = {link::Modulation::bpsk};
+    std::vector<link::Fading> fadings = {link::Fading::none};
+    std::vector<link::Demapping> demappings = {link::Demapping::maxLog};
+    std::vector<unsigned> redundancyVersions = {0};
+    Stop stop = Stop::none;
     std::vector<link::Decibels> ebN0;
     std::uint64_t seed = 1;
     StopRule stopRule;          ///< of every point
@@ -30,9 +46,15 @@ struct Configuration {
     std::vector<Setup> setups() const;
 
     /// How many times the errors of a block are counted: after every iteration with perIteration, else after
-    /// the last one.
+    /// the last one of each transmission.
     std::size_t countsOf(const Setup& setup) const {
-        return perIteration ? static_cast<std::size_t>(setup.iterations) : 1;
+        return perIteration ? static_cast<std::size_t>(setup.iterations) : setup.transmissions();
+    }
+
+    /// A point at which nothing has been counted.
+    PointState startOf(const Setup& setup) const {
+        const bool stops = setup.sending.stop != Stop::none;
+        return PointState(countsOf(setup), stops ? static_cast<std::size_t>(setup.iterations) : 0);
     }
 
     /// @throws Error when a value is out of its range, a list empty or the points too many

@@ -50,8 +50,8 @@ void Dispatcher::endCurveBelowTarget(std::size_t point) {
 }
 
 std::uint64_t Dispatcher::usualOctets(std::size_t point) const {
-    const std::uint64_t K = itsPlan.points[point].setup.blockSize;
-    return std::max<std::uint64_t>(bitsPerTask / (K * blocksPerOctet), 1);
+    const std::uint64_t bits = itsPlan.points[point].setup.informationBits();
+    return std::max<std::uint64_t>(bitsPerTask / (bits * blocksPerOctet), 1);
 }
 
 std::optional<Task> Dispatcher::next(unsigned size) {

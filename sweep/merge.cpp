@@ -76,6 +76,10 @@ void add(PointState& sum, const PointState& point) {
     for (std::size_t i = 0; i < sum.counts.size(); ++i) {
         sum.counts[i].bitErrors += point.counts.at(i).bitErrors;
         sum.counts[i].blockErrors += point.counts.at(i).blockErrors;
+        sum.counts[i].undetected += point.counts.at(i).undetected;
+    }
+    for (std::size_t i = 0; i < sum.iterationsUsed.size(); ++i) {
+        sum.iterationsUsed[i] += point.iterationsUsed.at(i);
     }
 }
 

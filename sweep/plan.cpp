@@ -12,7 +12,7 @@ Plan planOf(const Configuration& configuration, const Shard& shard, const Points
               configuration.targetBler,
               dividesBlocks(configuration.stopRule) ? shard : Shard{}};
     for (const Setup& setup : setupsOf(configuration, shard)) {
-        PointState start(configuration.countsOf(setup));
+        PointState start = configuration.startOf(setup);
         if (const auto point = known.find(setup); point != known.end()) {
             if (point->second.counts.size() < start.counts.size()) {
                 throw Error("has no counts after every iteration at " + setupText(setup),
@@ -29,9 +29,8 @@ Plan repetitionOf(std::uint64_t seed, const Points& points) {
     Plan plan{seed, {}, 0, {}};
     for (const auto& [setup, point] : points) {
         const bool endsByErrors = point.stoppedBy == StopReason::blockErrors;
-        plan.points.push_back({setup,
-                               {point.blocks, endsByErrors ? point.last().blockErrors : 0, 0},
-                               PointState(point.counts.size())});
+        plan.points.push_back(
+            {setup, {point.blocks, endsByErrors ? point.last().blockErrors : 0, 0}, point.emptied()});
     }
     return plan;
 }

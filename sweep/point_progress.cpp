@@ -52,7 +52,7 @@ void PointProgress::add(const Piece& piece) {
         if (block < itsFirstBlock || block >= itsRule.maxBlocks) {
             continue;
         }
-        const std::uint32_t* const row = piece.errors.row(i, counts);
+        const std::uint32_t* const row = piece.errors.row(i, itsState.columns());
         itsState.add(row);
         if (row[counts - 1] != 0 && itsState.last().blockErrors == itsRule.maxBlockErrors) {
             itsState.blocks = block + 1;

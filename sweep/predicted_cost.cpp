@@ -40,7 +40,7 @@ Waterfall usualWaterfall(const Setup& curve) {
 
 double predictedCost(const Setup& setup, const StopRule& rule) {
     const double perBlock =
-        setup.blockSize *
+        setup.informationBits() *
         (iterationsOfTheRest + setup.iterations * (setup.algorithm == 2 ? factorOfMaxStar : 1));
     const auto most = static_cast<double>(rule.maxBlocks);
     const double untilErrors = static_cast<double>(rule.maxBlockErrors) / usualErrorRate(setup);

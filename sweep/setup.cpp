@@ -3,7 +3,10 @@
 
 #include <fmt/format.h>
 
+#include <stdexcept>
+
 #include "quarzel/code.hpp"
+#include "sweep/channels.hpp"
 #include "sweep/error.hpp"
 
 namespace quarzel::sweep {
@@ -20,7 +23,25 @@ void require(bool isPossible, const char* name, Value value, const char* wanted)
     }
 }
 
+/// What a coded link says of sizes that do not fit ends with those that do, if it names any.
+void requireLink(const Setup& setup) {
+    try {
+        const link::CodedLink link(linkSetupOf(setup));
+        require(link.segmentation().Kplus == setup.blockSize, "block size", setup.blockSize,
+                "that of the last code block");
+    } catch (const std::invalid_argument& error) {
+        const std::string text = error.what();
+        const std::size_t end = text.find("; ");
+        throw end == std::string::npos ? Error(text, "give sizes that fit one another")
+                                       : Error(text.substr(0, end), text.substr(end + 2));
+    }
+}
+
 }  // namespace
+
+std::uint32_t Setup::codedBits() const {
+    return sending.codedBits != 0 ? sending.codedBits : 3 * (blockSize + tailPositions);
+}
 
 void Setup::check() const {
     require(findBlockSize(blockSize).has_value(), "block size", blockSize,
@@ -32,6 +53,12 @@ void Setup::check() const {
             "a number above 0 and up to 1000000");
     if (ebN0 < lowestEbN0 || ebN0 > highestEbN0) {
         throw Error("Eb/N0 lies outside -20 to 40 dB", "give values inside");
+    }
+    if (sending.stop == Stop::crc && sending.transportBlock == 0) {
+        throw Error("code blocks alone have no CRC to stop at", "give transport blocks, or no stop");
+    }
+    if (!sending.isPlain()) {
+        requireLink(*this);
     }
 }
 
@@ -56,7 +83,8 @@ bool isSameCurve(Setup a, const Setup& b) {
 std::string curveText(const Setup& setup) {
     return fmt::format("K {}, {} units, algorithm {}, {} iteration{}, {} {}", setup.blockSize, setup.units,
                        setup.algorithm, setup.iterations, setup.iterations == 1 ? "" : "s",
-                       nameOf(setup.quantiser.kind), setup.quantiser.scale);
+                       nameOf(setup.quantiser.kind), setup.quantiser.scale) +
+           sendingText(setup.sending);
 }
 
 std::string setupText(const Setup& setup) {

@@ -4,6 +4,7 @@
 #include <cstdint>
 
 #include "sweep/point_state.hpp"
+#include "sweep/setup.hpp"
 
 namespace quarzel::sweep {
 
@@ -21,21 +22,26 @@ struct Interval {
 struct Rates {
     double ber;
     double bler;
-    Interval berInterval;  ///< from the spread of the bit errors over blocks, since errors cluster in blocks;
-                           ///< without an error it ends where blerInterval does
+    Interval berInterval;  ///< from the spread of the bit errors over blocks, since errors cluster in blocks.
+                           ///< Its ends lie on both sides of the rate by the same factor; without an error it
+                           ///< goes from 0 to where blerInterval ends
     Interval blerInterval;  ///< of E. B. Wilson (1927)
 };
 
-/// An interval of the bit error rate that reaches 0 only where no error was seen, as on a logarithmic axis it
-/// must not. The bit errors of a block are taken as one draw, since errors cluster in blocks. The ends solve
-/// (ber - p)^2 = z^2 s p / n, where s is the measured variance over the mean of a draw and n the blocks: they
-/// lie on both sides of the rate by the same factor. With + - * / and square roots alone, too. Without an
-/// error it is that of ratesOf.
-/// @param blockSize  K
-Interval berScoreInterval(const PointState& point, std::uint32_t blockSize);
-
 /// The rates of a point after its last iteration.
-/// @param blockSize  K
+/// @param blockSize  K, or A of transport blocks
 Rates ratesOf(const PointState& point, std::uint32_t blockSize);
+
+/// The blocks that were sent in a transmission: those that the receiver has not accepted before.
+/// @param transmission  from 0
+std::uint64_t blocksSent(const PointState& point, std::size_t transmission);
+
+/// The information bits of the blocks that are right at a count, for each coded bit that was sent until then.
+/// @param count  one of the point's, from 0: a transmission, or an iteration of the only one
+double throughput(const Setup& setup, const PointState& point, std::size_t count);
+
+/// The iterations that a receiver with a stop rule used for a block in a transmission, on average; 0 where
+/// there is none.
+double meanIterations(const PointState& point);
 
 }  // namespace quarzel::sweep

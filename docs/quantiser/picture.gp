@@ -12,8 +12,9 @@ set format y "10^{%T}"
 set xlabel "factor"
 set ylabel "block error rate"
 set grid
-set key top center
+set key bottom left
 do for [rate in "1e-2 1e-4"] {
+    if (rate eq "1e-4") { unset key }
     do for [K in "40 1024 6144"] {
         set title "K = " . K
         plot for [type = 0:2] "docs/quantiser/rate_" . rate . ".csv" \

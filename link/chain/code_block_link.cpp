@@ -89,6 +89,14 @@ std::vector<CodeBlockLink::Piece> CodeBlockLink::piecesOf(unsigned rv, Order ord
     return pieces;
 }
 
+std::vector<std::uint16_t> CodeBlockLink::places(std::size_t transmission) const {
+    std::vector<std::uint16_t> places;
+    for (const Piece& piece : itsPieces[transmission]) {
+        places.insert(places.end(), piece.places.begin(), piece.places.end());
+    }
+    return places;
+}
+
 void CodeBlockLink::select(std::size_t transmission, const std::uint8_t* codeBits,
                            std::uint8_t* coded) const {
     for (const Piece& piece : itsPieces[transmission]) {
@@ -116,6 +124,7 @@ void CodeBlockLink::send(const Channel& channel, BlockName name, const std::uint
         const bool isNew = isFirst && name.repetition == 0 && piece.isOnce;
         (isNew ? setAt : addAt)(others, received + piece.run, count - piece.run, soft);
         coded += count;
+        received += count;
         ++name.repetition;
     }
 }

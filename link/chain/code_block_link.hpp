@@ -46,6 +46,10 @@ class CodeBlockLink {
     /// The values of the three streams: 3 (K + 4).
     std::size_t softValues() const { return 3 * itsEncoder.positions(); }
 
+    /// Where in the streams each coded bit of a transmission is, in the order in which they pass the channel.
+    /// Bits that are sent again come in the same order as in the standard's.
+    std::vector<std::uint16_t> places(std::size_t transmission) const;
+
     /// Select the coded bits of a transmission.
     /// @param codeBits  the streams of the encoder, of one block or of 8 together
     /// @param coded     receives codedBits() of the same form, in the order in which they pass the channel
@@ -54,7 +58,7 @@ class CodeBlockLink {
     /// Send coded bits and add what is received to the streams, each sum clipped to 8 bits.
     /// @param name      of the random numbers, but for the repetition; it has the transmission, from 0
     /// @param coded     as selected; of 8 blocks, this is number `lane`
-    /// @param received  room for codedBits() values
+    /// @param received  receives the codedBits() soft values, in the order in which they pass the channel
     /// @param soft      the streams of the core; what they hold before the first transmission does not matter
     void send(const Channel& channel, BlockName name, const std::uint8_t* coded, unsigned lane,
               std::int8_t* received, std::int8_t* soft) const;

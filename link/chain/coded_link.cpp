@@ -43,6 +43,12 @@ Segmentation cutOf(const LinkSetup& setup) {
 
 }  // namespace
 
+std::size_t codedBitsOfRate(std::size_t informationBits, double rate, unsigned bitsOfSymbol) {
+    constexpr double mostSymbols = 1 << 24;
+    const double symbols = static_cast<double>(informationBits) / rate / bitsOfSymbol;
+    return bitsOfSymbol * static_cast<std::size_t>(std::min(symbols, mostSymbols) + 0.5);
+}
+
 CodedLink::CodedLink(const LinkSetup& setup)
     : itsSetup((check(setup), setup)),
       itsInformationBits(setup.transportBlock != 0 ? setup.transportBlock : setup.blockSize),

@@ -21,6 +21,11 @@ struct LinkSetup {
     ChannelSetup channel;
 };
 
+/// The coded bits, in whole symbols, that come nearest to a code rate. Rates so low that no link sends as
+/// many give a number that CodedLink refuses.
+/// @param rate  information bits for each coded bit, above 0
+std::size_t codedBitsOfRate(std::size_t informationBits, double rate, unsigned bitsOfSymbol);
+
 /// A link for code blocks or transport blocks, as tables: CRCs, segmentation, encoder and rate matching. Bits
 /// are those of 8 blocks together: bit i of every byte belongs to block i.
 ///

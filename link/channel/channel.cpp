@@ -3,9 +3,14 @@
 
 #include "link/channel/fading_channel.hpp"
 #include "link/channel/pam_channel.hpp"
+#include "link/choice.hpp"
 #include "link/quantised_channel.hpp"
 
 namespace quarzel::link {
+
+Fading fadingOf(std::string_view name) {
+    return static_cast<Fading>(placeOf(channelNames, name, "channel"));
+}
 
 bool isMemoryless(const ChannelSetup& setup) {
     return setup.fading == Fading::none && amplitudes(setup.modulation).size() == 2;

@@ -1,9 +1,11 @@
 // SPDX-License-Identifier: MIT
 #pragma once
 
+#include <array>
 #include <cstddef>
 #include <cstdint>
 #include <memory>
+#include <string_view>
 
 #include "link/channel_thresholds.hpp"
 #include "link/modulation/demodulation.hpp"
@@ -33,6 +35,13 @@ class Channel {
 /// How the amplitude of the received symbols varies, which the receiver knows: not at all, or as Rayleigh's
 /// distribution with a mean square of 1, independently for each symbol or for each transmission of a block.
 enum class Fading { none, perSymbol, perBlock };
+
+/// The names of the channels with each of them.
+inline constexpr std::array<std::string_view, 3> channelNames = {"awgn", "rayleigh", "rayleigh-block"};
+
+/// The fading of a channel's name.
+/// @throws std::invalid_argument listing the names when it is none of them
+Fading fadingOf(std::string_view name);
 
 /// A channel without its Eb/N0.
 struct ChannelSetup {

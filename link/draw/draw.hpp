@@ -20,12 +20,30 @@ constexpr std::size_t wordsPerGroup = 64;
 /// Channel outputs that are looked up together, from 16 words.
 constexpr std::size_t valuesPerLookUp = 32;
 
+/// Channel outputs that are searched for together.
+constexpr std::size_t searchValues = 128;
+
 /// The bits of a look-up cell, which stands for 16 neighbouring 16-bit random numbers.
 constexpr int cellValueShift = 8;        ///< bits from here on: the output of the lowest of the 16
 constexpr int cellNoThreshold = 31;      ///< the bits below: where the output rises by 1, or this
 constexpr int cellLowMask = 31;          ///< mask of those bits
 constexpr int cellManyThresholds = 32;   ///< set when the output rises at more than one place
 constexpr std::size_t cellCount = 4096;  ///< cells of a table
+
+/// A search among thresholds that vector registers have room for. Each level halves what is left; the place
+/// of a search has bit i set when the random number is not below the threshold of level i, which stands at
+/// the place so far. After the last level the output is that of the place before it, plus 1 when that level
+/// set its bit.
+struct SearchTable {
+    static constexpr std::size_t mostLevels = 7;
+    static constexpr std::size_t places = 64;  ///< before the last level
+
+    std::size_t levels = 0;  ///< 6 or 7, or 0 where a search would leave too much undecided
+    std::uint16_t thresholds[mostLevels][places];
+    std::int16_t outputs[places];     ///< -127 to 127
+    std::uint16_t undecided[places];  ///< what is not above it is undecided, unless the last level set its
+                                      ///< bit: then this is the last threshold
+};
 
 struct DrawFunctions {
     /// Draw groups of words; input.counter[0] is that of the first word and goes on by 16 a group. Word 16 j
@@ -34,11 +52,17 @@ struct DrawFunctions {
 
     /// Look up `times` * 32 channel outputs. Of 16 words, the low halves decide the first 16, the high halves
     /// the rest. The code bit of an output is bit `lane` of its byte.
-    /// @param isUndecided  receives for each output 0, or 1 when 16 random bits do not decide it and it may
-    ///                     be wrong
+    /// @param undecided  receives 32 bits a time, that of the first output lowest: set when 16 random bits do
+    ///                   not decide the output and it may be wrong
     void (*lookUp)(const std::uint32_t* words, const std::uint8_t* codeBits, unsigned lane,
-                   const std::int32_t* cells, std::size_t times, std::int8_t* soft,
-                   std::uint8_t* isUndecided);
+                   const std::int32_t* cells, std::size_t times, std::int8_t* soft, std::uint32_t* undecided);
+
+    /// Search for `count` channel outputs, decided by the same halves of words; null where a look-up is
+    /// faster. Words are read, and `undecided` is written,
+    /// for a multiple of searchValues outputs.
+    /// @param undecided  as of a look-up, but set for some outputs that 16 random bits decide, too
+    void (*search)(const std::uint32_t* words, const std::uint8_t* codeBits, unsigned lane,
+                   const SearchTable& table, std::size_t count, std::int8_t* soft, std::uint32_t* undecided);
 };
 
 /// The fastest ones for this processor.

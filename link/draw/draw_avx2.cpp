@@ -2,5 +2,5 @@
 #include "link/draw/draw_loops.hpp"
 
 namespace quarzel::link {
-extern const DrawFunctions avx2Draw = functions;
+extern const DrawFunctions avx2Draw = {drawWords, lookUp, nullptr};
 }

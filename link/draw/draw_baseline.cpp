@@ -2,5 +2,5 @@
 #include "link/draw/draw_loops.hpp"
 
 namespace quarzel::link {
-extern const DrawFunctions baselineDraw = functions;
+extern const DrawFunctions baselineDraw = {drawWords, lookUp, nullptr};
 }

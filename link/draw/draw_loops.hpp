@@ -5,6 +5,8 @@
 
 #include <Random123/philox.h>
 
+#include <cstring>
+
 #include "link/draw/draw.hpp"
 
 namespace quarzel::link {
@@ -55,10 +57,23 @@ inline void lookUpOne(std::uint32_t random, std::uint32_t codeBit, const std::in
     isUndecided = static_cast<std::uint8_t>((low == threshold) | ((cell & cellManyThresholds) != 0));
 }
 
+/// The bits of 32 bytes of 0 or 1, the first one lowest.
+inline std::uint32_t bitsOf(const std::uint8_t* bytes) {
+    constexpr std::uint64_t gather = 0x0102040810204080;  // moves the bit of byte i to bit 56 + i
+    std::uint32_t bits = 0;
+    for (unsigned at = 0; at < valuesPerLookUp; at += 8) {
+        std::uint64_t eight = 0;
+        std::memcpy(&eight, bytes + at, 8);
+        bits |= static_cast<std::uint32_t>(eight * gather >> 56) << at;
+    }
+    return bits;
+}
+
 void lookUp(const std::uint32_t* __restrict words, const std::uint8_t* __restrict codeBits, unsigned lane,
             const std::int32_t* __restrict cells, std::size_t times, std::int8_t* __restrict soft,
-            std::uint8_t* __restrict isUndecided) {
+            std::uint32_t* __restrict undecided) {
     constexpr std::size_t half = valuesPerLookUp / 2;
+    std::uint8_t isUndecided[valuesPerLookUp];
     for (std::size_t time = 0; time < times; ++time) {
         for (std::size_t i = 0; i < half; ++i) {
             lookUpOne(words[i] & 0xffffU, codeBits[i] >> lane & 1U, cells, soft[i], isUndecided[i]);
@@ -67,14 +82,12 @@ void lookUp(const std::uint32_t* __restrict words, const std::uint8_t* __restric
             lookUpOne(words[i] >> 16, codeBits[half + i] >> lane & 1U, cells, soft[half + i],
                       isUndecided[half + i]);
         }
+        undecided[time] = bitsOf(isUndecided);
         words += half;
         codeBits += valuesPerLookUp;
         soft += valuesPerLookUp;
-        isUndecided += valuesPerLookUp;
     }
 }
-
-constexpr DrawFunctions functions = {drawWords, lookUp};
 
 }  // namespace
 

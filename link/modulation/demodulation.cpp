@@ -139,8 +139,7 @@ void demodulateComponents(std::span<const std::complex<double>> symbols, Modulat
 }  // namespace
 
 Demapping demappingOf(std::string_view name) {
-    constexpr std::array<std::string_view, 2> names = {"exact", "maxlog"};
-    return static_cast<Demapping>(placeOf(names, name, "method of demodulation"));
+    return static_cast<Demapping>(placeOf(demappingNames, name, "method of demodulation"));
 }
 
 void demodulate(std::span<const std::complex<double>> symbols, Modulation modulation,

@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: MIT
 #pragma once
 
+#include <array>
 #include <complex>
 #include <span>
 #include <string_view>
@@ -14,7 +15,10 @@ namespace quarzel::link {
 /// bit.
 enum class Demapping { exact, maxLog };
 
-/// The method of a name: maxlog or exact.
+/// Their names, in their order.
+inline constexpr std::array<std::string_view, 2> demappingNames = {"exact", "maxlog"};
+
+/// The method of a name.
 /// @throws std::invalid_argument listing them when it is none of them
 Demapping demappingOf(std::string_view name);
 

@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: MIT
 #include "link/modulation/modulation.hpp"
 
+#include <algorithm>
 #include <array>
 #include <cmath>
 
@@ -18,14 +19,18 @@ constexpr std::array<std::int8_t, 8> amplitudes8 = {3, 1, 5, 7, -3, -1, -5, -7};
 constexpr std::array<std::int8_t, 16> amplitudes16 = {5,  7,  3,  1,  11,  9,  13,  15,
                                                       -5, -7, -3, -1, -11, -9, -13, -15};
 
-constexpr std::array<std::string_view, 5> names = {"bpsk", "qpsk", "16qam", "64qam", "256qam"};
 constexpr std::array<Modulation, 5> schemes = {Modulation::bpsk, Modulation::qpsk, Modulation::qam16,
                                                Modulation::qam64, Modulation::qam256};
 
 }  // namespace
 
+std::string_view nameOf(Modulation modulation) {
+    const auto found = std::find(schemes.begin(), schemes.end(), modulation);
+    return modulationNames.at(static_cast<std::size_t>(found - schemes.begin()));
+}
+
 Modulation modulationOf(std::string_view name) {
-    return schemes.at(placeOf(names, name, "modulation"));
+    return schemes.at(placeOf(modulationNames, name, "modulation"));
 }
 
 std::span<const std::int8_t> amplitudes(Modulation modulation) {

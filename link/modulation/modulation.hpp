@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: MIT
 #pragma once
 
+#include <array>
 #include <complex>
 #include <cstddef>
 #include <cstdint>
@@ -19,7 +20,12 @@ constexpr unsigned bitsOfSymbol(Modulation modulation) {
     return static_cast<unsigned>(modulation);
 }
 
-/// The scheme of a name: bpsk, qpsk, 16qam, 64qam or 256qam.
+/// Their names, the one with fewest bits first.
+inline constexpr std::array<std::string_view, 5> modulationNames = {"bpsk", "qpsk", "16qam", "64qam",
+                                                                    "256qam"};
+std::string_view nameOf(Modulation modulation);
+
+/// The scheme of a name.
 /// @throws std::invalid_argument listing them when it is none of them
 Modulation modulationOf(std::string_view name);
 

@@ -4,21 +4,14 @@
 # It installs packages and the project itself: run it through pages_test.sh.
 set -euo pipefail
 project=$(cd "$(dirname "$0")/../.." && pwd)
+. "$project/tests/support/page_blocks.sh"
 empty=$(mktemp -d)
 
-# The blocks of a language in a chapter of a page, or in all of it: blocks PAGE LANGUAGE [CHAPTER]
-blocks() {
-    awk -v mark="\`\`\`$2" -v chapter="${3:-}" '
-        !block && /^## / { other = chapter != "" && $0 != "## " chapter }
-        /^```$/ { block = 0 }
-        block && !other
-        $0 == mark { block = 1 }' "$project/$1"
-}
 # Run lines as they stand, in a folder: follow FOLDER LINES
 follow() {
-    (cd "$1" && bash -euo pipefail -c "$2") >"$empty/log" 2>&1 || {
+    (cd "$1" && bash -euo pipefail -c "$2") >"$empty/log" 2>"$empty/errors" || {
         printf 'these lines of %s fail:\n%s\n' "$page" "$2" >&2
-        cat "$empty/log" >&2
+        cat "$empty/log" "$empty/errors" >&2
         exit 1
     }
 }
@@ -46,7 +39,7 @@ for page in docs/python.md docs/octave.md docs/systemverilog.md; do
     follow "$project" "$(blocks $page sh "$install")"
     case $page in
     docs/python.md)
-        for page in docs/python.md docs/cocotb.md docs/python_sweeps.md; do
+        for page in docs/python.md docs/lte.md docs/cocotb.md docs/python_sweeps.md; do
             follow "$empty" "$project/env/bin/python $project/tests/bindings/run_page.py $project/$page"
             echo "ok: $page"
         done
@@ -59,6 +52,7 @@ for page in docs/python.md docs/octave.md docs/systemverilog.md; do
     docs/systemverilog.md)
         blocks $page systemverilog "The first block" >"$empty/first.sv"
         follow "$empty" "$(blocks $page sh "The first block" | sed 's/-o first/& >build.log/')"
+        sed -i '/Verilog \$finish$/d' "$empty/log" # the simulator's own line
         printed "$(blocks $page text "The first block")"
         ;;
     esac

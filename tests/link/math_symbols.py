@@ -1,7 +1,7 @@
 #!/usr/bin/env python3
 # SPDX-License-Identifier: MIT
 """What draws and combines soft values calls no function of the mathematical library but sqrt, whose results might
-differ from machine to machine: math_symbols.py NM ARCHIVE..."""
+differ from machine to machine: math_symbols.py NM [--but EXACT_FUNCTION]... ARCHIVE..."""
 import subprocess
 import sys
 
@@ -12,6 +12,9 @@ NAMES = {name + suffix for name in MATH for suffix in ("", "f", "l")}
 OTHERS = {"demodulation.cpp.o"}  # a function on arrays for users
 
 nm, *archives = sys.argv[1:]
+while archives[0] == "--but":
+    NAMES.discard(archives[1])
+    del archives[:2]
 looked_at = 0
 found = []
 for archive in archives:

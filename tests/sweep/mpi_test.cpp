@@ -38,6 +38,34 @@ TEST(Mpi, GivesTheSameResultWithAnyNumberOfRanks) {
     }
 }
 
+TEST(Mpi, GivesTheSameResultForCodedLinks) {
+    const std::vector<std::string> arguments = {"sweep",
+                                                "--transport-block",
+                                                "90,6200",
+                                                "--code-rate",
+                                                "1/2",
+                                                "--modulation",
+                                                "qpsk",
+                                                "--channel",
+                                                "rayleigh-block",
+                                                "--rv",
+                                                "0,3",
+                                                "--stop",
+                                                "crc",
+                                                "--iterations",
+                                                "3",
+                                                "--ebn0",
+                                                "1,5",
+                                                "--seed",
+                                                "7",
+                                                "--max-blocks",
+                                                "61",
+                                                "--max-block-errors",
+                                                "11",
+                                                "--json"};
+    EXPECT_EQ(runMpi("3", arguments).out, sweep::resultText(resultOf(transportSweep())));
+}
+
 TEST(Mpi, GivesTheSameResultWithThreadsInRanks) {
     std::vector<std::string> arguments = quickSweep;
     arguments.insert(arguments.end(), {"--threads", "2"});

@@ -90,10 +90,19 @@ TEST(SameAnswer, IsTheStoredOneForSeveralQuantisers) {
     EXPECT_EQ(sweep::resultText(result), readFile(QUARZEL_SWEEP_DATA "/quantisers.json"));
 }
 
+TEST(SameAnswer, IsTheStoredOneForCodedLinks) {
+    for (const char* const file : {"/coded_links.json", "/transport_blocks.json"}) {
+        const sweep::Result stored = sweep::readResult(readFile(QUARZEL_SWEEP_DATA + std::string(file)));
+        EXPECT_EQ(sweep::resultText(repeated(stored)), sweep::resultText(stored));
+    }
+}
+
 TEST(SameAnswer, ComesFromAnyNumberOfThreads) {
-    const std::string expected = sweep::resultText(resultOf(smallSweep()));
-    for (const unsigned threads : {2U, 8U}) {
-        EXPECT_EQ(sweep::resultText(resultOf(smallSweep(), threads)), expected) << threads;
+    for (const sweep::Configuration& configuration : everyKindOfSweep()) {
+        const std::string expected = sweep::resultText(resultOf(configuration));
+        for (const unsigned threads : {2U, 8U}) {
+            EXPECT_EQ(sweep::resultText(resultOf(configuration, threads)), expected) << threads;
+        }
     }
 }
 
@@ -105,6 +114,19 @@ TEST(SameAnswer, ComesFromAnyNumberOfShards) {
             configuration.perIteration = perIteration;
             const std::string expected = sweep::resultText(resultOf(configuration));
             for (const std::uint64_t shards : {2U, 45U}) {  // sometimes more than there are points or octets
+                EXPECT_EQ(sweep::resultText(sweep::merge(partsOf(configuration, shards))), expected)
+                    << shards;
+            }
+        }
+    }
+}
+
+TEST(SameAnswer, ComesFromAnyNumberOfShardsOfCodedLinks) {
+    for (sweep::Configuration configuration : {codedSweep(), transportSweep()}) {
+        for (const std::uint64_t maxBlockErrors : {std::uint64_t{0}, configuration.stopRule.maxBlockErrors}) {
+            configuration.stopRule.maxBlockErrors = maxBlockErrors;
+            const std::string expected = sweep::resultText(resultOf(configuration));
+            for (const std::uint64_t shards : {2U, 9U}) {
                 EXPECT_EQ(sweep::resultText(sweep::merge(partsOf(configuration, shards))), expected)
                     << shards;
             }
@@ -126,19 +148,31 @@ TEST(SameAnswer, ComesOutForFewerPointsAndForThemAlone) {
 }
 
 TEST(SameAnswer, ComesOutAfterAnyNumberOfInterruptions) {
-    sweep::Configuration configuration = smallSweep();
-    configuration.blockSizes = {1024};
-    configuration.stopRule.maxBlocks = 150;
-    const std::string expected = sweep::resultText(resultOf(configuration));
-    sweep::Points known;
-    for (bool isFinished = false; !isFinished;) {
-        sweep::Dispatcher dispatcher(sweep::planOf(configuration, {}, known));
-        Impatience impatience(0);
-        sweep::ThreadWorkers(2).run(dispatcher, impatience);
-        isFinished = dispatcher.hasFinished();
-        known = sweep::readResult(sweep::resultText({7, dispatcher.points(), {}})).points;
+    for (sweep::Configuration configuration : everyKindOfSweep()) {
+        configuration.blockSizes = {1024};
+        configuration.stopRule.maxBlocks = 150;
+        const std::string expected = sweep::resultText(resultOf(configuration));
+        sweep::Points known;
+        for (bool isFinished = false; !isFinished;) {
+            sweep::Dispatcher dispatcher(sweep::planOf(configuration, {}, known));
+            Impatience impatience(0);
+            sweep::ThreadWorkers(2).run(dispatcher, impatience);
+            isFinished = dispatcher.hasFinished();
+            known = sweep::readResult(sweep::resultText({7, dispatcher.points(), {}})).points;
+        }
+        EXPECT_EQ(sweep::resultText({7, known, {}}), expected);
     }
-    EXPECT_EQ(sweep::resultText({7, known, {}}), expected);
+}
+
+// Fewer blocks first, then more: what is there goes on inside an octet of blocks.
+TEST(SameAnswer, ComesOutInSteps) {
+    for (const sweep::Configuration& whole : everyKindOfSweep()) {
+        sweep::Configuration part = whole;
+        part.stopRule.maxBlocks = 13;
+        part.stopRule.maxBlockErrors = 5;
+        EXPECT_EQ(sweep::resultText(resultOf(whole, 1, resultOf(part).points)),
+                  sweep::resultText(resultOf(whole)));
+    }
 }
 
 // Each kill comes at a random time within half of that of a whole run, which it goes on from what the runs

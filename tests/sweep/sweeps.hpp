@@ -24,6 +24,41 @@ inline sweep::Configuration smallSweep() {
     return configuration;
 }
 
+/// Code blocks alone over several transmissions with fading, of which a part is punctured and a part
+/// repeated.
+inline sweep::Configuration codedSweep() {
+    sweep::Configuration configuration = smallSweep();
+    configuration.blockSizes = {104};
+    configuration.algorithms = {1};
+    configuration.codedSizes = {{0, 0.75}, {480, 0}};
+    configuration.modulations = {link::Modulation::qam16};
+    configuration.fadings = {link::Fading::none, link::Fading::perSymbol};
+    configuration.demappings = {link::Demapping::exact};
+    configuration.redundancyVersions = {0, 2, 3};
+    configuration.ebN0 = {{1'000'000}, {5'000'000}};
+    return configuration;
+}
+
+/// Transport blocks of one and of several code blocks, and a receiver that stops.
+inline sweep::Configuration transportSweep() {
+    sweep::Configuration configuration = codedSweep();
+    configuration.transportBlocks = {90, 6200};
+    configuration.codedSizes = {{0, 0.5}};
+    configuration.modulations = {link::Modulation::qpsk};
+    configuration.fadings = {link::Fading::perBlock};
+    configuration.demappings = {link::Demapping::maxLog};
+    configuration.redundancyVersions = {0, 3};
+    configuration.stop = sweep::Stop::crc;
+    configuration.stopRule.maxBlocks = 61;
+    configuration.stopRule.maxBlockErrors = 11;
+    return configuration;
+}
+
+/// One of each kind.
+inline std::vector<sweep::Configuration> everyKindOfSweep() {
+    return {smallSweep(), codedSweep(), transportSweep()};
+}
+
 inline void run(sweep::Dispatcher& dispatcher, unsigned threads) {
     sweep::Observer none;
     sweep::ThreadWorkers(threads).run(dispatcher, none);

@@ -14,7 +14,7 @@ using tool::labelsOf;
 using tool::SweepCurve;
 
 SweepCurve curve(std::uint32_t K, int algorithm, int iterations = 8) {
-    return {"runs/a.json", K, 2, algorithm, iterations, "LLR \u00d7 8", 7, 1.0 / 3, {}};
+    return {"runs/a.json", K, 2, algorithm, iterations, "LLR \u00d7 8", "", 7, 1.0 / 3, {}};
 }
 
 }  // namespace

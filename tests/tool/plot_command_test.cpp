@@ -60,7 +60,7 @@ TEST_F(PlotCommand, DrawsAxesWhereNoErrorWasSeen) {
          {std::vector<std::string>{"--per-iteration", "--algorithm", "0"}, {"--reference", reference}}) {
         sweep::Result silent;
         sweep::PointState& point =
-            silent.points.emplace(sweep::Setup{40, 2, 0, 2, {}, {500000}}, 2).first->second;
+            silent.points.emplace(sweep::Setup{40, 2, 0, 2, {}, {}, {500000}}, 2).first->second;
         point.blocks = 100;
         point.stoppedBy = sweep::StopReason::blocks;
         itsDirectory.write("result.json", sweep::resultText(silent));

@@ -24,7 +24,7 @@ inline std::string twoCurves(bool perIteration) {
             point.bitErrorSquares = 9 * errors;
             point.stoppedBy = sweep::StopReason::blocks;
             const link::Decibels ebN0 = {errors != 0 ? 500000 : 1000000};
-            result.points.emplace(sweep::Setup{40, 2, algorithm, 2, {}, ebN0}, point);
+            result.points.emplace(sweep::Setup{40, 2, algorithm, 2, {}, {}, ebN0}, point);
         }
     }
     return sweep::resultText(result);

@@ -49,7 +49,7 @@ TEST_F(PlotCommand, DrawsOnePanelInTheSizeWanted) {
 
 TEST_F(PlotCommand, DrawsTwoRangesAsOneCurve) {
     sweep::Result lower;
-    sweep::PointState& point = lower.points.emplace(sweep::Setup{40, 2, 0, 2, {}, {0}}, 1).first->second;
+    sweep::PointState& point = lower.points.emplace(sweep::Setup{40, 2, 0, 2, {}, {}, {0}}, 1).first->second;
     point.blocks = 10;
     point.counts.back() = {20, 5};
     point.stoppedBy = sweep::StopReason::blocks;

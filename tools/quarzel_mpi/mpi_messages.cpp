@@ -64,8 +64,8 @@ Words receive(MPI_Status status) {
 std::string textOf(const sweep::Plan& plan) {
     sweep::Json points = sweep::Json::array();
     for (const sweep::PlannedPoint& point : plan.points) {
-        points.push_back({sweep::curveJson(point.setup),
-                          sweep::pointJson(point.setup, sweep::PointState(point.start.counts.size()))});
+        points.push_back(
+            {sweep::curveJson(point.setup), sweep::pointJson(point.setup, point.start.emptied())});
     }
     return sweep::Json{plan.seed, plan.shard.index, plan.shard.count, std::move(points)}.dump();
 }

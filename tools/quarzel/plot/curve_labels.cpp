@@ -19,7 +19,7 @@ constexpr std::array<const char*, 3> algorithms = {"max-log", "scaled max-log", 
 using Field = std::function<std::string(const SweepCurve&)>;
 
 /// What may differ, in the order in which it is told.
-const std::array<Field, 5> fields = {
+const std::array<Field, 6> fields = {
     [](const SweepCurve& curve) { return fmt::format("K = {}", curve.blockSize); },
     [](const SweepCurve& curve) { return fmt::format("{} units", curve.units); },
     [](const SweepCurve& curve) {
@@ -29,6 +29,7 @@ const std::array<Field, 5> fields = {
         return counted(static_cast<std::size_t>(curve.iterations), "iteration", "iterations");
     },
     [](const SweepCurve& curve) { return curve.quantiser; },
+    [](const SweepCurve& curve) { return curve.sending; },
 };
 
 std::string seedOf(const SweepCurve& curve) {
@@ -40,7 +41,7 @@ std::string fileOf(const SweepCurve& curve) {
 }
 
 void append(std::string& text, const std::string& part) {
-    text += (text.empty() ? "" : ", ") + part;
+    text += (text.empty() || part.empty() ? "" : ", ") + part;
 }
 
 bool isShared(const std::vector<SweepCurve>& curves, const Field& field) {

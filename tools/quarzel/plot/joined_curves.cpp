@@ -11,7 +11,7 @@ namespace {
 
 auto setupOf(const SweepCurve& curve) {
     return std::tie(curve.blockSize, curve.units, curve.algorithm, curve.iterations, curve.quantiser,
-                    curve.bitsPerSymbol);
+                    curve.sending, curve.bitsPerSymbol);
 }
 
 std::vector<MeasuredPoint>::iterator pointAt(SweepCurve& curve, double ebN0) {

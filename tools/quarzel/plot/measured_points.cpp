@@ -42,7 +42,7 @@ std::vector<DrawnPoint> measuredPoints(const SweepCurve& curve, const std::strin
             continue;
         }
         const Interval interval = rates.ber > 0
-                                      ? sweep::berScoreInterval(state, curve.blockSize)
+                                      ? rates.berInterval
                                       : Interval{0, rates.blerInterval.high * wrongShareNear(curve, ebN0)};
         drawn.push_back({ebN0, rates.ber, interval.low, interval.high, state.blocks, state.last().bitErrors});
     }

@@ -22,7 +22,8 @@ bool isWanted(const std::vector<Value>& wanted, Value value) {
 /// Leave out the curves that differ from the longest in their iterations alone, which it contains.
 void keepLongest(std::vector<SweepCurve>& curves) {
     const auto setupOf = [](const SweepCurve& curve) {
-        return std::tie(curve.blockSize, curve.units, curve.algorithm, curve.quantiser, curve.seed);
+        return std::tie(curve.blockSize, curve.units, curve.algorithm, curve.quantiser, curve.sending,
+                        curve.seed);
     };
     const SweepCurve longest = *std::max_element(
         curves.begin(), curves.end(),

@@ -14,8 +14,27 @@ namespace quarzel::tool {
 
 namespace {
 
-/// BPSK, and the code rate is taken as 1/3.
-constexpr double bitsPerSymbol = 1.0 / 3;
+/// The code rate is taken as 1/3 where each code bit of a code block alone is sent once.
+double bitsPerSymbol(const sweep::Setup& setup) {
+    const unsigned bits = link::bitsOfSymbol(setup.sending.modulation);
+    return setup.sending.codedBits == 0
+               ? bits / 3.0
+               : static_cast<double>(setup.informationBits()) / setup.codedBits() * bits;
+}
+
+/// Without the comma that comes before it elsewhere.
+std::string sendingOf(const sweep::Setup& setup) {
+    const std::string text = sweep::sendingText(setup.sending);
+    return text.empty() ? text : text.substr(2);
+}
+
+/// What is drawn of a point: after the last transmission.
+sweep::PointState drawnState(const sweep::Setup& setup, sweep::PointState point) {
+    if (setup.transmissions() > 1) {
+        point.counts = {point.last()};
+    }
+    return point;
+}
 
 std::string quantiserText(const link::Quantiser& quantiser) {
     return fmt::format("{} \u00d7 {}", quantiser.kind == link::Quantiser::Kind::llr ? "LLR" : "amplitude",
@@ -34,16 +53,17 @@ std::vector<SweepCurve> readSweepCurves(const std::string& file) {
         for (const auto& [setup, point] : result.points) {
             if (last == nullptr || !sweep::isSameCurve(setup, *last)) {
                 curves.push_back({file,
-                                  setup.blockSize,
+                                  setup.informationBits(),
                                   setup.units,
                                   setup.algorithm,
                                   setup.iterations,
                                   quantiserText(setup.quantiser),
+                                  sendingOf(setup),
                                   result.seed,
-                                  bitsPerSymbol,
+                                  bitsPerSymbol(setup),
                                   {}});
             }
-            curves.back().points.push_back({setup.ebN0.value(), point});
+            curves.back().points.push_back({setup.ebN0.value(), drawnState(setup, point)});
             last = &setup;
         }
         return curves;

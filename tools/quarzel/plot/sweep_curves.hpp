@@ -17,11 +17,12 @@ struct MeasuredPoint {
 /// A curve of a stored sweep and what it was measured with.
 struct SweepCurve {
     std::string file;
-    std::uint32_t blockSize;  ///< K
+    std::uint32_t blockSize;  ///< K, or A of transport blocks
     int units;
     int algorithm;
     int iterations;
     std::string quantiser;  ///< for people: "LLR x 8"
+    std::string sending;    ///< for people: "2048 coded bits, qpsk"; empty for the default
     std::uint64_t seed;
     double bitsPerSymbol;  ///< information bits that a symbol of the channel carries: Es/N0 over Eb/N0
     std::vector<MeasuredPoint> points;

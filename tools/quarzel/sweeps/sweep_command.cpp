@@ -45,6 +45,17 @@ the core, decoded and compared. Eb/N0 is for an information bit at rate 1/3: the
 noise has the variance 1.5 / (Eb/N0); the 12 tail bits are not counted. All
 cores and quantisers get the same bits and the same noise.
 
+With --code-rate, --coded-bits, --modulation, --channel, --demapping, --rv,
+--harq, --transport-block or --stop blocks pass the chain of LTE: CRCs and
+segmentation of transport blocks, rate matching, symbols, fading that the
+receiver knows, soft values added up over transmissions. Eb/N0 then counts the
+information bits for each coded bit of one transmission. A block is sent again
+until the receiver accepts it: its CRCs hold or, without CRC, no bit is wrong.
+Errors are what is left after so many transmissions; the throughput is the
+information bits of right blocks for each coded bit that was sent. With --stop
+crc it is told how many iterations a receiver would use that looks at the CRCs
+after each of them; the core still runs them all.
+
 What is counted at a point depends only on the seed, the point and the number of
 its blocks: not on threads, parts, interruptions or the machine. (That number
 depends on the clock with --max-time.) The interval holds the true block error
@@ -71,6 +82,7 @@ Examples:
   quarzel sweep --ebn0 0:0.2:1 --iterations 8 -o result.json
   quarzel sweep --ebn0 0:0.2:1 --algorithm 0,1,2 --block-size 40,6144 --csv
   quarzel sweep --ebn0 0:0.1:1.4 --iterations 8 -o result.json
+  quarzel sweep --ebn0 2:1:8 --code-rate 3/4 --modulation 16qam --harq 4
   quarzel sweep --ebn0 1:0.1:2 --max-blocks 1000000 --shard 3/16 -o part3.json
 )";
 

@@ -16,7 +16,7 @@ void SweepLog::tellPoints(const sweep::Dispatcher& dispatcher) {
         const sweep::PointState point = dispatcher.stateOf(itsPointsTold);
         itsStream << fmt::format("quarzel: {}: {} blocks, {} block errors, BLER {:.2e}\n",
                                  sweep::setupText(setup), point.blocks, point.last().blockErrors,
-                                 sweep::ratesOf(point, setup.blockSize).bler);
+                                 sweep::ratesOf(point, setup.informationBits()).bler);
     }
     itsStream << std::flush;
 }

@@ -35,6 +35,45 @@ std::vector<link::Quantiser> quantisersOf(const SweepOptions& options) {
     return quantisers.empty() ? std::vector{link::Quantiser{}} : quantisers;
 }
 
+std::vector<sweep::CodedSize> codedSizesOf(const LinkOptions& options) {
+    std::vector<sweep::CodedSize> sizes;
+    for (const std::uint32_t bits : options.codedBits) {
+        sizes.push_back({bits, 0});
+    }
+    for (const double rate : options.codeRates) {
+        sizes.push_back({0, rate});
+    }
+    return sizes.empty() ? std::vector{sweep::CodedSize{}} : sizes;
+}
+
+/// What the names of a list stand for.
+template <class Value>
+std::vector<Value> valuesOf(const std::vector<std::string>& names, Value (*valueOf)(std::string_view)) {
+    std::vector<Value> values;
+    for (const std::string& name : names) {
+        values.push_back(valueOf(name));
+    }
+    return values;
+}
+
+/// @throws ToolError when options of the link do not go together
+void requireTogether(const SweepOptions& options) {
+    const LinkOptions& link = options.link;
+    if (!link.transportBlocks.empty() && options.blockSizes != SweepOptions{}.blockSizes) {
+        throw ToolError(ExitCode::usage, "--transport-block",
+                        "the sizes of code blocks follow from those of transport blocks",
+                        "leave out --block-size");
+    }
+    if (!link.transportBlocks.empty() && link.codedBits.empty() && link.codeRates.empty()) {
+        throw ToolError(ExitCode::usage, "--transport-block", "the coded bits of a transmission are not told",
+                        "give --code-rate or --coded-bits");
+    }
+    if (options.stop == "crc" && link.transportBlocks.empty()) {
+        throw ToolError(ExitCode::usage, "--stop", "code blocks alone have no CRC to stop at",
+                        "give --transport-block");
+    }
+}
+
 }  // namespace
 
 CLI::Validator between(double low, double high) {
@@ -73,6 +112,10 @@ void addSweepOptions(CLI::App& command, SweepOptions& options) {
     };
     add("--ebn0", options.ebN0, "LIST", "Eb/N0 in dB: 0.5 or 0:0.1:1.5 or 0,1:0.5:3")->required();
     addCurveOptions(command, options);
+    addLinkOptions(command, options.link);
+    add("--stop", options.stop, "RULE",
+        "crc: the receiver ends the iterations of a block\nwhen its CRCs hold (default none)")
+        ->transform(withChoices(CLI::IsMember({"none", "crc"}).description(""), {"none", "crc"}));
     command.add_flag("--per-iteration", options.perIteration, "Count errors after every iteration");
     add("--max-block-errors", options.stopRule.maxBlockErrors, "N",
         "End a point at its Nth block error (default 100;\n0: never)")
@@ -92,6 +135,7 @@ void addSweepOptions(CLI::App& command, SweepOptions& options) {
 }
 
 sweep::Configuration configurationOf(const SweepOptions& options) {
+    requireTogether(options);
     sweep::Configuration configuration;
     configuration.blockSizes = blockSizesOf(options.blockSizes, "--block-size");
     configuration.units = options.units;
@@ -99,6 +143,13 @@ sweep::Configuration configurationOf(const SweepOptions& options) {
     configuration.iterations = options.iterations;
     configuration.ebN0 = readEbN0List("--ebn0", options.ebN0);
     configuration.quantisers = quantisersOf(options);
+    configuration.transportBlocks = options.link.transportBlocks;
+    configuration.codedSizes = codedSizesOf(options.link);
+    configuration.modulations = valuesOf(options.link.modulations, link::modulationOf);
+    configuration.fadings = valuesOf(options.link.channels, link::fadingOf);
+    configuration.demappings = valuesOf(options.link.demappings, link::demappingOf);
+    configuration.redundancyVersions = redundancyVersionsOf(options.link);
+    configuration.stop = sweep::stopOf(options.stop).value();
     configuration.seed = options.seed;
     configuration.stopRule = options.stopRule;
     configuration.targetBler = options.targetBler;

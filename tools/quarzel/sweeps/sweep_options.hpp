@@ -6,11 +6,12 @@
 #include <string>
 #include <vector>
 
+#include "options/link_options.hpp"
 #include "sweep/shard.hpp"
 
 namespace quarzel::tool {
 
-/// The options of a sweep; block sizes, Eb/N0 and shard as text.
+/// The options of a sweep; stop rule of the receiver, block sizes, Eb/N0 and shard as text.
 struct SweepOptions {
     std::vector<std::string> blockSizes = {"1024"};
     std::vector<int> units = {2};
@@ -19,6 +20,8 @@ struct SweepOptions {
     std::string ebN0 = "0";
     std::vector<double> llrScales;
     std::vector<double> amplitudeScales;
+    LinkOptions link;
+    std::string stop = "none";
     sweep::StopRule stopRule;
     std::uint64_t seed = 1;
     double targetBler = 0;

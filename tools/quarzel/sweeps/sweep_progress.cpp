@@ -72,8 +72,8 @@ SweepProgress ProgressMeter::measure(const sweep::Dispatcher& dispatcher, Clock:
         progress.pointsDone += point.stoppedBy ? 1 : 0;
         progress.blocks += point.blocks;
         progress.blockErrors += point.last().blockErrors;
-        bits += static_cast<double>(point.blocks) * setup.blockSize;
-        cost += static_cast<double>(point.blocks) * setup.blockSize * setup.iterations;
+        bits += static_cast<double>(point.blocks) * setup.informationBits();
+        cost += static_cast<double>(point.blocks) * setup.informationBits() * setup.iterations;
     }
     if (!itsBeginning) {
         itsBeginning = {now, bits, cost};
@@ -88,8 +88,8 @@ SweepProgress ProgressMeter::measure(const sweep::Dispatcher& dispatcher, Clock:
     progress.secondsLeft = 0;
     for (std::size_t i = 0; i < points.size(); ++i) {
         const sweep::Setup& setup = planned[i].setup;
-        const double seconds = (expected[i] - static_cast<double>(points[i].blocks)) * setup.blockSize *
-                               setup.iterations / costPerSecond;
+        const double seconds = (expected[i] - static_cast<double>(points[i].blocks)) *
+                               setup.informationBits() * setup.iterations / costPerSecond;
         const auto limit = static_cast<double>(planned[i].rule.maxSeconds);
         *progress.secondsLeft +=
             limit == 0 ? seconds : std::min(seconds, std::max(limit - points[i].seconds, 0.0));

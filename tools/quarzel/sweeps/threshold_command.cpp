@@ -106,9 +106,7 @@ bool simulate(const sweep::Configuration& configuration, const std::map<sweep::S
     for (const auto& [setup, blocks] : needs) {
         const auto known = points.find(setup);
         plan.points.push_back(
-            {setup,
-             {blocks, 0, 0},
-             known == points.end() ? sweep::PointState(configuration.countsOf(setup)) : known->second});
+            {setup, {blocks, 0, 0}, known == points.end() ? configuration.startOf(setup) : known->second});
     }
     sweep::Dispatcher dispatcher(std::move(plan));
     Checkpoint none("", std::chrono::seconds(0));

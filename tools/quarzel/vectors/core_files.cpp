@@ -109,20 +109,20 @@ struct CaptureFiles {
 };
 
 /// Distribute the blocks over captures, and tell the blocks where they are.
-std::vector<CaptureFiles> capturesOf(VectorCore& core, const std::vector<PlannedBlock>& plan,
-                                     const std::vector<StimulusAndResponse>& blocks) {
+std::vector<CaptureFiles> capturesOf(VectorCore& core, const std::vector<StimulusAndResponse>& blocks) {
     std::vector<CaptureFiles> captures;
-    for (std::size_t i = 0; i < plan.size(); ++i) {
-        const std::string name = fmt::format("npy/k{}_i{}", plan[i].blockSize, plan[i].iterations);
+    for (std::size_t i = 0; i < blocks.size(); ++i) {
+        VectorBlock& block = core.blocks[i];
+        const std::string name = fmt::format("npy/k{}_i{}", block.blockSize, block.iterations);
         auto capture = std::find_if(captures.begin(), captures.end(), [&name](const CaptureFiles& candidate) {
             return candidate.name == name;
         });
         if (capture == captures.end()) {
-            captures.push_back({name, plan[i].blockSize, {}});
+            captures.push_back({name, block.blockSize, {}});
             capture = captures.end() - 1;
         }
-        core.blocks.push_back({plan[i].blockSize, plan[i].iterations, nameOf(plan[i].stimulus),
-                               name + ".soft.npy", capture->blocks.size()});
+        block.capture = name + ".soft.npy";
+        block.row = capture->blocks.size();
         capture->blocks.push_back(&blocks[i]);
     }
     return captures;
@@ -131,13 +131,12 @@ std::vector<CaptureFiles> capturesOf(VectorCore& core, const std::vector<Planned
 }  // namespace
 
 std::vector<VectorFile> writeCore(OutputDirectory& directory, VectorCore& core,
-                                  const std::vector<PlannedBlock>& plan,
                                   const std::vector<StimulusAndResponse>& blocks) {
     std::vector<VectorFile> files;
     const auto write = [&](const std::string& name, std::string_view bytes) {
         files.push_back(directory.write(core.directory + '/' + name, bytes));
     };
-    const std::vector<CaptureFiles> captures = capturesOf(core, plan, blocks);
+    const std::vector<CaptureFiles> captures = capturesOf(core, blocks);
     MemorySizes sizes;
     const std::string table = blockText(core, sizes);
     write("config.vh", headerText(core, sizes));

@@ -79,10 +79,14 @@ std::string manifestText(const Json& configuration, const Json& coverage, const 
     for (const VectorFile& file : content.files) {
         files.push_back({{"name", file.name}, {"bytes", file.bytes}, {"sha256", file.sha256}});
     }
-    const Json manifest = {{"format", format},           {"version", version},
-                           {"quarzel", QUARZEL_VERSION}, {"configuration", configuration},
-                           {"coverage", coverage},       {"cores", std::move(cores)},
-                           {"files", std::move(files)}};
+    Json manifest = {{"format", format},           {"version", version},
+                     {"quarzel", QUARZEL_VERSION}, {"configuration", configuration},
+                     {"coverage", coverage},       {"cores", std::move(cores)},
+                     {"files", std::move(files)}};
+    for (const VectorStage& stage : content.stages) {
+        manifest["stages"].push_back(
+            {{"file", stage.file}, {"holds", stage.holds}, {"word", stage.word}, {"clause", stage.clause}});
+    }
     std::string text;
     appendLines(text, manifest, "");
     return text + '\n';

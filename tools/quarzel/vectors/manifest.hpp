@@ -36,10 +36,19 @@ struct VectorFile {
     std::string sha256;
 };
 
+/// What a file of a vector set holds of a link.
+struct VectorStage {
+    std::string file;
+    std::string holds;
+    std::string word;    ///< what a word of the memory is
+    std::string clause;  ///< of the standard that defines it
+};
+
 /// What there is in a vector set.
 struct VectorContent {
     std::vector<VectorCore> cores;
     std::vector<VectorFile> files;
+    std::vector<VectorStage> stages;  ///< of a link, for people; not read back
 };
 
 /// The text of a manifest: JSON with a line for each core, block and file.

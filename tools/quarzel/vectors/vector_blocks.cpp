@@ -5,6 +5,7 @@
 
 #include <mutex>
 #include <span>
+#include <utility>
 
 #include "link/parallel.hpp"
 #include "quarzel/core.hpp"
@@ -14,31 +15,28 @@ namespace quarzel::tool {
 
 namespace {
 
-StimulusAndResponse makeBlock(const PlannedBlock& planned, const StimulusSource& source, int units,
-                              Core& core) {
-    StimulusAndResponse made{source.make(planned, static_cast<std::uint32_t>(units)),
-                             std::vector<unsigned char>(planned.blockSize)};
+StimulusAndResponse makeBlock(const VectorBlock& block, std::vector<std::int8_t> soft, Core& core) {
+    StimulusAndResponse made{std::move(soft), std::vector<unsigned char>(block.blockSize)};
     try {
         core.decode(softBlocks(std::span<const std::int8_t>(made.soft), made.soft.size() / 3),
-                    planned.iterations, made.decisions);
+                    block.iterations, made.decisions);
     } catch (const Error& error) {
-        throw decodingError("", fmt::format("a block of {} bits", planned.blockSize), error);
+        throw decodingError("", fmt::format("a block of {} bits", block.blockSize), error);
     }
     return made;
 }
 
 }  // namespace
 
-std::vector<StimulusAndResponse> makeBlocks(const std::vector<PlannedBlock>& plan,
-                                            const StimulusSource& source, int units, int algorithm,
+std::vector<StimulusAndResponse> makeBlocks(const CoreStimulus& stimulus, int units, int algorithm,
                                             unsigned threads,
                                             const std::function<void(std::size_t)>& progress) {
-    std::vector<StimulusAndResponse> blocks(plan.size());
+    std::vector<StimulusAndResponse> blocks(stimulus.blocks.size());
     std::mutex mutex;  // of what follows
     std::size_t done = 0;
-    link::forEachOnThreads(plan.size(), threads, [&] {
+    link::forEachOnThreads(blocks.size(), threads, [&] {
         return [&, core = Core(CoreSettings{units, algorithm})](std::size_t block) mutable {
-            blocks[block] = makeBlock(plan[block], source, units, core);
+            blocks[block] = makeBlock(stimulus.blocks[block], stimulus.soft(block), core);
             const std::lock_guard lock(mutex);
             progress(++done);
         };

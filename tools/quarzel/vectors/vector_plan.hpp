@@ -3,9 +3,10 @@
 
 #include <cstddef>
 #include <cstdint>
+#include <optional>
 #include <vector>
 
-#include "link/channel_thresholds.hpp"
+#include "link/chain/coded_link.hpp"
 #include "vectors/stimulus.hpp"
 
 namespace quarzel::tool {
@@ -22,6 +23,7 @@ struct VectorRequest {
     link::Decibels ebN0;     ///< of the noise
     link::Quantiser quantiser;
     std::uint64_t seed = 1;
+    std::optional<link::LinkSetup> link;  ///< makes the blocks, instead of stimuli for block sizes
 };
 
 /// A block of a set before it is made.

@@ -3,10 +3,14 @@
 
 #include <fmt/format.h>
 
+#include <memory>
 #include <nlohmann/json.hpp>
+#include <optional>
 
 #include "tool_error.hpp"
 #include "vectors/core_files.hpp"
+#include "vectors/link_vectors.hpp"
+#include "vectors/stimulus_source.hpp"
 #include "vectors/vector_configuration.hpp"
 #include "vectors/vector_coverage.hpp"
 
@@ -16,19 +20,25 @@ namespace {
 
 using Json = nlohmann::ordered_json;
 
-std::size_t blocksOf(const VectorRequest& request) {
-    std::size_t blocks = 0;
-    for (const int units : request.units) {
-        blocks += planBlocks(request, static_cast<std::uint32_t>(units)).size() * request.algorithms.size();
+/// The blocks that a request without a link plans.
+CoreStimulus plannedStimulus(const VectorRequest& request, std::uint32_t units) {
+    std::vector<PlannedBlock> plan = planBlocks(request, units);
+    CoreStimulus stimulus;
+    for (const PlannedBlock& planned : plan) {
+        stimulus.blocks.push_back({planned.blockSize, planned.iterations, nameOf(planned.stimulus), "", 0});
     }
-    return blocks;
+    stimulus.soft = [plan = std::move(plan), source = std::make_shared<const StimulusSource>(request),
+                     units](std::size_t i) { return source->make(plan[i], units); };
+    return stimulus;
 }
 
-VectorCoverage coverageOf(const VectorCore& core, const std::vector<StimulusAndResponse>& blocks) {
+VectorCoverage coverageOf(const VectorCore& core, const std::vector<StimulusAndResponse>& blocks,
+                          bool isLink) {
     VectorCoverage coverage(static_cast<std::uint32_t>(core.units));
     for (std::size_t i = 0; i < blocks.size(); ++i) {
         const VectorBlock& block = core.blocks[i];
-        coverage.add(block.blockSize, block.iterations, block.stimulus, blocks[i].soft, blocks[i].decisions);
+        coverage.add(block.blockSize, block.iterations, isLink ? "link" : block.stimulus, blocks[i].soft,
+                     blocks[i].decisions);
     }
     return coverage;
 }
@@ -48,21 +58,34 @@ void requireComplete(const VectorCoverage& coverage, const VectorCore& core) {
 VectorSetSummary makeVectorSet(const VectorRequest& request, const std::string& directory, bool isReplaced,
                                unsigned threads, const VectorProgress& progress) {
     OutputDirectory output(directory, isReplaced);
-    const StimulusSource source(request);
     VectorContent content;
     Json coverages = Json::object();
     VectorSetSummary summary;
-    const std::size_t total = blocksOf(request);
+    std::optional<LinkVectors> link;
+    if (request.link) {
+        link.emplace(request, threads);
+        link->writeStages(output, content);
+    }
+    std::vector<CoreStimulus> stimuli;
+    std::size_t total = 0;
     for (const int units : request.units) {
-        const std::vector<PlannedBlock> plan = planBlocks(request, static_cast<std::uint32_t>(units));
+        stimuli.push_back(link ? link->stimulus()
+                               : plannedStimulus(request, static_cast<std::uint32_t>(units)));
+        total += stimuli.back().blocks.size() * request.algorithms.size();
+    }
+    for (std::size_t i = 0; i < stimuli.size(); ++i) {
+        const int units = request.units[i];
         for (const int algorithm : request.algorithms) {
-            VectorCore core{fmt::format("u{}_a{}", units, algorithm), units, algorithm, {}};
+            VectorCore core{fmt::format("u{}_a{}", units, algorithm), units, algorithm, stimuli[i].blocks};
             const std::vector<StimulusAndResponse> blocks =
-                makeBlocks(plan, source, units, algorithm, threads,
+                makeBlocks(stimuli[i], units, algorithm, threads,
                            [&](std::size_t done) { progress(summary.blocks + done, total); });
-            const std::vector<VectorFile> files = writeCore(output, core, plan, blocks);
+            const std::vector<VectorFile> files = writeCore(output, core, blocks);
             content.files.insert(content.files.end(), files.begin(), files.end());
-            const VectorCoverage coverage = coverageOf(core, blocks);
+            if (link) {
+                link->writeDecided(output, core, blocks, content);
+            }
+            const VectorCoverage coverage = coverageOf(core, blocks, link.has_value());
             if (request.cover) {
                 requireComplete(coverage, core);
             }

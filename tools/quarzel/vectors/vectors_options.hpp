@@ -1,0 +1,39 @@
+// SPDX-License-Identifier: MIT
+#pragma once
+
+#include <CLI/CLI.hpp>
+#include <cstddef>
+#include <optional>
+#include <string>
+#include <vector>
+
+#include "options/link_options.hpp"
+#include "options/threads_option.hpp"
+#include "vectors/vector_plan.hpp"
+
+namespace quarzel::tool {
+
+/// What the user gives to `quarzel vectors`.
+struct VectorsOptions {
+    std::string directory;
+    std::vector<std::string> blockSizes;
+    std::vector<std::string> stimuli;
+    std::optional<std::size_t> blocks;
+    double ebN0 = 1.0;
+    unsigned threads = allCores();
+    bool replace = false;
+    bool json = false;
+    LinkOptions link;
+    std::vector<const CLI::Option*> linkOptions;  ///< those of the link, given or not
+    VectorRequest request;
+};
+
+/// Add the options of `quarzel vectors`.
+/// @param options  holds the defaults and receives the choice; must outlive the parse
+void addVectorsOptions(CLI::App& command, VectorsOptions& options);
+
+/// The set that the user wants.
+/// @throws ToolError when options do not go together or sizes do not fit one another
+VectorRequest requestOf(const VectorsOptions& options);
+
+}  // namespace quarzel::tool
