@@ -1,11 +1,12 @@
 # SPDX-License-Identifier: MIT
 # The commands of the README. Each does its own set-up.
-.PHONY: help demo test test-long bench docs package validate format
+.PHONY: help demo test test-long test-release bench docs package validate format
 
 help:
 	@echo "make demo       install what is missing, build, and decode the captures that come with the project"
 	@echo "make test       install what is missing, build, and run every test, the library's with sanitizers, too"
 	@echo "make test-long  the checks that take an hour or two: the tool with sanitizers, 64-bit Arm, whole domains, proofs, Slurm, bindings without the tool, the analyser"
+	@echo "make test-release  the checks of a release, a night: both above, compilers, old processors, fuzzers"
 	@echo "make bench      build and run the benchmarks"
 	@echo "make docs       build the site of the pages and the headers in build/docs/site, with its links checked"
 	@echo "make package    build the Debian packages in build/package, and ask lintian about them"
@@ -25,23 +26,10 @@ test:
 	@ctest --preset sanitize
 
 test-long:
-	@scripts/install-packages.sh long
-	@/usr/bin/python3 tests/proofs/lane_bounds.py .
-	@$(MAKE) docs
-	@scripts/build.sh bench
-	@scripts/build.sh release
-	@tests/style/lint.sh . build/release --analyse
-	@QUARZEL_TEST_EXHAUSTIVE=1 ctest --preset release -R 'Lane|DecodeGrid|PlainDecoder|CoveringBlocks|MaxStar|Wrap16|RateMatching|RateRecovery|Segmentation|TurboEncoding'
-	@tests/sweep/slurm_test.sh . build/release
-	@tests/bindings/without_tool.sh . build/without-tool
-	@tests/bindings/python/pip_test.sh . /usr/bin/python3 python lte cocotb python_sweeps
-	@scripts/package.sh
-	@tests/install/packages_test.sh build/package
-	@tests/install/pages_test.sh .
-	@scripts/build.sh sanitize-tool
-	@ctest --preset sanitize-tool
-	@scripts/build.sh aarch64
-	@ctest --preset aarch64
+	@scripts/test-long.sh
+
+test-release:
+	@scripts/test-release.sh
 
 bench:
 	@scripts/install-packages.sh test

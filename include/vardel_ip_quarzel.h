@@ -18,7 +18,8 @@
  *   messages        what is wrong with generics, and a receiver for every line that a model writes
  *   passes          every signal of the next passes, as arrays of integers
  *   implementation  which decoder is at work, and the choice of another
- *   code            block sizes, permutation, segments and windows, names of the signals
+ *   code            block sizes, permutation, segments and windows, names of the signals, trellis,
+ * corrections
  *
  * C++ programs find all of it in quarzel/core.hpp, a class over this header.
  *
@@ -478,6 +479,34 @@ typedef struct vardel_ip_quarzel_signal {
  */
 VARDEL_IP_QUARZEL_API int vardel_ip_quarzel_get_signal(int index, vardel_ip_quarzel_signal* signal);
 
+/** A branch of the trellis of the constituent codes. */
+typedef struct vardel_ip_quarzel_branch {
+    unsigned int from;   /**< encoder state before the step, 0 to 7 */
+    unsigned int to;     /**< encoder state after it */
+    unsigned int metric; /**< number of the branch metric that it carries, 4 to 7: g4 to g7. The branch of bit
+                            1 adds it, that of bit 0 takes it away */
+} vardel_ip_quarzel_branch;
+
+/**
+ * The branches of the trellis.
+ *
+ * @param state   encoder state that the branch leaves, 0 to 7
+ * @param bit     information bit of the branch, 0 or 1
+ * @param branch  receives the branch
+ * @return        0; or 1, with nothing written, when there is no such branch
+ */
+VARDEL_IP_QUARZEL_API int vardel_ip_quarzel_get_branch(unsigned int state, unsigned int bit,
+                                                       vardel_ip_quarzel_branch* branch);
+
+/**
+ * The corrections that algorithm type 2 adds to a maximum, ln(1 + e^-|d|) of the difference d of its
+ * candidates, in units of 1/8.
+ *
+ * @param corrections  receives 4096 entries, for the differences -2048 to 2047 in units of 1/8
+ * @return             0; or 1, with nothing written, when there is no memory
+ */
+VARDEL_IP_QUARZEL_API int vardel_ip_quarzel_get_corrections(unsigned char* corrections);
+
 #ifdef __cplusplus
 }
 #endif
@@ -508,7 +537,7 @@ VARDEL_IP_QUARZEL_API void vardel_ip_quarzel_bitacc_dump_config(vardel_ip_quarze
 
 /**
  * Make a state record without components, for vardel_ip_quarzel_create_state to fill. It validates nothing
- * and cannot decode; free it with vardel_ip_quarzel_destroy_state.
+ * and cannot decode: calls that try give status 99. Free it with vardel_ip_quarzel_destroy_state.
  *
  * @return  the record, or null after "ERROR:decoder:Could not allocate memory for decoder state"
  */

@@ -11,8 +11,8 @@ import sys
 from pathlib import Path
 
 SOURCES = ["include/**/*.h", "include/**/*.hpp", "examples/*.c", "examples/*.py", "examples/systemverilog/*.sv",
-           "bindings/systemverilog/*.sv", "packages.txt"]
-LANGUAGES = {".h": "c", ".c": "c", ".hpp": "cpp", ".py": "python", ".sv": "verilog"}
+           "examples/vhdl/*.vhd", "bindings/systemverilog/*.sv", "bindings/vhdl/*.vhd", "packages.txt"]
+LANGUAGES = {".h": "c", ".c": "c", ".hpp": "cpp", ".py": "python", ".sv": "verilog", ".vhd": "vhdl"}
 
 
 def main():

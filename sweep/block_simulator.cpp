@@ -5,7 +5,6 @@
 #include <span>
 
 #include "link/bit_errors.hpp"
-#include "sweep/link_simulation.hpp"
 
 namespace quarzel::sweep {
 
@@ -92,6 +91,18 @@ ErrorList BlockSimulator::simulate(const Setup& setup, std::size_t counts,
     send(setup, octets);
     decode(setup, counts, octets.size() * blocksPerOctet);
     return count(setup.blockSize, counts, octets);
+}
+
+std::vector<SentBlock> BlockSimulator::makeAgain(const Setup& setup, std::uint64_t number) {
+    if (!setup.sending.isPlain()) {
+        return sendOverLink(setup, itsChannels.linkOf(setup), runOf(setup), *itsChannels.of(setup),
+                            coreOf(setup), number);
+    }
+    send(setup, {number / blocksPerOctet});
+    const auto lane = static_cast<unsigned>(number % blocksPerOctet);
+    const std::size_t values = itsSoft.size() / blocksPerOctet;
+    const auto soft = itsSoft.begin() + static_cast<std::ptrdiff_t>(lane * values);
+    return {{bitsOfLane(itsBits, lane), {soft, soft + static_cast<std::ptrdiff_t>(values)}}};
 }
 
 }  // namespace quarzel::sweep

@@ -12,6 +12,7 @@
 #include "link/encoder.hpp"
 #include "quarzel/core.hpp"
 #include "sweep/channels.hpp"
+#include "sweep/link_simulation.hpp"
 #include "sweep/point_state.hpp"
 #include "sweep/setup.hpp"
 
@@ -33,6 +34,11 @@ class BlockSimulator {
     /// @return        the blocks in error; with a stop rule of the receiver all blocks
     /// @throws quarzel::Error when the library refuses
     ErrorList simulate(const Setup& setup, std::size_t counts, const std::vector<std::uint64_t>& octets);
+
+    /// Make one block of a point again, by its number alone.
+    /// @return  its code blocks, one unless it is a transport block, with what the core was given last
+    /// @throws quarzel::Error when the library refuses
+    std::vector<SentBlock> makeAgain(const Setup& setup, std::uint64_t number);
 
   private:
     Core& coreOf(const Setup& setup);

@@ -25,7 +25,7 @@ std::vector<std::uint64_t> octetNumbers(const Task& task, const Shard& shard) {
 Dispatcher::Dispatcher(Plan plan) : itsPlan(std::move(plan)) {
     itsPoints.reserve(itsPlan.points.size());
     for (const PlannedPoint& point : itsPlan.points) {
-        PointProgress progress(point.rule, itsPlan.shard, point.start);
+        PointProgress progress(point.rule, itsPlan.shard, point.start, itsPlan.keptFailures);
         const std::uint64_t nextOctet = progress.octetsDone();
         itsPoints.push_back({std::move(progress), nextOctet, std::nullopt});
     }
@@ -155,6 +155,11 @@ bool Dispatcher::isLeftOut(std::size_t point) const {
 PointState Dispatcher::stateOf(std::size_t point) const {
     const std::lock_guard lock(itsMutex);
     return stateOf(itsPoints.at(point));
+}
+
+std::vector<FailingBlock> Dispatcher::failuresOf(std::size_t point) const {
+    const std::lock_guard lock(itsMutex);
+    return itsPoints.at(point).progress.failures();
 }
 
 }  // namespace quarzel::sweep

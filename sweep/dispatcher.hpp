@@ -67,6 +67,9 @@ class Dispatcher {
     /// The state of one point.
     PointState stateOf(std::size_t point) const;
 
+    /// The first failing blocks of one point among those that were simulated here, as many as the plan keeps.
+    std::vector<FailingBlock> failuresOf(std::size_t point) const;
+
     /// The first point that has not ended and is not left out; the number of points when there is none.
     std::size_t firstUnfinished() const;
 

@@ -72,6 +72,13 @@ class Rows {
 
 }  // namespace
 
+std::vector<std::uint8_t> bitsOfLane(std::span<const std::uint8_t> bits, unsigned lane) {
+    std::vector<std::uint8_t> own(bits.size());
+    std::transform(bits.begin(), bits.end(), own.begin(),
+                   [lane](std::uint8_t byte) { return static_cast<std::uint8_t>(byte >> lane & 1U); });
+    return own;
+}
+
 ErrorList simulateLink(const Setup& setup, std::size_t counts, link::LinkRun& run,
                        const link::Channel& channel, Core& core, const std::vector<std::uint64_t>& octets) {
     const std::size_t transmissions = setup.transmissions();
@@ -108,6 +115,34 @@ ErrorList simulateLink(const Setup& setup, std::size_t counts, link::LinkRun& ru
         }
     }
     return rows.errors();
+}
+
+std::vector<SentBlock> sendOverLink(const Setup& setup, const link::CodedLink& link, link::LinkRun& run,
+                                    const link::Channel& channel, Core& core, std::uint64_t number) {
+    const bool stops = setup.sending.stop == Stop::crc;
+    const std::vector<std::uint64_t> octets = {number / blocksPerOctet};
+    run.begin(setup.ebN0, octets, std::numeric_limits<std::uint64_t>::max());
+    std::vector<std::uint8_t> isWanted(run.size());
+    isWanted.at(number % blocksPerOctet) = 1;
+    run.retain(isWanted);
+    for (std::size_t t = 0; t < setup.transmissions(); ++t) {
+        run.transmit(channel, static_cast<std::uint32_t>(t));
+        if (t + 1 == setup.transmissions()) {
+            break;
+        }
+        run.decode(core, setup.iterations, stops);
+        if (decisionOn(run, 0, stops ? static_cast<std::size_t>(setup.iterations) : 1).verdict.isAccepted) {
+            break;
+        }
+    }
+    std::vector<SentBlock> blocks;
+    for (std::size_t r = 0; r < link.segmentation().C; ++r) {
+        const std::span<const std::int8_t> soft = run.soft(0, r);
+        blocks.push_back(
+            {bitsOfLane(run.bits(0).subspan(link.bitsBefore(r), link.segmentation().size(r)), run.lane(0)),
+             {soft.begin(), soft.end()}});
+    }
+    return blocks;
 }
 
 }  // namespace quarzel::sweep

@@ -10,7 +10,8 @@ Plan planOf(const Configuration& configuration, const Shard& shard, const Points
     Plan plan{configuration.seed,
               {},
               configuration.targetBler,
-              dividesBlocks(configuration.stopRule) ? shard : Shard{}};
+              dividesBlocks(configuration.stopRule) ? shard : Shard{},
+              0};
     for (const Setup& setup : setupsOf(configuration, shard)) {
         PointState start = configuration.startOf(setup);
         if (const auto point = known.find(setup); point != known.end()) {
@@ -26,7 +27,7 @@ Plan planOf(const Configuration& configuration, const Shard& shard, const Points
 }
 
 Plan repetitionOf(std::uint64_t seed, const Points& points) {
-    Plan plan{seed, {}, 0, {}};
+    Plan plan{seed, {}, 0, {}, 0};
     for (const auto& [setup, point] : points) {
         const bool endsByErrors = point.stoppedBy == StopReason::blockErrors;
         plan.points.push_back(

@@ -22,6 +22,7 @@ struct Plan {
     std::vector<PlannedPoint> points;
     double targetBler = 0;  ///< as in Configuration
     Shard shard = {};       ///< whose blocks are simulated; whole unless the blocks of points are divided
+    std::uint64_t keptFailures = 0;  ///< how many failing blocks of each point are remembered, the first ones
 };
 
 /// The plan of a sweep or a shard of it.

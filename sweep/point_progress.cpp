@@ -6,12 +6,14 @@
 
 namespace quarzel::sweep {
 
-PointProgress::PointProgress(const StopRule& rule, const Shard& shard, PointState state)
+PointProgress::PointProgress(const StopRule& rule, const Shard& shard, PointState state,
+                             std::uint64_t keptFailures)
     : itsRule(rule),
       itsShard(shard),
       itsOctetsDone(state.blocks / blocksPerOctet),
       itsFirstBlock(state.blocks),
-      itsState(std::move(state)) {
+      itsState(std::move(state)),
+      itsKeptFailures(keptFailures) {
     const std::uint64_t all = (rule.maxBlocks + blocksPerOctet - 1) / blocksPerOctet;
     itsOctets = all > shard.index ? (all - shard.index - 1) / shard.count + 1 : 0;
     const bool hasBlocks = itsState.blocks >= blocksIn(itsOctets);
@@ -54,6 +56,9 @@ void PointProgress::add(const Piece& piece) {
         }
         const std::uint32_t* const row = piece.errors.row(i, itsState.columns());
         itsState.add(row);
+        if (row[counts - 1] != 0 && itsFailures.size() < itsKeptFailures) {
+            itsFailures.push_back({block, row[counts - 1] & ~(undetectedMark | rejectedMark)});
+        }
         if (row[counts - 1] != 0 && itsState.last().blockErrors == itsRule.maxBlockErrors) {
             itsState.blocks = block + 1;
             stop(StopReason::blockErrors);

@@ -2,8 +2,10 @@
 #include "dpi_core.hpp"
 
 #include <iterator>
+#include <limits>
 #include <map>
 #include <mutex>
+#include <random>
 
 namespace quarzel::dpi {
 
@@ -13,7 +15,10 @@ namespace {
 struct Registry {
     std::mutex mutex;
     std::map<std::uintptr_t, std::shared_ptr<DpiCore>> cores;
-    std::uintptr_t last = 0;
+    /// The last handle. The first one is drawn, so that a handle of another process, which comes back when a
+    /// simulation is restored, is none of this one. It is below 2^62, as VHDL's simulators need it.
+    std::uintptr_t last = std::uintptr_t{std::random_device()()}
+                          << (std::numeric_limits<std::uintptr_t>::digits / 2 - 2);
 };
 
 Registry& registry() {

@@ -32,7 +32,7 @@ struct DpiCore {
 };
 
 /// The handle of a new core; never null. Handles are numbers that are used once, so that one that was closed
-/// is known as such for ever.
+/// or came from another process is known as such for ever.
 void* addCore();
 
 /// The core of a handle, or null when there is none.

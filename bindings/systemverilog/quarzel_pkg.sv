@@ -14,6 +14,7 @@ package quarzel_pkg;
   localparam int QUARZEL_MAX_POSITIONS = QUARZEL_MAX_K + 4;
 
   typedef byte quarzel_stream_t [0:QUARZEL_MAX_POSITIONS-1];
+  typedef logic signed [31:0] quarzel_logic_stream_t [0:QUARZEL_MAX_POSITIONS-1];
   typedef bit  quarzel_bits_t   [0:QUARZEL_MAX_K-1];
 
   // A new model; always a handle, whose error tells whether it can be used.
@@ -30,13 +31,19 @@ package quarzel_pkg;
       input chandle handle, input int positions, input quarzel_stream_t systematic,
       input quarzel_stream_t parity1, input quarzel_stream_t parity2, input int iterations,
       input int unsigned tag, output quarzel_bits_t bits);
+  // The same for four-valued soft values: an x or z in those that are used is an error, which names the first one.
+  import "DPI-C" function int quarzel_dpi_decode_logic(
+      input chandle handle, input int positions, input quarzel_logic_stream_t systematic,
+      input quarzel_logic_stream_t parity1, input quarzel_logic_stream_t parity2, input int iterations,
+      input int unsigned tag, output quarzel_bits_t bits);
 
   // Open arrays, which carry their sizes. K, or -1. bits needs room for K decisions.
   import "DPI-C" function int quarzel_dpi_decode_open(
       input chandle handle, input byte systematic[], input byte parity1[], input byte parity2[],
       input int iterations, input int unsigned tag, output bit bits[]);
 
-  // Scalars, which every simulator can pass: push K + 4 positions, run (K, or -1), pop K bits (-1 when none is left).
+  // Scalars, which every simulator and other languages can pass: push K + 4 positions, run (K, or -1), pop K bits (-1
+  // when none is left). An x or z on its way into an int becomes 0: quarzel_dpi_decode_logic and the class find it.
   import "DPI-C" function void quarzel_dpi_push(
       input chandle handle, input int systematic, input int parity1, input int parity2);
   import "DPI-C" function int quarzel_dpi_run(input chandle handle, input int iterations, input int unsigned tag);
@@ -58,6 +65,11 @@ package quarzel_pkg;
   class quarzel_decoder;
 
     protected chandle handle;
+    protected quarzel_logic_stream_t pushed_systematic, pushed_parity1, pushed_parity2;
+    protected int pushed = 0;  // positions of the next block
+    protected quarzel_bits_t decisions;
+    protected int decided = 0;  // decisions of the last block
+    protected int popped = 0;   // how many of them have been popped
 
     // units 2, 4 or 8; algorithm 0 max-log, 1 max-log with scaled extrinsic values, 2 max-star.
     function new(int units = 2, int algorithm = 1, int tag_width = 8);
@@ -68,38 +80,56 @@ package quarzel_pkg;
     // Decode a block held in arrays of any size: K, or -1. bits is resized to K.
     function int decode(input byte systematic[], input byte parity1[], input byte parity2[],
                         output bit bits[], input int iterations = 6, input int unsigned tag = 0);
+      quarzel_stream_t fixed_systematic, fixed_parity1, fixed_parity2;
       if (systematic.size() != parity1.size() || systematic.size() != parity2.size()) begin
         $error("quarzel: the streams have %0d, %0d and %0d values; they must have the same number",
                systematic.size(), parity1.size(), parity2.size());
         return -1;
       end
-      for (int i = 0; i < systematic.size(); i++) begin
-        push(int'(systematic[i]), int'(parity1[i]), int'(parity2[i]));
+      for (int i = 0; i < systematic.size() && i < QUARZEL_MAX_POSITIONS; i++) begin
+        fixed_systematic[i] = systematic[i];
+        fixed_parity1[i] = parity1[i];
+        fixed_parity2[i] = parity2[i];
       end
-      decode = run(iterations, tag);
+      decode = quarzel_dpi_decode_fixed(handle, systematic.size(), fixed_systematic, fixed_parity1, fixed_parity2,
+                                        iterations, tag, decisions);
+      report();
+      decided = 0;
+      popped = 0;
       if (decode > 0) begin
         bits = new[decode];
-        for (int i = 0; i < decode; i++) bits[i] = pop();
+        for (int i = 0; i < decode; i++) bits[i] = decisions[i];
       end
     endfunction
 
-    // One position of the next block.
-    function void push(int systematic, int parity1, int parity2);
-      quarzel_dpi_push(handle, systematic, parity1, parity2);
+    // One position of the next block. An x or z in it makes run fail.
+    function void push(logic signed [31:0] systematic, logic signed [31:0] parity1, logic signed [31:0] parity2);
+      if (pushed < QUARZEL_MAX_POSITIONS) begin
+        pushed_systematic[pushed] = systematic;
+        pushed_parity1[pushed] = parity1;
+        pushed_parity2[pushed] = parity2;
+      end
+      pushed++;
     endfunction
 
-    // Decode what has been pushed: K, or -1.
+    // Decode what has been pushed: K, or -1. It is used up, whatever comes of it.
     function int run(int iterations = 6, int unsigned tag = 0);
-      run = quarzel_dpi_run(handle, iterations, tag);
+      run = quarzel_dpi_decode_logic(handle, pushed, pushed_systematic, pushed_parity1, pushed_parity2, iterations,
+                                     tag, decisions);
       report();
+      pushed = 0;
+      decided = run > 0 ? run : 0;
+      popped = 0;
     endfunction
 
-    // The next decision of the last block.
+    // The next decision of the last block that was pushed.
     function bit pop();
-      int value;
-      value = quarzel_dpi_pop(handle);
-      if (value < 0) report();
-      return value == 1;
+      if (popped >= decided) begin
+        $error("quarzel: all decisions of the last block have been popped; run the next one");
+        return 0;
+      end
+      pop = decisions[popped];
+      popped++;
     endfunction
 
     // The tag of the last decoded block, masked to the tag width.

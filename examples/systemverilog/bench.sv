@@ -1,7 +1,7 @@
 // SPDX-License-Identifier: MIT
 // A self-checking test bench: every block that goes into the device goes into the model, and every bit that comes
 // out is compared. Plus arguments: +directory=DIR with k40_soft.hex and k40_decided.hex, and +error_block=N
-// +error_bit=N to let the device make a mistake.
+// +error_bit=N to let the device make a mistake. Blocks and bits count from 0.
 
 module bench;
   import quarzel_pkg::*;
@@ -38,7 +38,7 @@ module bench;
         @(negedge clk);
         {systematic, parity1, parity2} = stimulus[block*(K+4)+i];
         in_valid = 1;
-        model.push(int'(systematic), int'(parity1), int'(parity2));
+        model.push(32'(systematic), 32'(parity1), 32'(parity2));
       end
       if (model.run(6) != K) $fatal(1, "the model refused block %0d", block);
       for (int i = 0; i < K; i++) expected.push_back(model.pop());

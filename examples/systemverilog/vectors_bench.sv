@@ -1,8 +1,8 @@
 // SPDX-License-Identifier: MIT
 // A self-checking test bench without DPI, for Icarus Verilog among others: it reads a core's files of `quarzel vectors`,
 // drives the device block by block, compares each decision, and writes all of them to simulated.hex for `quarzel compare`.
-// Compile with the directory of the core on the include path and as the macro VECTORS. The plus argument
-// +error_address=N lets the device get the decision at that address of dout.hex wrong.
+// Compile with the directory of the core on the include path and as the macro VECTORS. The plus arguments +error_block=N
+// +error_bit=N let the device make a mistake. Blocks and bits count from 0.
 
 // A stand-in for a decoder: a register that takes the decisions of a block from a memory when its soft values are in,
 // and shifts them out, one bit a cycle.
@@ -64,7 +64,7 @@ module vectors_bench;
       .clk(clk), .in_valid(in_valid), .in_last(in_last), .systematic(systematic), .parity1(parity1),
       .parity2(parity2), .K(K), .out_valid(out_valid), .out_bit(out_bit));
 
-  integer b, i, soft_at, dout_at, error_address, errors;
+  integer b, i, soft_at, dout_at, error_block, error_bit, errors;
 
   initial begin
     $readmemh({`VECTORS, "/blocks.hex"}, blocks);
@@ -73,8 +73,11 @@ module vectors_bench;
     $readmemh({`VECTORS, "/rsc2_par.hex"}, rsc2_par);
     $readmemh({`VECTORS, "/dout.hex"}, expected);
     $readmemh({`VECTORS, "/dout.hex"}, device.decided);
-    if ($value$plusargs("error_address=%d", error_address))
-      device.decided[error_address] = !device.decided[error_address];
+    if (!$value$plusargs("error_bit=%d", error_bit)) error_bit = 0;
+    if ($value$plusargs("error_block=%d", error_block)) begin
+      dout_at = blocks[4*error_block+3] + error_bit;
+      device.decided[dout_at] = !device.decided[dout_at];
+    end
     errors = 0;
     for (b = 0; b < BLOCKS; b = b + 1) begin
       K = blocks[4*b];
@@ -96,15 +99,15 @@ module vectors_bench;
         decided[dout_at+i] = out_bit;
         if (out_bit !== expected[dout_at+i]) begin
           if (errors == 0)
-            $display("block %0d: bit %0d is %b, the model gives %b", b + 1, i, out_bit, expected[dout_at+i]);
+            $display("block %0d: bit %0d is %b, the model gives %b", b, i, out_bit, expected[dout_at+i]);
           errors = errors + 1;
         end
         @(negedge clk);
       end
     end
     $writememh("simulated.hex", decided);
-    if (errors == 0) $display("%0d blocks are those of the model", BLOCKS);
-    else $display("%0d of %0d bits differ", errors, DOUT_WORDS);
+    if (errors != 0) $fatal(1, "%0d of %0d bits differ", errors, DOUT_WORDS);
+    $display("%0d blocks are those of the model", BLOCKS);
     $finish;
   end
 endmodule

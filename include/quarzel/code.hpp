@@ -5,6 +5,7 @@
 #include <array>
 #include <cstddef>
 #include <cstdint>
+#include <new>
 #include <optional>
 #include <stdexcept>
 #include <string>
@@ -25,6 +26,10 @@ inline constexpr std::array<std::string_view, 3> algorithmNames = {"max-log", "s
 using BlockSize = vardel_ip_quarzel_block_size;
 using Layout = vardel_ip_quarzel_layout;
 using Signal = vardel_ip_quarzel_signal;
+using Branch = vardel_ip_quarzel_branch;
+
+/// Encoder states of a constituent code.
+inline constexpr unsigned encoderStates = 8;
 
 namespace detail {
 
@@ -81,6 +86,27 @@ inline Layout layout(std::uint32_t K, std::uint32_t units) {
 /// The signals of a pass, in the order of a trace's columns and of the members of vardel_ip_quarzel_pass.
 inline std::vector<Signal> signals() {
     return detail::listOf<Signal>(vardel_ip_quarzel_get_signal);
+}
+
+/// The branch of the trellis that an information bit takes from an encoder state.
+/// @throws std::invalid_argument when there is none
+inline Branch branch(unsigned state, unsigned bit) {
+    Branch branch{};
+    if (vardel_ip_quarzel_get_branch(state, bit, &branch) != 0) {
+        throw std::invalid_argument("there is no branch of bit " + std::to_string(bit) + " from state " +
+                                    std::to_string(state));
+    }
+    return branch;
+}
+
+/// The corrections of the maxima of algorithm type 2, for the differences -2048 to 2047, all in units of 1/8.
+/// @throws std::bad_alloc when there is no memory
+inline std::array<unsigned char, 4096> corrections() {
+    std::array<unsigned char, 4096> table{};
+    if (vardel_ip_quarzel_get_corrections(table.data()) != 0) {
+        throw std::bad_alloc();
+    }
+    return table;
 }
 
 /// The implementations that this machine can run, best first; the last one is "literal".

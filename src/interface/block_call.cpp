@@ -125,6 +125,9 @@ Outcome decodeInLanes(vardel_ip_quarzel_state& state, const BlockCall& call) {
 }  // namespace
 
 Outcome decodeBlock(vardel_ip_quarzel_state& state, const BlockCall& call) {
+    if (state.decoder == nullptr) {  // a record that nobody has filled
+        return {unhandledException(state.messages), 0};
+    }
     try {
         if (call.positionStride == 1 && hasRoom(call, blockSize(call)) &&
             takesLanes(state, blockSize(call))) {

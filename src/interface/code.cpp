@@ -1,10 +1,19 @@
 // SPDX-License-Identifier: MIT
-// The facts of the code: block sizes, permutation, segments and windows, signals of a pass.
+// The facts of the code: block sizes, permutation, segments and windows, signals of a pass, trellis,
+// corrections.
 #include <algorithm>
 #include <array>
+#include <iterator>
+#include <memory>
+#include <vector>
 
 #include "decoder/decoder_3gpu.hpp"
 #include "decoder/segments.hpp"
+#include "engine/dump_columns.hpp"
+#include "engine/engine_mod_base.hpp"
+#include "engine/trellis.hpp"
+#include "fixed/number_format.hpp"
+#include "interface/wiring.hpp"
 #include "interleaver/interleaver_3gpplte.hpp"
 #include "interleaver/lte_params.hpp"
 #include "vardel_ip_quarzel.h"
@@ -72,4 +81,30 @@ int vardel_ip_quarzel_get_signal(int index, vardel_ip_quarzel_signal* signal) {
     }
     *signal = signals[static_cast<std::size_t>(index)];
     return 0;
+}
+
+int vardel_ip_quarzel_get_branch(unsigned int state, unsigned int bit, vardel_ip_quarzel_branch* branch) {
+    if (state >= quarzel::trellis::states || bit > 1) {
+        return 1;
+    }
+    const auto& links = quarzel::trellis::links;
+    const std::size_t target = bit == 1 ? links.plusTarget[state] : links.minusTarget[state];
+    const auto column = std::ranges::find(quarzel::branchColumns, links.branchMetric[state]);
+    *branch = {state, static_cast<unsigned>(target),
+               4 + static_cast<unsigned>(column - std::begin(quarzel::branchColumns))};
+    return 0;
+}
+
+int vardel_ip_quarzel_get_corrections(unsigned char* corrections) {
+    try {
+        const std::unique_ptr<TNumberFormat> format(TNumberFormat::create(quarzel::stateFormatProperties));
+        const std::vector<unsigned char> table =
+            TCalculationEngineModBase::createLUT(quarzel::correctionPoints, format.get());
+        for (std::size_t word = 0; word < table.size(); word += std::size_t{1} << format->shift) {
+            *corrections++ = static_cast<unsigned char>(table[word] >> format->shift);
+        }
+        return 0;
+    } catch (...) {
+        return 1;
+    }
 }

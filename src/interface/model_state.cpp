@@ -192,5 +192,7 @@ void vardel_ip_quarzel_destroy_state(vardel_ip_quarzel_state* state) {
 }
 
 void vardel_ip_quarzel_bitacc_dump_config(vardel_ip_quarzel_state* state, unsigned int count) {
-    state->decoder->setDump(count);
+    if (state->decoder != nullptr) {
+        state->decoder->setDump(count);
+    }
 }

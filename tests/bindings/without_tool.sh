@@ -32,4 +32,4 @@ for binding in "$build"/bindings/python/quarzel/_core.*.so "$build"/bindings/oct
         exit 1
     fi
 done
-ctest --test-dir "$build" --output-on-failure --no-tests=error -R '^(HostCore|Guarded|BindingsEncoding|Python|Octave|SystemVerilog)\.'
+ctest --test-dir "$build" --output-on-failure --no-tests=error -R '^(HostCore|Guarded|BindingsEncoding|Python|Octave|SystemVerilog|DpiLibrary|Vhdl)\.'

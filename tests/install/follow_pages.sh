@@ -54,6 +54,10 @@ for page in docs/python.md docs/octave.md docs/systemverilog.md; do
         follow "$empty" "$(blocks $page sh "The first block" | sed 's/-o first/& >build.log/')"
         sed -i '/Verilog \$finish$/d' "$empty/log" # the simulator's own line
         printed "$(blocks $page text "The first block")"
+        page=docs/vhdl.md
+        blocks $page vhdl "The first block" >"$empty/first.vhd"
+        follow "$empty" "$(blocks $page sh "The first block")"
+        printed "$(blocks $page text)"
         ;;
     esac
 done

@@ -43,43 +43,6 @@ TEST(Allocation, LiteralDecodesTakeTheTwoVectorsOfTheCallOnceTheLargestSizeWasSe
     }
 }
 
-// Wherever memory runs out, each block is decoded or gets status 99, nothing escapes, and the state is good
-// for the next batch.
-TEST(Allocation, MayFailAnywhereInABatch) {
-    const std::vector<std::size_t> batchSizes = {40, 1024, 40, 6144};
-    std::vector<Block> blocks;
-    std::vector<vardel_ip_quarzel_inputs> inputs;
-    std::vector<vardel_ip_quarzel_outputs> outputs;
-    std::vector<unsigned char> bits(4 * 6144);
-    for (const std::size_t K : batchSizes) {
-        blocks.emplace_back(K + 4, 8);
-    }
-    for (std::size_t i = 0; i < blocks.size(); ++i) {
-        inputs.push_back(blocks[i].inputs());
-        outputs.push_back({bits.data() + 6144 * i, 6144, 0, 0});
-    }
-    std::size_t allowed = 0;
-    int failures = 0;
-    for (int result = -1; result != 0; ++allowed) {
-        const State state = makeState();
-        std::vector<int> statuses(blocks.size(), -77);
-        const auto run = [&] {
-            return vardel_ip_quarzel_bitacc_simulate_batch(state.get(), outputs.data(), inputs.data(),
-                                                           static_cast<int>(inputs.size()), statuses.data());
-        };
-        failAllocationsAfter(allowed);
-        result = run();
-        allowAllocations();
-        for (const int status : statuses) {
-            ASSERT_TRUE(status == 0 || status == 99) << status << " after " << allowed << " allocations";
-        }
-        failures += result != 0 ? 1 : 0;
-        ASSERT_EQ(run(), 0) << "after " << allowed << " allocations";
-        ASSERT_LT(allowed, 1000U);
-    }
-    EXPECT_GT(failures, 10);
-}
-
 TEST(Allocation, ErrorLinesAreWrittenWhereThereIsNoMemoryAtAll) {
     const State state = makeState();
     const Block block(6144 + 4);
@@ -98,6 +61,34 @@ TEST(Allocation, ErrorLinesAreWrittenWhereThereIsNoMemoryAtAll) {
     EXPECT_EQ(output.err,
               "ERROR:decoder:Unhandled exception has occurred\n"
               "ERROR:decoder:Unhandled exception has occurred\n");
+}
+
+TEST(Allocation, ASaturatedValueIsToldOnceWhereverMemoryRunsOut) {
+    const Block block(1024 + 4, 500);
+    std::vector<unsigned char> bits(1024);
+    vardel_ip_quarzel_outputs outputs{bits.data(), 1024, 0, 0};
+    for (const bool literal : {false, true}) {
+        int failures = 0;
+        for (int status = -1; status != 0;) {
+            const State state = makeState();
+            if (literal) {
+                vardel_ip_quarzel_set_implementation(state.get(), "literal");
+            }
+            const Output output = capture([&] {
+                failAllocationsAfter(static_cast<std::size_t>(failures));
+                status = vardel_ip_quarzel_bitacc_simulate(state.get(), &outputs, block.inputs());
+                allowAllocations();
+                EXPECT_EQ(vardel_ip_quarzel_bitacc_simulate(state.get(), &outputs, block.inputs()), 0);
+            });
+            ASSERT_EQ(output.out,
+                      "WARNING:decoder:RSC1 systematic value in position 0 saturated positively, further "
+                      "saturation will not be reported\n")
+                << "literal " << literal << ", after " << failures << " allocations";
+            failures += status != 0 ? 1 : 0;
+            ASSERT_LT(failures, 1000);
+        }
+        EXPECT_GT(failures, 2);
+    }
 }
 
 TEST(Allocation, ATraceAskedForBeforeMemoryRanOutIsWrittenAfterIt) {

@@ -1,11 +1,14 @@
 // SPDX-License-Identifier: MIT
 #include <gtest/gtest.h>
 
+#include <cmath>
 #include <string>
 #include <vector>
 
 #include "decoder/segments.hpp"
 #include "decoder/trace_columns.hpp"
+#include "engine/dump_columns.hpp"
+#include "engine/trellis.hpp"
 #include "interleaver/closed_form.hpp"
 #include "interleaver/lte_params.hpp"
 #include "quarzel/code.hpp"
@@ -62,6 +65,33 @@ TEST(CodePort, GivesSegmentsAndWindowsAsTheDecoderCutsThem) {
     }
     EXPECT_THROW(layout(6144, 3), std::invalid_argument);
     EXPECT_THROW(layout(6143, 4), std::invalid_argument);
+}
+
+TEST(CodePort, GivesTheBranchesOfTheTrellisWithTheColumnsOfTheirMetrics) {
+    for (unsigned state = 0; state < encoderStates; ++state) {
+        const Branch one = branch(state, 1);
+        const Branch zero = branch(state, 0);
+        EXPECT_EQ(one.from, state);
+        EXPECT_EQ(one.to, trellis::links.plusTarget[state]);
+        EXPECT_EQ(zero.to, trellis::links.minusTarget[state]);
+        EXPECT_EQ(one.metric, zero.metric);
+        EXPECT_EQ(branchColumns[one.metric - 4], trellis::links.branchMetric[state]);
+    }
+    EXPECT_THROW(branch(8, 0), std::invalid_argument);
+    EXPECT_THROW(branch(0, 2), std::invalid_argument);
+}
+
+TEST(CodePort, GivesTheCorrectionsOfMaxStar) {
+    const auto table = corrections();
+    EXPECT_EQ(table[2048], 6) << "ln 2 in units of 1/8";
+    EXPECT_EQ(table[2047], table[2048]) << "-1 shares the entry of 0";
+    EXPECT_EQ(table[0], 0);
+    EXPECT_EQ(table[4095], 0);
+    for (std::size_t d = 0; d < 2048; ++d) {
+        EXPECT_EQ(table[2048 + d], table[2047 - d]);
+        const double point = static_cast<double>(d / 4) / 2;  // the low 2 bits of a difference do not count
+        EXPECT_NEAR(table[2048 + d], 8 * std::log1p(std::exp(-point)), 0.5) << d;
+    }
 }
 
 TEST(CodePort, NamesTheSignalsInTheOrderOfTheTraceColumns) {

@@ -138,6 +138,27 @@ TEST(State, DestroyingNothingDoesNothing) {
     EXPECT_EQ(output.out + output.err, "");
 }
 
+TEST(State, ADefaultStateRefusesToDecodeInEveryForm) {
+    const State state(create_default_state(genericsOf(2, 8, 1)));
+    const Block block(44);
+    std::vector<unsigned char> bits(40);
+    vardel_ip_quarzel_outputs outputs{bits.data(), 40, 0, 0};
+    const vardel_ip_quarzel_inputs inputs = block.inputs();
+    const vardel_ip_quarzel_array_inputs arrayInputs{
+        inputs.rsc1_sys, inputs.rsc1_par, inputs.rsc2_par, 44, 1, VARDEL_IP_QUARZEL_INT32, 44, 1, 2, nullptr};
+    const vardel_ip_quarzel_array_outputs arrayOutputs{bits.data(), 40, 0, nullptr};
+    const Output output = capture([&] {
+        vardel_ip_quarzel_bitacc_dump_config(state.get(), 1);
+        EXPECT_EQ(vardel_ip_quarzel_bitacc_simulate(state.get(), &outputs, inputs), 99);
+        EXPECT_EQ(vardel_ip_quarzel_bitacc_simulate_batch(state.get(), &outputs, &inputs, 1, nullptr), 99);
+        EXPECT_EQ(vardel_ip_quarzel_bitacc_simulate_array(state.get(), &arrayOutputs, &arrayInputs, nullptr),
+                  99);
+    });
+    const std::string line = "ERROR:decoder:Unhandled exception has occurred\n";
+    EXPECT_EQ(output.err, line + line + line);
+    EXPECT_EQ(output.out, "");
+}
+
 TEST(State, ADefaultStateHasNoComponentsAndCanBeDestroyed) {
     const State state(create_default_state(genericsOf(99, 32, 99)));
     ASSERT_NE(state, nullptr);

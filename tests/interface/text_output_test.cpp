@@ -84,10 +84,12 @@ TEST(TextOutput, AStreamInErrorWithAnExceptionMaskStillGetsTheText) {
     EXPECT_EQ(disturbed.err, plain.err + plain.err);
 }
 
-/// Counts the writes that reach a stream.
+/// Counts the writes that reach a stream, and flushes them or does not.
 struct CountingBuffer : std::streambuf {
     std::string text;
     int writes = 0;
+    int flushes = 0;
+    bool canFlush = true;
     std::streamsize xsputn(const char* written, std::streamsize size) override {
         ++writes;
         text.append(written, static_cast<std::size_t>(size));
@@ -97,6 +99,10 @@ struct CountingBuffer : std::streambuf {
         ++writes;
         text += static_cast<char>(c);
         return c;
+    }
+    int sync() override {
+        ++flushes;
+        return canFlush ? 0 : -1;
     }
 };
 
@@ -108,6 +114,17 @@ TEST(TextOutput, AMessageIsOneWrite) {
     EXPECT_EQ(state, nullptr);
     EXPECT_EQ(buffer.text, "ERROR:decoder:C_NUM_PU must be either 2, 4 or 8\n");
     EXPECT_EQ(buffer.writes, 1);
+}
+
+TEST(TextOutput, AMessageIsFlushedAndOneThatCannotBeIsLost) {
+    CountingBuffer buffer;
+    std::streambuf* before = std::cout.rdbuf(&buffer);
+    EXPECT_TRUE(standardStreams.warning({"text"}));
+    EXPECT_EQ(buffer.flushes, 1);
+    buffer.canFlush = false;
+    EXPECT_FALSE(standardStreams.warning({"text"}));
+    EXPECT_EQ(buffer.flushes, 2);
+    std::cout.rdbuf(before);
 }
 
 struct ThrowingBuffer : std::streambuf {

@@ -16,6 +16,7 @@
 namespace {
 
 using namespace quarzel::link;
+using quarzel::test::Against;
 using quarzel::test::Counts;
 using quarzel::test::deviation;
 
@@ -66,7 +67,7 @@ TEST(QuantisedChannel, DrawsTheExactDistribution) {
                 expected.at(static_cast<std::size_t>(soft + 128)) = probability * codeBits * blocks;
             }
             EXPECT_NEAR(total, 1, 1e-14);
-            EXPECT_LT(deviation(drawn(channel, codeBit, seed, blocks), expected, 1), 5)
+            EXPECT_LT(deviation(drawn(channel, codeBit, seed, blocks), expected, Against::mean), 5)
                 << channel.quantiser.scale << ' ' << codeBit;
         }
     }
@@ -86,7 +87,8 @@ TEST(QuantisedChannel, DrawsWhatAGaussianSourceAndARoundingQuantiserGive) {
             const double soft = std::clamp(std::round(units * received(random)), -128.0, 127.0);
             plain.at(static_cast<std::size_t>(soft + 128)) += 1;
         }
-        EXPECT_LT(deviation(drawn(channel, false, random(), blocks), plain, 2), 5) << channel.quantiser.scale;
+        EXPECT_LT(deviation(drawn(channel, false, random(), blocks), plain, Against::draw), 5)
+            << channel.quantiser.scale;
     }
 }
 

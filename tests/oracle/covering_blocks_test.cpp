@@ -1,10 +1,10 @@
 // SPDX-License-Identifier: MIT
-// The stored blocks find every fault of the catalogue that any block can find.
+// The covering blocks find every fault of the catalogue that any block can find.
 #include <gtest/gtest.h>
 
 #include <algorithm>
-#include <cstdlib>
 #include <fstream>
+#include <iterator>
 #include <sstream>
 #include <string>
 #include <utility>
@@ -19,54 +19,70 @@ namespace {
 
 using namespace oracle;
 
-/// The stored blocks of a core.
-std::vector<CoveringBlock> storedBlocks(int units, int type) {
-    std::ifstream file(QUARZEL_COVERING_BLOCKS);
-    std::string line;
-    std::getline(file, line);
-    EXPECT_EQ(line, coveringColumns);
-    std::vector<CoveringBlock> blocks;
-    while (std::getline(file, line)) {
-        std::istringstream cells(line);
-        std::string cell;
-        const auto next = [&]() -> const std::string& {
-            std::getline(cells, cell, ',');
-            return cell;
-        };
-        const auto number = [&] { return std::atoi(next().c_str()); };
-        const bool wanted = std::pair{number(), number()} == std::pair(units, type);
-        CoveringBlock block;
-        block.K = number();
-        block.iterations = number();
-        const auto name = std::find(tool::stimulusNames.begin(), tool::stimulusNames.end(), next());
-        block.stimulus = static_cast<tool::Stimulus>(name - tool::stimulusNames.begin());
-        block.decibels = number();
-        block.number = static_cast<unsigned>(number());
-        block.tag = static_cast<unsigned>(number());
-        EXPECT_EQ(rowOf(block, units, type) == line, wanted) << line;
-        if (wanted) {
-            blocks.push_back(block);
-        }
+/// A table of the tool without the rows of other cores.
+std::string rowsOf(const std::string& file, int units, int type) {
+    std::ifstream table(file);
+    std::string row;
+    std::string rows;
+    std::getline(table, row);
+    const std::string core = std::to_string(units) + ',' + std::to_string(type) + ',';
+    while (std::getline(table, row)) {
+        rows += row.compare(0, core.size(), core) == 0 ? row + '\n' : "";
     }
-    return blocks;
+    return rows;
 }
 
 class CoveringBlocks : public testing::TestWithParam<std::pair<int, int>> {};
 
-TEST_P(CoveringBlocks, FindEveryFaultThatIsNotEquivalent) {
+TEST_P(CoveringBlocks, AreThoseOfTheTable) {
+    const auto [units, type] = GetParam();
+    std::string rows;
+    for (const tool::CoveringBlock& block : tool::coveringBlocks(units, type)) {
+        rows += rowOf(block, units, type) + '\n';
+    }
+    EXPECT_NE(rows, "");
+    EXPECT_EQ(rows, rowsOf(QUARZEL_COVERING_BLOCKS, units, type));
+}
+
+TEST_P(CoveringBlocks, FindWhatTheirScoreSays) {
     const auto [units, type] = GetParam();
     if (!exhaustive() && units != 2) {
         GTEST_SKIP() << "QUARZEL_TEST_EXHAUSTIVE is not set";
     }
-    FaultFinder finder(units, type);
+    const FaultFinder finder(units, type);
+    const std::vector<tool::CoveringBlock> blocks = tool::coveringBlocks(units, type);
     std::vector<Subject> subjects = finder.subjectsOf(catalogue());
-    const std::vector<CoveringBlock> blocks = storedBlocks(units, type);
-    for (std::size_t i = 0; i < blocks.size(); ++i) {
-        finder.tryOn(blocks[i], i, subjects, 1);
-    }
+    finder.runSet(blocks, subjects);
+    const tool::CoveringScore score = tool::coveringScore(units, type);
     for (const Subject& subject : subjects) {
         EXPECT_EQ(subject.finders.empty(), isEquivalent(subject.fault, type)) << subject.fault.name;
     }
+    EXPECT_EQ(score.found, score.of);
+    EXPECT_EQ(score.of + score.equivalent, subjects.size());
+    std::vector<Subject> heldOut = finder.subjectsOf(heldOutFaults());
+    finder.runSet(blocks, heldOut);
+    const auto found = std::count_if(heldOut.begin(), heldOut.end(),
+                                     [](const Subject& subject) { return !subject.finders.empty(); });
+    EXPECT_EQ(score.heldOutFound, found);
+    EXPECT_EQ(score.heldOutOf, heldOut.size());
+}
+
+/// The page has a line for each core.
+TEST_P(CoveringBlocks, HaveTheirScoreInThePage) {
+    const auto [units, type] = GetParam();
+    const tool::CoveringScore score = tool::coveringScore(units, type);
+    std::uint32_t bits = 0;
+    const std::vector<tool::CoveringBlock> blocks = tool::coveringBlocks(units, type);
+    for (const tool::CoveringBlock& block : blocks) {
+        bits += block.planned.blockSize;
+    }
+    std::ostringstream line;
+    line << "\n| " << units << " | " << type << " | " << blocks.size() << " | " << bits << " | "
+         << score.found << " of " << score.of << " | " << score.equivalent << " | " << score.heldOutFound
+         << " of " << score.heldOutOf << " |\n";
+    std::ifstream page(QUARZEL_VECTORS_PAGE);
+    const std::string text(std::istreambuf_iterator<char>(page), {});
+    EXPECT_NE(text.find(line.str()), std::string::npos) << line.str();
 }
 
 INSTANTIATE_TEST_SUITE_P(Cores, CoveringBlocks,

@@ -6,12 +6,12 @@ namespace {
 
 /// Some faults need the block twice.
 bool finds(const Design& faulty, bool twice, const Answer& expected, const Streams& streams,
-           const CoveringBlock& block) {
+           const tool::CoveringBlock& block) {
     PlainDecoder decoder(faulty);
     if (twice) {
-        decoder.decode(streams, block.iterations, block.tag ^ 255U);
+        decoder.decode(streams, block.planned.iterations, block.tag ^ 255U);
     }
-    return decoder.decode(streams, block.iterations, block.tag) != expected;
+    return decoder.decode(streams, block.planned.iterations, block.tag) != expected;
 }
 
 }  // namespace
@@ -27,15 +27,33 @@ std::vector<Subject> FaultFinder::subjectsOf(std::span<const Fault> faults) cons
     return subjects;
 }
 
-void FaultFinder::tryOn(const CoveringBlock& block, std::size_t number, std::vector<Subject>& subjects,
-                        std::size_t enough) {
-    const Streams streams = itsSource.make(block, itsUnits);
+void FaultFinder::tryOn(const tool::CoveringBlock& block, std::size_t number, std::vector<Subject>& subjects,
+                        std::size_t enough) const {
+    const Streams streams = streamsOf(block, itsUnits);
     const Answer expected =
-        PlainDecoder(soundDesign(itsUnits, itsType)).decode(streams, block.iterations, block.tag);
+        PlainDecoder(soundDesign(itsUnits, itsType)).decode(streams, block.planned.iterations, block.tag);
     for (Subject& subject : subjects) {
         if (subject.finders.size() < enough &&
             finds(subject.design, subject.fault.twice, expected, streams, block)) {
             subject.finders.push_back(number);
+        }
+    }
+}
+
+void FaultFinder::runSet(std::span<const tool::CoveringBlock> blocks, std::vector<Subject>& subjects) const {
+    PlainDecoder sound(soundDesign(itsUnits, itsType));
+    std::vector<Streams> streams;
+    std::vector<Answer> expected;
+    for (const tool::CoveringBlock& block : blocks) {
+        streams.push_back(streamsOf(block, itsUnits));
+        expected.push_back(sound.decode(streams.back(), block.planned.iterations, block.tag));
+    }
+    for (Subject& subject : subjects) {
+        PlainDecoder faulty(subject.design);
+        for (std::size_t i = 0; i < blocks.size() && subject.finders.empty(); ++i) {
+            if (faulty.decode(streams[i], blocks[i].planned.iterations, blocks[i].tag) != expected[i]) {
+                subject.finders.push_back(i);
+            }
         }
     }
 }

@@ -4,7 +4,7 @@
 #include <span>
 #include <vector>
 
-#include "oracle/covering_block.hpp"
+#include "oracle/candidate_block.hpp"
 #include "oracle/fault.hpp"
 
 namespace quarzel::oracle {
@@ -24,13 +24,15 @@ class FaultFinder {
     /// The faults that a core of this type can have.
     std::vector<Subject> subjectsOf(std::span<const Fault> faults) const;
 
-    /// Note the block with those that it finds, and that fewer than `enough` have found before.
-    void tryOn(const CoveringBlock& block, std::size_t number, std::vector<Subject>& subjects,
-               std::size_t enough);
+    /// Note the block with those that it finds by itself, and that fewer than `enough` have found before.
+    void tryOn(const tool::CoveringBlock& block, std::size_t number, std::vector<Subject>& subjects,
+               std::size_t enough) const;
+
+    /// Note with each subject the first block that finds it when a core runs all of them in their order.
+    void runSet(std::span<const tool::CoveringBlock> blocks, std::vector<Subject>& subjects) const;
 
   private:
     int itsUnits, itsType;
-    CoveringSource itsSource;
 };
 
 }  // namespace quarzel::oracle

@@ -3,4 +3,4 @@
 # Every source is as clang-format leaves it: format.sh SOURCE
 set -euo pipefail
 cd "$1"
-find include src link sweep tools bindings tests bench examples -name '*.[ch]' -o -name '*.[ch]pp' | xargs clang-format --dry-run -Werror
+find include src link sweep tools bindings tests fuzz bench examples -name '*.[ch]' -o -name '*.[ch]pp' | xargs clang-format --dry-run -Werror

@@ -1,11 +1,13 @@
 // SPDX-License-Identifier: MIT
 #include <gtest/gtest.h>
 
+#include <algorithm>
 #include <cstdlib>
 
 #include "sweep/result.hpp"
 #include "sweeps.hpp"
 #include "tool/run_tool.hpp"
+#include "tool/temporary_directory.hpp"
 
 namespace quarzel::test {
 
@@ -70,6 +72,22 @@ TEST(Mpi, GivesTheSameResultWithThreadsInRanks) {
     std::vector<std::string> arguments = quickSweep;
     arguments.insert(arguments.end(), {"--threads", "2"});
     EXPECT_EQ(runMpi("3", arguments).out, sweep::resultText(resultOf(smallSweep())));
+}
+
+TEST(Mpi, KeepsTheSameFailures) {
+    const TemporaryDirectory directory;
+    std::vector<std::string> arguments = quickSweep;
+    arguments.insert(arguments.end(), {"--keep-failures", "2", "-o"});
+    const auto listOf = [&](const std::string& name, bool isMpi) {
+        std::vector<std::string> all = arguments;
+        all.push_back(directory.path(name));
+        EXPECT_EQ((isMpi ? runMpi("3", all) : runTool(all)).exitCode, 0);
+        return readFile(directory.path(name + ".failures/failures.csv"));
+    };
+    const std::string list = listOf("threads.json", false);
+    EXPECT_GT(std::count(list.begin(), list.end(), '\n'), 10);
+    EXPECT_EQ(listOf("ranks.json", true), list);
+    EXPECT_EQ(listOf("ranks.json", true), list) << "looked for again";
 }
 
 TEST(Mpi, TellsAnErrorOnce) {

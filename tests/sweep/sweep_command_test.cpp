@@ -377,6 +377,27 @@ TEST(VerifyResult, FindsAResultThatComesOutOtherwise) {
     EXPECT_EQ(run.exitCode, 1);
 }
 
+TEST(VerifyResult, TellsTheSameInJson) {
+    const TemporaryDirectory directory;
+    const std::string older = QUARZEL_SWEEP_DATA "/small_sweep.json";
+    EXPECT_EQ(runTool({"verify-result", older, "--json"}).out,
+              "{\"result\":\"" + older +
+                  "\",\"same\":true,\"byte_for_byte\":false,\"points\":12,\"blocks\":2731,"
+                  "\"difference\":null}\n");
+    sweep::Result result = resultOf(smallSweep());
+    const std::string same = directory.write("same.json", sweep::resultText(result));
+    EXPECT_THAT(runTool({"--json", "verify-result", same}).out,
+                testing::HasSubstr("\"same\":true,\"byte_for_byte\":true,"));
+    pointAt(result, 1).counts[0].bitErrors += 1;
+    const std::string other = directory.write("other.json", sweep::resultText(result));
+    const ToolRun run = runTool({"verify-result", other, "--json"});
+    EXPECT_THAT(run.out, testing::HasSubstr("\"same\":false,\"byte_for_byte\":false,"));
+    EXPECT_THAT(run.out,
+                testing::HasSubstr("\"difference\":\"K 40, 2 units, algorithm 0, 3 iterations, llr 4, "
+                                   "1.5 dB: "));
+    EXPECT_EQ(run.exitCode, 1);
+}
+
 TEST(VerifyResult, RepeatsPointsThatTimeHasEnded) {
     const TemporaryDirectory directory;
     const std::string file = directory.path("result.json");

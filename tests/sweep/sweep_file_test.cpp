@@ -86,10 +86,8 @@ TEST(SweepFile, OfAPartInVersion1IsRefused) {
 
 TEST(SweepFile, IsRefusedWhereverItIsCut) {
     const std::string& text = smallResultText();
-    std::mt19937 random = seededRandom();
-    for (int round = 0; round < 100; ++round) {
-        const std::string cut = text.substr(0, random() % (text.size() - 2));
-        EXPECT_THROW(sweep::readResult(cut), sweep::Error) << cut.size();
+    for (std::size_t length = 0; length < text.size(); ++length) {
+        EXPECT_THROW(sweep::readResult(text.substr(0, length)), sweep::Error) << length;
     }
     EXPECT_EQ(complaintOf([&] { sweep::readResult(text.substr(0, text.size() / 2)); }),
               "is truncated or altered: it is not a whole JSON object; use another copy of it");

@@ -82,7 +82,7 @@ const std::vector<BadCapture> badCaptures = {
     {"OrderIsNoTruthValue", "a.npy", rawNpy(npyHeader("|i1", "(1, 3, 44)", "Maybe")), notUnderstood},
     {"TypeNotClosed", "a.npy", rawNpy("{'descr': '|i1"), notUnderstood},
     {"StructuredType", "a.npy", rawNpy("{'descr': [('a', '<i2')], 'fortran_order': False, 'shape': (1,)}\n"),
-     notUnderstood},
+     "holds values of type 'record'" + types},
     {"NegativeShape", "a.npy", npy("|i1", "(-1, 3, 44)"), notUnderstood},
     {"ShapeBeyond64Bits", "a.npy", npy("|i1", "(99999999999999999999, 3, 44)"), notUnderstood},
     {"ShapeWithoutComma", "a.npy", npy("|i1", "(1 3 44)"), notUnderstood},
@@ -115,10 +115,10 @@ const std::vector<BadCapture> badCaptures = {
      "blocks of 6212 positions fit no block size; the nearest that do: 6148 (K = 6144)"},
     {"HugeSize", "a.npy", npy("<i4", "(1, 3, 18446744073709551615)"),
      "blocks of 18446744073709551615 positions fit no block size; the nearest that do: 6148 (K = 6144)"},
-    {"NoData", "a.npy", npy("|i1", "(1, 3, 44)"), "ends within block 1 of 1" + cutShort},
+    {"NoData", "a.npy", npy("|i1", "(1, 3, 44)"), "ends within block 0 of 0 to 0" + cutShort},
     {"HugeNumberOfBlocks", "a.npy", npy("<i4", "(18446744073709551615, 3, 6148)", 100),
-     "ends within block 1 of 18446744073709551615" + cutShort},
-    {"OneByteShort", "a.npy", npy("<i2", "(3, 3, 44)", 791), "ends within block 3 of 3" + cutShort},
+     "ends within block 0 of 0 to 18446744073709551614" + cutShort},
+    {"OneByteShort", "a.npy", npy("<i2", "(3, 3, 44)", 791), "ends within block 2 of 0 to 2" + cutShort},
     {"OneByteLong", "a.npy", npy("<i2", "(3, 3, 44)", 793),
      "goes on after the end of its array; save one array a file"},
     {"EmptyText", "a.csv", "", noFormat},
@@ -152,7 +152,8 @@ const std::vector<BadCapture> badCaptures = {
     {"SecondBlockShort", "a.csv", csvLines(87, 44),
      "line 47: blocks of 43 positions fit no block size; the nearest that do: 44 (K = 40)"},
     {"SecondBlockOfOtherSize", "a.csv", csvLines(44, 44) + '\n' + csvLines(52, 52).substr(27),
-     "line 47: block 2 has 52 positions, the blocks before have 44; give blocks of one size a file"},
+     "line 47: block 1, counted from 0, has 52 positions, the blocks before have 44; give blocks of one size "
+     "a file"},
 };
 
 class BadCaptureTest : public testing::TestWithParam<BadCapture> {};
@@ -178,11 +179,12 @@ TEST(BadCapture, IsOneOfRealNumbersThatAreNone) {
     EXPECT_EQ(refusal("a.npy", npy("|i1", "(1, 3, 44)", 132)),
               "quarzel: error: a.npy: holds values of type '|i1'" + ready);
     const std::string header = npyHeader("<f4", "(2, 3, 44)");
-    EXPECT_EQ(refusal("a.npy", rawNpy(header, std::string(528, '\1') + std::string(528, '\xff'))),
-              "quarzel: error: a.npy: block 2 of 2 has values that are not a number (NaN); give 0 for a bit "
-              "that is unknown\n");
+    EXPECT_EQ(
+        refusal("a.npy", rawNpy(header, std::string(528, '\1') + std::string(528, '\xff'))),
+        "quarzel: error: a.npy: block 1 of 0 to 1 has values that are not a number (NaN); give 0 for a bit "
+        "that is unknown\n");
     EXPECT_EQ(refusal("a.npy", rawNpy(header, std::string(1000, '\1'))),
-              "quarzel: error: a.npy: ends within block 2 of 2" + cutShort + '\n');
+              "quarzel: error: a.npy: ends within block 1 of 0 to 1" + cutShort + '\n');
     for (const std::string field : {"nan", "1.5x", "1e999", ""}) {
         EXPECT_EQ(refusal("a.csv", withLine(3, "1," + field + ",-0.5")),
                   "quarzel: error: a.csv: line 3: parity1 is '" + field +

@@ -92,12 +92,14 @@ TEST_F(CompareCommand, NamesTheFirstBlockAndBitThatDifferAndCounts) {
     const ToolRun run = compare(wrong);
     EXPECT_EQ(run.out, reportOf("sim.hex") +
                            "result        the decisions differ\n"
-                           "block         2 of 2 (K = 40)\n"
+                           "block         1 of 0 to 1 (K = 40)\n"
                            "bit           7 of 0 to 39\n"
                            "expected bit  0\n"
                            "actual bit    1, address @2f, line 48\n"
-                           "blocks        1 of 2 differ\n"
-                           "bits          3 of 80 differ: 1 wrong, 1 undefined (x), 1 undriven (z)\n");
+                           "blocks        1 of 2 differ: 1\n"
+                           "bits          3 of 80 differ: 1 wrong, 1 undefined (x), 1 undriven (z)\n"
+                           "by K          40: 1 of 2\n"
+                           "by place      0 2 0 0 1 0 0 0 bits in the eighths of a block\n");
     EXPECT_EQ(run.err, "");
     EXPECT_EQ(run.exitCode, 1);
 }
@@ -124,12 +126,14 @@ TEST_F(CompareCommand, CountsDecisionsThatAreMissing) {
     const ToolRun run = compare(fewer);
     EXPECT_EQ(run.out, reportOf("sim.hex") +
                            "result        the decisions differ\n"
-                           "block         1 of 2 (K = 40)\n"
+                           "block         0 of 0 to 1 (K = 40)\n"
                            "bit           38 of 0 to 39\n"
                            "expected bit  0\n"
                            "actual bit    missing, address @26\n"
-                           "blocks        2 of 2 differ\n"
-                           "bits          42 of 80 differ: 42 missing\n");
+                           "blocks        2 of 2 differ: 0, 1\n"
+                           "bits          42 of 80 differ: 42 missing\n"
+                           "by K          40: 2 of 2\n"
+                           "by place      5 5 5 5 5 5 5 7 bits in the eighths of a block\n");
     EXPECT_EQ(run.exitCode, 1);
 }
 
@@ -154,7 +158,7 @@ TEST_F(CompareCommand, TellsTheSameInJson) {
     EXPECT_EQ(object.at("equal"), false);
     EXPECT_EQ(object.at("bits_differing"), 1);
     EXPECT_EQ(object.at("undefined"), 1);
-    EXPECT_EQ(object.at("first"), nlohmann::json::parse(R"({"block": 2, "block_size": 40, "about": null,
+    EXPECT_EQ(object.at("first"), nlohmann::json::parse(R"({"block": 1, "block_size": 40, "about": null,
         "bit": 7, "value_expected": 0, "value_actual": "x", "address": 47, "line": 48,
         "trace_command": null})"));
     EXPECT_EQ(nlohmann::json::parse(compare(words(), {"--json"}).out).at("first"), nullptr);

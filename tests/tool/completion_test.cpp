@@ -116,7 +116,7 @@ TEST_F(BashCompletion, OffersTheOptionsOfTheHelpForEveryCommand) {
 TEST_F(BashCompletion, OffersTheValuesOfAnOption) {
     EXPECT_THAT(offers({"decode", "--units", ""}), ElementsAre("2", "4", "8"));
     EXPECT_THAT(offers({"decode", "--trace-format", "=", "j"}), ElementsAre("json"));
-    EXPECT_THAT(offers({"decode", "--trace-format", "="}), ElementsAre("csv", "json", "text"));
+    EXPECT_THAT(offers({"decode", "--trace-format", "="}), ElementsAre("csv", "json", "text", "vcd"));
     EXPECT_THAT(offers({"completion", ""}), ElementsAre("bash", "fish", "zsh"));
     EXPECT_THAT(offers({"decode", "--iterations", ""}), IsEmpty()) << "a number is the user's";
 }

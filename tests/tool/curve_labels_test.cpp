@@ -14,7 +14,8 @@ using tool::labelsOf;
 using tool::SweepCurve;
 
 SweepCurve curve(std::uint32_t K, int algorithm, int iterations = 8) {
-    return {"runs/a.json", K, 2, algorithm, iterations, "LLR \u00d7 8", "", 7, 1.0 / 3, {}};
+    return {"runs/a.json", false, K, 2, algorithm, iterations, {link::Quantiser::Kind::llr, 8}, "", 7,
+            1.0 / 3,       {}};
 }
 
 }  // namespace
@@ -31,6 +32,13 @@ TEST(CurveLabels, HaveAllInTheTitleForASingleCurve) {
     const CurveLabels labels = labelsOf({curve(40, 0)});
     EXPECT_EQ(labels.title, "K = 40, 2 units, max-log, 8 iterations, LLR \u00d7 8");
     EXPECT_THAT(labels.labels, ElementsAre("quarzel"));
+}
+
+TEST(CurveLabels, TellTransportBlocksFromCodeBlocks) {
+    SweepCurve transport = curve(40, 0);
+    transport.isTransportBlock = true;
+    transport.sending = "132 coded bits";
+    EXPECT_THAT(labelsOf({curve(40, 0), transport}).labels, ElementsAre("K = 40", "A = 40, 132 coded bits"));
 }
 
 TEST(CurveLabels, TellSeedOrFileWhereNothingElseDiffers) {

@@ -75,7 +75,8 @@ TEST(DecodeCommand, CountsTheErrorsOfALargeBlockCapture) {
                                           "time          T s\n"
                                           "speed         S Mbit/s\n"
                                           "bit errors    2 (BER 1.36e-05)\n"
-                                          "block errors  2 (BLER 8.33e-02)\n"));
+                                          "block errors  2 (BLER 8.33e-02)\n"
+                                          "wrong blocks  20, 22, counted from 0\n"));
     EXPECT_EQ(run.err, "");
     EXPECT_EQ(run.exitCode, 0);
 }
@@ -90,7 +91,8 @@ TEST(DecodeCommand, CountsTheErrorsOfASmallBlockCapture) {
                                           "time          T s\n"
                                           "speed         S Mbit/s\n"
                                           "bit errors    39 (BER 2.44e-03)\n"
-                                          "block errors  6 (BLER 1.50e-02)\n"));
+                                          "block errors  6 (BLER 1.50e-02)\n"
+                                          "wrong blocks  28, 90, 99, 155, 290, 334, counted from 0\n"));
     EXPECT_EQ(run.err, "");
     EXPECT_EQ(run.exitCode, 0);
 }
@@ -120,7 +122,13 @@ TEST(DecodeCommand, PrintsOneJsonObjectWithStableKeys) {
     EXPECT_EQ(maskTimes(run.out),
               jsonFor(shipped("k40.soft.npy"),
                       ",\"bit_errors\":39,\"block_errors\":6,\"bit_error_rate\":0.0024375,"
-                      "\"block_error_rate\":0.015"));
+                      "\"block_error_rate\":0.015,\"wrong_blocks\":["
+                      "{\"block\":28,\"bit_errors\":11,\"first_bit\":6},"
+                      "{\"block\":90,\"bit_errors\":9,\"first_bit\":14},"
+                      "{\"block\":99,\"bit_errors\":3,\"first_bit\":19},"
+                      "{\"block\":155,\"bit_errors\":6,\"first_bit\":4},"
+                      "{\"block\":290,\"bit_errors\":8,\"first_bit\":16},"
+                      "{\"block\":334,\"bit_errors\":2,\"first_bit\":28}]"));
     EXPECT_EQ(run.err, "");
     EXPECT_EQ(run.exitCode, 0);
 }

@@ -40,12 +40,12 @@ TEST(Failure, DoesNotComeFromTheStandInUnasked) {
 
 TEST(Failure, NamesTheBlockThatTheDecoderRefused) {
     const TemporaryDirectory directory;
-    expectFailure(runWithSecondBlock(2, directory), refused(directory, "2 of 3", 2), directory);
+    expectFailure(runWithSecondBlock(2, directory), refused(directory, "1 of 0 to 2", 2), directory);
 }
 
 TEST(Failure, NamesTheBlockAtWhichTheDecoderBroke) {
     const TemporaryDirectory directory;
-    expectFailure(runWithSecondBlock(99, directory), refused(directory, "2 of 3", 99), directory);
+    expectFailure(runWithSecondBlock(99, directory), refused(directory, "1 of 0 to 2", 99), directory);
 }
 
 // The second block fails at once, while another thread is still busy with the first, which fails after it.
@@ -59,7 +59,7 @@ TEST(Failure, NamesTheFirstBlockThatFailedWhicheverThreadWasQuicker) {
     for (const char* threads : {"1", "2", "8"}) {
         expectFailure(runTool({"decode", directory.path("capture.npy"), "--threads", threads},
                               {.program = QUARZEL_TOOL_ON_STAND_IN}),
-                      refused(directory, "2 of 64", 3), directory);
+                      refused(directory, "1 of 0 to 63", 3), directory);
     }
 }
 

@@ -39,6 +39,9 @@ TEST(Help, TeachesTraceDiff) {
 TEST(Help, TeachesCompare) {
     expectHelp({"compare", "--help"}, "compare_help.txt");
 }
+TEST(Help, TeachesCoverage) {
+    expectHelp({"coverage", "--help"}, "coverage_help.txt");
+}
 TEST(Help, TeachesVectors) {
     expectHelp({"vectors", "--help"}, "vectors_help.txt");
 }
@@ -54,6 +57,9 @@ TEST(Help, TeachesCompletion) {
 
 TEST(Help, TeachesHelp) {
     expectHelp({"help", "--help"}, "help_help.txt");
+}
+TEST(Help, TeachesRebuild) {
+    expectHelp({"rebuild", "--help"}, "rebuild_help.txt");
 }
 TEST(Help, TeachesSweep) {
     expectHelp({"sweep", "--help"}, "sweep_help.txt");

@@ -72,8 +72,8 @@ TEST(HostileFile, OfAVectorSetMayBeNestedDeeply) {
                     R"({"format":"quarzel test vectors","version":)" + deepValue() + '}');
     expectOneLine(runTool({"compare", set, "x"}),
                   set +
-                      "/manifest.json: is not a well-formed manifest; make the set again with "
-                      "'quarzel vectors'");
+                      "/manifest.json: is truncated or altered: it is not a whole JSON object; make the set "
+                      "again with 'quarzel vectors'");
     expectOneLine(runTool({"vectors", set, "--replace"}),
                   set + ": is not empty and no vector set; give another name");
 }

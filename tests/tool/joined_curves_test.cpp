@@ -21,7 +21,7 @@ MeasuredPoint point(double ebN0, std::uint64_t blocks, std::uint64_t errors) {
 }
 
 SweepCurve curve(std::uint64_t seed, const std::vector<MeasuredPoint>& points) {
-    return {"a.json", 40, 2, 1, 8, "LLR \u00d7 4", "", seed, 1.0 / 3, points};
+    return {"a.json", false, 40, 2, 1, 8, {}, "", seed, 1.0 / 3, points};
 }
 
 std::vector<std::pair<double, std::uint64_t>> blocksOf(const SweepCurve& curve) {

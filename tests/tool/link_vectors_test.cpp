@@ -136,9 +136,10 @@ TEST_F(LinkVectors, AreWhatCompareExpects) {
     itsDirectory.write("simulated.hex", decisions);
     const ToolRun run = runTool({"compare", core, simulated});
     EXPECT_EQ(run.exitCode, 1);
-    EXPECT_NE(run.out.find("block         2 of 2 (K = 40, 6 iterations, transport block 1, transmission 2, "
-                           "code block 1)\n"),
-              std::string::npos)
+    EXPECT_NE(
+        run.out.find("block         1 of 0 to 1 (K = 40, 6 iterations, transport block 0, transmission 1, "
+                     "code block 0)\n"),
+        std::string::npos)
         << run.out;
 }
 
@@ -179,7 +180,8 @@ TEST_F(LinkVectors, AreRefusedForOptionsThatDoNotGoTogether) {
                   "--block-size: names several values; the link of a set has one; make a set for each");
     expectRefused({"--harq", "2", "--stimulus", "ties"},
                   "--stimulus: does not go with --harq: the blocks of a link are noise; leave it out");
-    expectRefused({"--cover", "--rv", "2"}, "--rv: does not go with --cover, which takes all; leave it out");
+    expectRefused({"--cover-sizes", "--rv", "2"},
+                  "--rv: does not go with --cover-sizes, which takes all; leave it out");
 }
 
 }  // namespace quarzel::test

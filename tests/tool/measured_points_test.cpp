@@ -16,7 +16,7 @@ tool::MeasuredPoint point(double ebN0, sweep::ErrorCount count) {
 }
 
 tool::SweepCurve curve(const std::vector<tool::MeasuredPoint>& points) {
-    return {"a.json", 1024, 2, 1, 8, "LLR \u00d7 4", "", 7, 1.0 / 3, points};
+    return {"a.json", false, 1024, 2, 1, 8, {}, "", 7, 1.0 / 3, points};
 }
 
 }  // namespace

@@ -1,4 +1,5 @@
 // SPDX-License-Identifier: MIT
+#include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
 #include <cstdlib>
@@ -29,6 +30,44 @@ TEST_F(PlotCommand, NamesTheCurvesInALegend) {
     ASSERT_EQ(plot({"-o", itsSvg, "--algorithm", "1", "--title", "Mine"}).exitCode, 0);
     EXPECT_NE(readFile(itsSvg).find(">Mine<"), std::string::npos);
     EXPECT_EQ(readFile(itsSvg).find(">max-log<"), std::string::npos);
+}
+
+TEST_F(PlotCommand, TellsWhatItDrawsInJson) {
+    const std::string reference = itsDirectory.write("bound.csv", "ebn0_db,bler\n0.5,0.2\n1,0.1\n");
+    const ToolRun run = plot({"-o", itsSvg, "--reference", "theirs=" + reference, "--json"});
+    EXPECT_EQ(run.out, "{\"picture\":\"" + itsSvg +
+                           "\",\"csv\":null,\"title\":\"K = 40, 2 units, 2 iterations, LLR \u00d7 4\","
+                           "\"panels\":[\"ber\",\"bler\"],\"curves\":["
+                           "{\"label\":\"max-log\",\"kind\":\"measured\"},"
+                           "{\"label\":\"scaled max-log\",\"kind\":\"measured\"},"
+                           "{\"label\":\"theirs\",\"kind\":\"reference\"}]}\n");
+    EXPECT_EQ(run.err, "");
+    EXPECT_EQ(run.exitCode, 0);
+}
+
+TEST_F(PlotCommand, DrawsTheFactorsThatAreAskedFor) {
+    sweep::Result result;
+    for (const link::Quantiser quantiser : {link::Quantiser{link::Quantiser::Kind::llr, 4},
+                                            {link::Quantiser::Kind::llr, 2.5},
+                                            {link::Quantiser::Kind::amplitude, 4}}) {
+        sweep::PointState& point =
+            result.points.emplace(sweep::Setup{40, 2, 0, 2, quantiser, {}, {0}}, 1).first->second;
+        point.blocks = 10;
+        point.counts.back() = {20, 5};
+        point.stoppedBy = sweep::StopReason::blocks;
+    }
+    itsDirectory.write("result.json", sweep::resultText(result));
+    EXPECT_THAT(plot({"-o", itsSvg, "--json"}).out, testing::HasSubstr("amplitude \u00d7 4"));
+    EXPECT_THAT(plot({"-o", itsSvg, "--json", "--llr", "4"}).out,
+                testing::HasSubstr("\"title\":\"K = 40, 2 units, max-log, 2 iterations, LLR \u00d7 4\","
+                                   "\"panels\":[\"ber\",\"bler\"],\"curves\":["
+                                   "{\"label\":\"quarzel\",\"kind\":\"measured\"}]"));
+    EXPECT_THAT(plot({"-o", itsSvg, "--json", "--llr", "2.5,4"}).out,
+                testing::HasSubstr("\"curves\":[{\"label\":\"LLR \u00d7 2.5\",\"kind\":\"measured\"},"
+                                   "{\"label\":\"LLR \u00d7 4\",\"kind\":\"measured\"}]"));
+    EXPECT_EQ(
+        plot({"-o", itsSvg, "--llr", "0"}).err,
+        "quarzel: error: --llr: '0' is not a number above 0 and up to 1000000; see 'quarzel plot --help'\n");
 }
 
 TEST_F(PlotCommand, DrawsTheIterationsOfOneCurve) {
@@ -75,7 +114,8 @@ TEST_F(PlotCommand, DoesNotMixTheIterationsOfSeveralCurves) {
     itsDirectory.write("result.json", twoCurves(true));
     expectRefused(
         plot({"-o", itsSvg, "--per-iteration"}),
-        "--per-iteration: there are 2 curves; choose one with --block-size, --units and --algorithm", 2);
+        "--per-iteration: there are 2 curves; choose one with --block-size, --units, --algorithm and --llr",
+        2);
 }
 
 TEST_F(PlotCommand, RefusesIterationsThatWereNotCounted) {
@@ -103,8 +143,8 @@ TEST_F(PlotCommand, RefusesAnOutputThatCannotBe) {
                   3);
     expectRefused(
         plot({"-o", itsSvg, "--units", "8"}),
-        "the results have no curve that was asked for; leave out --block-size, --units, --algorithm "
-        "and --iterations",
+        "the results have no curve that was asked for; leave out --block-size, --units, --algorithm, "
+        "--llr and --iterations",
         2);
 }
 

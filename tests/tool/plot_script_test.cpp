@@ -18,7 +18,7 @@ tool::MeasuredPoint point(double ebN0, sweep::ErrorCount first, sweep::ErrorCoun
 }
 
 tool::SweepCurve curve(int algorithm, const std::vector<tool::MeasuredPoint>& points) {
-    return {"a.json", 40, 2, algorithm, 2, "LLR \u00d7 8", "", 7, 1.0 / 3, points};
+    return {"a.json", false, 40, 2, algorithm, 2, {link::Quantiser::Kind::llr, 8}, "", 7, 1.0 / 3, points};
 }
 
 const tool::MeasuredPoint bad = point(0.5, {900, 200}, {600, 100});

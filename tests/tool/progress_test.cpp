@@ -70,13 +70,25 @@ TEST(Progress, DrawsTenTimesASecondAtMost) {
               "[#########.....................]  30 %  3 of 10 blocks\x1b[K\r");
 }
 
-TEST(Progress, DrawsNothingWhereNobodyLooks) {
-    std::ostringstream terminal;
+TEST(Progress, IsALineAMinuteElsewhere) {
+    std::ostringstream log;
     {
-        Progress progress(terminal, false, 10, start);
-        progress.update(5, start + 5s);
+        Progress progress(log, false, 1000, start);
+        progress.update(1, start + 59s);
+        EXPECT_EQ(log.str(), "");
+        progress.update(10, start + 60s);
+        progress.update(11, start + 119s);
+        progress.update(400, start + 121s);
     }
-    EXPECT_EQ(terminal.str(), "");
+    EXPECT_EQ(log.str(),
+              "quarzel: 10 of 1000 blocks, 1:39:00 left\n"
+              "quarzel: 400 of 1000 blocks, 0:03:01 left\n");
+}
+
+TEST(Progress, ForetellsNothingBeforeTheFirstBlock) {
+    std::ostringstream log;
+    Progress(log, false, 1000, start).update(0, start + 60s);
+    EXPECT_EQ(log.str(), "quarzel: 0 of 1000 blocks\n");
 }
 
 TEST(Progress, IsShownOnATerminal) {
@@ -89,7 +101,7 @@ TEST(Progress, IsShownOnATerminal) {
     EXPECT_TRUE(run.out.starts_with("{\"capture\":")) << run.out;
 }
 
-TEST(Progress, IsNotShownInAFile) {
+TEST(Progress, IsNotShownInAFileBeforeAMinute) {
     const ToolRun run = decodeSlowly(false);
     EXPECT_EQ(run.exitCode, 0);
     EXPECT_EQ(run.err, "");

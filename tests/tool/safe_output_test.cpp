@@ -222,6 +222,33 @@ TEST(SafeOutput, IsLockedWhileItsSweepRuns) {
     EXPECT_THAT(directory.names(), testing::ElementsAre("result.json"));
 }
 
+TEST(SafeOutput, IsLockedForAllCommandsThatExtendIt) {
+    const TemporaryDirectory directory;
+    const std::string file = directory.path("result.json");
+    const ToolRun run = runScript(R"("$0" threshold --block-size 6144 --target-bler 1e-6 -o "$1" 2>/dev/null &
+                                     holder=$!
+                                     until [ -s "$1.lock" ]; do sleep 0.01; done
+                                     refused() {
+                                       "$0" "$@"
+                                       [ $? = 3 ] || echo no refusal
+                                     }
+                                     refused threshold --block-size 40 -o "$1" &
+                                     first=$!
+                                     refused merge "$2" -o "$1" &
+                                     second=$!
+                                     refused sweep --ebn0 8 --max-blocks 8 -o "$1" --checkpoint "$1.mine"
+                                     wait $first $second
+                                     kill $holder
+                                     wait $holder)",
+                                  {file, QUARZEL_TEST_DATA "/../sweep/data/small_sweep.json"});
+    EXPECT_EQ(run.out, "");
+    const std::string refusal =
+        "quarzel: error: " + file +
+        ": is in use by process [0-9]* on [^\n]*; wait for its end, or give another name\n";
+    EXPECT_THAT(run.err, testing::MatchesRegex(refusal + refusal + refusal));
+    EXPECT_THAT(directory.names(), testing::ElementsAre("result.json")) << "what the search has done";
+}
+
 TEST(SafeOutput, IsNotLockedByASweepThatWasKilled) {
     const TemporaryDirectory directory;
     const std::string file = directory.path("result.json");

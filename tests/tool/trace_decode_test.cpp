@@ -42,7 +42,7 @@ std::vector<Row> rowsOf(const std::string& text) {
     const Arguments streams = {"code1_sys", "code1_par0", "code1_par1",
                                "code2_sys", "code2_par0", "code2_par1"};
     std::vector<Row> rows;
-    int block = 0;
+    int block = -1;
     std::size_t stream = streams.size();
     std::string pass;
     Arguments headings;
@@ -182,8 +182,8 @@ TEST(TraceDecode, ShowsAValueInEveryFormAlike) {
     const Arguments textRow = wordsOf(linesOf(trace.text).at(10));
     EXPECT_EQ(textRow.at(0), "0");
     EXPECT_EQ(textRow.at(1), "+0.750000") << "the intrinsic value of step 0";
-    EXPECT_NE(csv.find("\n1,0,0,int,,6,0.750000\n"), std::string::npos);
-    EXPECT_NE(json.find("\n{\"block\":1,\"pass\":0,\"step\":0,\"signal\":\"int\",\"state\":null,\"raw\":6,"
+    EXPECT_NE(csv.find("\n0,0,0,int,,6,0.750000\n"), std::string::npos);
+    EXPECT_NE(json.find("\n{\"block\":0,\"pass\":0,\"step\":0,\"signal\":\"int\",\"state\":null,\"raw\":6,"
                         "\"real\":0.750000},\n"),
               std::string::npos);
 }
@@ -193,7 +193,7 @@ TEST(TraceDecode, CanBeginAtALaterBlock) {
     const TemporaryDirectory directory;
     Arguments arguments = trace.decodeFrom(directory);
     arguments.back() = "1";
-    const ToolRun run = runTool(arguments + Arguments{"--trace-block", "2"});
+    const ToolRun run = runTool(arguments + Arguments{"--trace-block", "1"});
     const std::size_t second = trace.text.find(std::string(120, '-') + "\nitsSys", 1);
     ASSERT_NE(second, std::string::npos);
     EXPECT_EQ(run.out, trace.text.substr(second));
@@ -220,7 +220,7 @@ TEST(TraceDecode, DecidesAsWithoutATrace) {
                                          "--algorithm", algorithm, "-o",      directory.path("out.npy")};
             ASSERT_EQ(runTool(arguments).exitCode, 0);
             const std::string decided = readFile(directory.path("out.npy"));
-            ASSERT_EQ(runTool(arguments + Arguments{"--trace", "1", "--trace-block", "24", "--trace-file",
+            ASSERT_EQ(runTool(arguments + Arguments{"--trace", "1", "--trace-block", "23", "--trace-file",
                                                     directory.path("trace.txt")})
                           .exitCode,
                       0);
@@ -260,7 +260,8 @@ TEST(TraceDecode, HoldsNoTraceInMemory) {
     const TemporaryDirectory directory;
     const std::string file = directory.path("trace");
     constexpr unsigned long memoryLimit = 48UL << 20;
-    for (const auto& [form, passes] : {std::pair("text", "36"), {"csv", "14"}, {"json", "5"}}) {
+    for (const auto& [form, passes] :
+         {std::pair("text", "36"), {"csv", "14"}, {"json", "5"}, {"vcd", "24"}}) {
         const ToolRun run = runTool({"decode", shipped("k6144.soft.npy"), "--trace", passes, "--trace-file",
                                      file, "--trace-format", form},
                                     {.memoryLimit = memoryLimit});
@@ -284,7 +285,7 @@ TEST(TraceDecode, LeavesNoPartOfAFile) {
 
 TEST(TraceDecode, TellsOfAFullDisk) {
     const Arguments arguments = {"decode", shipped("k40.soft.npy"), "--trace", "1", "--trace-format"};
-    for (const char* form : {"text", "csv", "json"}) {
+    for (const char* form : {"text", "csv", "json", "vcd"}) {
         const ToolRun toFile = runTool(arguments + Arguments{form, "--trace-file", "/dev/full"});
         EXPECT_EQ(toFile.err,
                   "quarzel: error: /dev/full: cannot be written: No space left on device; free some space\n");
@@ -305,12 +306,12 @@ TEST(TraceDecode, RefusesOptionsThatDoNotFit) {
         {{"--trace", "0"}, "--trace: '0' is not a number from 1 to 4294967295; see 'quarzel decode --help'"},
         {{"--trace", "4294967296"},
          "--trace: '4294967296' is not a number from 1 to 4294967295; see 'quarzel decode --help'"},
-        {{"--trace", "1", "--trace-block", "0"},
-         "--trace-block: '0' is not a number from 1 on; see 'quarzel decode --help'"},
-        {{"--trace", "1", "--trace-block", "401"},
-         "--trace-block: " + capture + " has no block 401; give a number from 1 to 400"},
+        {{"--trace", "1", "--trace-block", "-1"},
+         "--trace-block: '-1' is not a whole number; see 'quarzel decode --help'"},
+        {{"--trace", "1", "--trace-block", "400"},
+         "--trace-block: " + capture + " has no block 400; give a number from 0 to 399"},
         {{"--trace", "1", "--trace-format", "xml"},
-         "--trace-format: xml not in {text,csv,json}; see 'quarzel decode --help'"},
+         "--trace-format: xml not in {text,csv,json,vcd}; see 'quarzel decode --help'"},
         {{"--trace-file", file}, "--trace-file requires --trace; see 'quarzel decode --help'"},
         {{"--trace-format", "csv"}, "--trace-format requires --trace; see 'quarzel decode --help'"},
         {{"--trace-block", "2"}, "--trace-block requires --trace; see 'quarzel decode --help'"},

@@ -53,6 +53,6 @@ TEST_P(TraceForms, AreTheSameWhateverTheSettingsOfTheStreamAndLeaveThem) {
     EXPECT_EQ(odd.rdstate(), std::ios::goodbit);
 }
 
-INSTANTIATE_TEST_SUITE_P(TraceFile, TraceForms, testing::Values("text", "csv", "json"));
+INSTANTIATE_TEST_SUITE_P(TraceFile, TraceForms, testing::Values("text", "csv", "json", "vcd"));
 
 }  // namespace quarzel::test

@@ -8,10 +8,13 @@
 #include <nlohmann/json.hpp>
 #include <sstream>
 
+#include "golden.hpp"
 #include "npy_data.hpp"
+#include "quarzel/core.hpp"
 #include "run_tool.hpp"
 #include "sweep/sha256.hpp"
 #include "temporary_directory.hpp"
+#include "vectors/covering_blocks.hpp"
 #include "vectors/memory_image.hpp"
 
 namespace fs = std::filesystem;
@@ -181,7 +184,7 @@ TEST_F(VectorsCommand, IsMadeAgainByTheCommandInItsManifest) {
 }
 
 TEST_F(VectorsCommand, CoversEverySizeWindowShapeSegmentAndSaturation) {
-    const ToolRun run = make({"--cover", "--units", "4", "--algorithm", "1"});
+    const ToolRun run = make({"--cover-sizes", "--units", "4", "--algorithm", "1"});
     ASSERT_EQ(run.exitCode, 0) << run.err;
     const nlohmann::json set = manifest();
     const nlohmann::json& coverage = set.at("coverage").at("u4_a1");
@@ -214,12 +217,83 @@ TEST_F(VectorsCommand, CoversEverySizeWindowShapeSegmentAndSaturation) {
               std::count(parity.begin(), parity.end(), 0x80U));
 }
 
+TEST_F(VectorsCommand, CoversTheFaultsOfACore) {
+    ASSERT_EQ(make({"--cover", "--units", "4", "--algorithm", "2"}).exitCode, 0);
+    const nlohmann::json set = manifest();
+    EXPECT_EQ(set.at("configuration").dump(),
+              R"({"algorithms":[2],"command":"quarzel vectors DIRECTORY --cover --units 4 --algorithm 2",)"
+              R"("cover":"faults","units":[4]})");
+    EXPECT_EQ(set.at("coverage").at("u4_a2").at("faults").dump(),
+              R"({"catalogue":{"equivalent":6,"found":315,"of":315},"held_out":{"found":29,"of":29}})");
+    const std::vector<tool::CoveringBlock> chosen = tool::coveringBlocks(4, 2);
+    const nlohmann::json& blocks = set.at("cores").at(0).at("blocks");
+    ASSERT_EQ(blocks.size(), chosen.size());
+    const std::vector<std::uint32_t> tags = memory("set/u4_a2/tags.hex", chosen.size());
+    Core core(CoreSettings{4, 2});
+    for (std::size_t i = 0; i < chosen.size(); ++i) {
+        const tool::PlannedBlock& planned = chosen[i].planned;
+        EXPECT_EQ(blocks[i].at("block_size"), planned.blockSize);
+        EXPECT_EQ(blocks[i].at("iterations"), planned.iterations);
+        EXPECT_EQ(blocks[i].at("tag"), chosen[i].tag);
+        EXPECT_EQ(tags[i], chosen[i].tag);
+        // The captures hold the blocks of the table and what a core decides for them.
+        const std::string capture =
+            itsDirectory.path("set/u4_a2/" + blocks[i].at("capture").get<std::string>());
+        const auto soft = xt::load_npy<std::int8_t>(capture);
+        const auto decided =
+            xt::load_npy<std::uint8_t>(capture.substr(0, capture.size() - 9) + ".decided.npy");
+        const std::size_t row = blocks[i].at("row");
+        const std::vector<std::int8_t> expected = tool::softValuesOf(chosen[i], 4);
+        EXPECT_TRUE(std::equal(expected.begin(), expected.end(), &soft(row, 0, 0))) << i;
+        std::vector<unsigned char> bits(planned.blockSize);
+        core.decode(softBlocks(std::span(expected), planned.blockSize + tailPositions), planned.iterations,
+                    bits);
+        for (std::size_t bit = 0; bit < bits.size(); ++bit) {
+            ASSERT_EQ(bits[bit], decided(row, bit / 8) >> (7 - bit % 8) & 1) << i << ' ' << bit;
+        }
+    }
+}
+
+// Any change of a block, of the stimuli or of a file's form shows here.
+TEST_F(VectorsCommand, GivesACoveringSetByteForByte) {
+    ASSERT_EQ(make({"--cover", "--units", "2", "--algorithm", "1"}).exitCode, 0);
+    std::string digests;
+    for (const auto& [name, bytes] : filesIn(itsDirectory.path("set/u2_a1"))) {
+        digests += sweep::sha256(bytes) + "  " + name + '\n';
+    }
+    expectGolden(digests, "covering_set.txt");
+}
+
+TEST_F(VectorsCommand, CoversAllNineCoresWhereNoneIsNamed) {
+    const ToolRun run = make({"--cover", "--json"});
+    const nlohmann::json summary = nlohmann::json::parse(run.out);
+    EXPECT_EQ(summary.at("cores"), 9);
+    EXPECT_EQ(summary.at("blocks"), 94);
+}
+
 TEST_F(VectorsCommand, RefusesWhatDoesNotGoWithCover) {
-    const ToolRun run = make({"--cover", "--block-size", "40"});
-    EXPECT_EQ(run.err,
-              "quarzel: error: --block-size: does not go with --cover, which takes all; leave it out\n");
-    EXPECT_EQ(run.exitCode, 2);
-    EXPECT_EQ(itsDirectory.names(), std::vector<std::string>{});
+    const auto expectRefused = [this](const std::vector<std::string>& options, const std::string& message) {
+        const ToolRun run = make(options);
+        EXPECT_EQ(run.err, "quarzel: error: " + message + "\n");
+        EXPECT_EQ(run.exitCode, 2);
+        EXPECT_EQ(itsDirectory.names(), std::vector<std::string>{});
+    };
+    expectRefused({"--cover-sizes", "--block-size", "40"},
+                  "--block-size: does not go with --cover-sizes, which takes all; leave it out");
+    expectRefused({"--cover", "--cover-sizes"},
+                  "--cover-sizes: does not go with --cover, whose blocks are chosen; leave it out");
+    for (const auto& [option, value] : std::map<std::string, std::string>{{"--block-size", "40"},
+                                                                          {"--stimulus", "ties"},
+                                                                          {"--iterations", "3"},
+                                                                          {"--blocks", "2"},
+                                                                          {"--ebn0", "1"},
+                                                                          {"--scale", "4"},
+                                                                          {"--llr", "4"},
+                                                                          {"--rv", "0"},
+                                                                          {"--seed", "1"}}) {
+        expectRefused({"--cover", option, value},
+                      option + ": does not go with --cover, whose blocks are chosen; leave it out");
+    }
 }
 
 }  // namespace quarzel::test

@@ -11,12 +11,14 @@
 #include <string_view>
 #include <vector>
 
+#include "coverage/coverage_command.hpp"
 #include "decode/decode_command.hpp"
 #include "decode/info_command.hpp"
 #include "plot/plot_command.hpp"
 #include "shell/nearest_name.hpp"
 #include "shell/shell_commands.hpp"
 #include "sweeps/merge_command.hpp"
+#include "sweeps/rebuild_command.hpp"
 #include "sweeps/show_command.hpp"
 #include "sweeps/threshold_command.hpp"
 #include "sweeps/verify_result_command.hpp"
@@ -43,8 +45,10 @@ Examples:
   quarzel trace-diff model.txt simulation.txt --ignore-termination
   quarzel vectors vectors --block-size 40,6144 --ebn0 0.8
   quarzel compare vectors/u2_a1 simulated.hex
+  quarzel coverage --vectors vectors
   quarzel sweep --ebn0 0:0.2:1 --iterations 8 -o result.json
   quarzel show result.json
+  quarzel rebuild result.json --number 1234 --trace 12
   quarzel plot result.json -o curves.svg
 )";
 
@@ -149,12 +153,14 @@ ExitCode runCommandLine(int argc, const char* const* argv, std::ostream& results
     addTraceDiffCommand(app, results, exitCode);
     addVectorsCommand(app, results);
     addCompareCommand(app, results, exitCode);
+    addCoverageCommand(app, results);
     addSweepCommand(app, results, makeWorkers);
     addThresholdCommand(app, results, makeWorkers);
     addShowCommand(app, results);
     addMergeCommand(app, results);
+    addRebuildCommand(app, results);
     addVerifyResultCommand(app, results, exitCode, makeWorkers);
-    addPlotCommand(app);
+    addPlotCommand(app, results);
     addShellCommands(app, results);
     try {
         const std::vector<const char*> arguments = withJsonBehindCommand(argc, argv);

@@ -72,7 +72,7 @@ std::string textOf(const sweep::Plan& plan) {
 
 sweep::Plan planFrom(const std::string& text) {
     const sweep::Json json = sweep::Json::parse(text);
-    sweep::Plan plan{json.at(0), {}, 0, {json.at(1), json.at(2)}};
+    sweep::Plan plan{json.at(0), {}, 0, {json.at(1), json.at(2)}, 0};
     for (const sweep::Json& point : json.at(3)) {
         auto [setup, start] = sweep::pointFrom(point.at(0), point.at(1));
         plan.points.push_back({setup, {}, std::move(start)});

@@ -3,30 +3,39 @@
 
 from __future__ import annotations
 
-import dataclasses
 import math
 from typing import Any, Iterable, Literal, Optional, Union
 
 import numpy as np
 
-from ._simulation import Curve, Point, SweepResult, _optional
+from ._checks import whole
+from ._labels import Results, labelled, longest
+from ._link import bits_per_symbol, listed
+from ._reference import Reference, References, read_references
+from ._simulation import Curve, Point, _optional
 
 _COLOURS = ("#0072b2", "#d55e00", "#009e73", "#cc79a7", "#000000", "#e69f00", "#56b4e9")
 """People with any kind of colour vision tell them apart (M. Okabe and K. Ito, 2008)."""
 _LINE = np.array([(13, 8, 135), (100, 0, 167), (166, 32, 152), (213, 84, 110), (245, 136, 70), (245, 185, 40)]) / 255
 """Corners of a line of colours, which grow lighter: for more curves."""
 _MARKS = ("o", "s", "^", "D", "p")
+_REFERENCE_STYLES = (("#404040", "--", "s"), ("#808080", ":", "^"), ("#606060", "-.", "D"), ("#404040", "--", "p"))
 _DEVIATIONS = 1.959963984540054
-_DECIBELS_OF_RATE = 10 * math.log10(1 / 3)
 _NAMES = {"ber": "Bit error rate", "bler": "Block error rate"}
 
 
 def plot(
-    results: Union[SweepResult, Iterable[SweepResult]],
+    results: Results,
     *,
     panel: Literal["ber", "bler", "both"] = "both",
     x: Literal["ebn0", "esn0"] = "ebn0",
+    block_size: Union[int, Iterable[int], None] = None,
+    per_iteration: bool = False,
+    iterations: Union[int, Iterable[int], None] = None,
+    references: References = (),
     uncoded: bool = False,
+    x_range: Optional[tuple[float, float]] = None,
+    y_range: Optional[tuple[float, float]] = None,
     size: Optional[tuple[float, float]] = None,
     font_size: float = 10,
     title: Optional[str] = None,
@@ -38,16 +47,25 @@ def plot(
     Bars hold the true rate with a probability of 95 %. Where no error was seen, a triangle stands at the upper
     bound, and no line leads there. Curves that were measured alike over several ranges are one line.
 
+    :param results: a result of :func:`sweep`, a curve of one, or several of these
     :param panel: which rates
-    :param x: over Eb/N0, or over Es/N0 of a BPSK symbol at rate 1/3
-    :param uncoded: draw the bit error rate of BPSK without a code too
+    :param x: over Eb/N0, or over Es/N0 of a symbol of the channel
+    :param block_size: draw only curves and references of these block sizes
+    :param per_iteration: draw one curve, with a line for each iteration; points without an error are left out
+    :param iterations: with ``per_iteration``, only these lines
+    :param references: files of curves from elsewhere, or a dictionary from labels to them: CSV as ``quarzel plot
+        --reference`` takes it
+    :param uncoded: draw BPSK without a code too
+    :param x_range: ends of the horizontal axis in dB
+    :param y_range: ends of the vertical axes
     :param size: width and height in inches
     :param font_size: in points
     :param title: what the curves share when not given
     :param labels: of the curves; what they differ in when not given
     :param legend: ``"right"`` of the panels, or a place in the last one as Matplotlib names it: ``"lower left"``
     :returns: the Matplotlib figure
-    :raises ValueError: there is no such panel or axis, no curve, or not a label for each
+    :raises ValueError: there is no such panel or axis, no curve, not a label for each, or a reference is not
+        well-formed
     :raises ImportError: Matplotlib is not installed
 
     >>> figure = quarzel.plot(quarzel.sweep([0.0, 1.0], block_size=40, max_blocks=20), panel="bler", size=(3.5, 2.6))
@@ -57,27 +75,41 @@ def plot(
         raise ValueError(f"there is no panel {panel!r}; choose 'ber', 'bler' or 'both'")
     if x not in ("ebn0", "esn0"):
         raise ValueError(f"there is no axis {x!r}; choose 'ebn0' or 'esn0'")
+    for name, ends in (("x_range", x_range), ("y_range", y_range)):
+        if ends is not None and not ends[0] < ends[1]:
+            raise ValueError(f"{name} must be two numbers in ascending order, not {ends}")
+    if y_range is not None and y_range[0] <= 0:
+        raise ValueError(f"y_range must be above 0, not {y_range}: the axis is logarithmic")
     rates = ["ber", "bler"] if panel == "both" else [panel]
-    shared, curves = _labelled([results] if isinstance(results, SweepResult) else list(results))
-    if labels is not None:
-        texts = list(labels)
-        if len(texts) != len(curves):
-            raise ValueError(f"the labels are {len(texts)} and the curves {len(curves)}; give one for each")
-        curves = [(text, curve) for text, (_, curve) in zip(texts, curves)]
+    sizes = None if block_size is None else listed(block_size)
+    shared, curves = labelled(results, sizes)
+    elsewhere = [curve for curve in read_references(references) if sizes is None or curve.block_size in (None, *sizes)]
+    if per_iteration:
+        curves, lines = _lines(curves, iterations)
+    texts = None if labels is None else list(labels)
+    count = len(lines) if per_iteration else len(curves)
+    if texts is not None and len(texts) != count:
+        raise ValueError(f"the labels are {len(texts)} and the curves {count}; give one for each")
     matplotlib = _optional("matplotlib", "plot needs Matplotlib; install it, or use 'quarzel plot'")
     with matplotlib.rc_context({"font.size": font_size, "pdf.fonttype": 42, "lines.markersize": font_size / 2}):
-        height = max(4.3, (len(curves) + 5) * 1.5 * font_size / 72)
+        height = max(4.3, (count + len(elsewhere) + 5) * 1.5 * font_size / 72)
         figure = new_figure(size or (11 if len(rates) > 1 else 7, height))
         for index, rate in enumerate(rates):
             axes = figure.add_subplot(1, len(rates), index + 1)
-            draw(axes, curves, rate, _DECIBELS_OF_RATE if x == "esn0" else 0)
+            if per_iteration:
+                lowest = _draw_iterations(axes, curves[0][1], lines, texts, rate, x == "esn0")
+            else:
+                drawn = curves if texts is None else [(text, curve) for text, (_, curve) in zip(texts, curves)]
+                lowest = _draw_measured(axes, drawn, rate, x == "esn0")
+            lowest = min(lowest, _draw_references(axes, elsewhere, rate, x == "esn0"))
+            _frame(axes, rate, lowest)
             axes.set_xlabel("$E_s/N_0$ (dB)" if x == "esn0" else "$E_b/N_0$ (dB)")
-            if uncoded and rate == "ber":
-                first, last = axes.get_xlim()
-                at = np.linspace(first, last, 101)
-                wrong = [math.erfc(math.sqrt(10 ** (value / 10))) / 2 for value in at]
-                axes.plot(at, wrong, color="#a0a0a0", linewidth=1, label="uncoded BPSK")
-                axes.set_xlim(first, last)
+            if x_range is not None:
+                axes.set_xlim(*x_range)
+            if uncoded:
+                _draw_uncoded(axes, [curve for _, curve in curves], rate)
+            if y_range is not None:
+                axes.set_ylim(*y_range)
         handles = _legend_of(figure.axes[0])
         if legend == "right":
             figure.axes[-1].legend(*handles, loc="upper left", bbox_to_anchor=(1.02, 1), borderaxespad=0, frameon=False)
@@ -93,14 +125,29 @@ def new_figure(size: Optional[tuple[float, float]] = None) -> Any:
     return pyplot.figure(figsize=size, layout="constrained")
 
 
-def draw(axes: Any, curves: list[tuple[str, Curve]], rate: str, shift: float = 0) -> None:
-    """Draw a rate of labelled curves into axes.
+def draw(axes: Any, curves: list[tuple[str, Curve]], rate: str) -> None:
+    """Draw a rate of labelled curves into axes."""
+    _frame(axes, rate, _draw_measured(axes, curves, rate, False))
 
-    :param shift: from Eb/N0 to the horizontal axis, in dB
-    """
+
+def _lines(curves: list[tuple[str, Curve]], wanted: Any) -> tuple[list[tuple[str, Curve]], list[int]]:
+    """The only curve, and those of its iterations that are drawn."""
+    (curve, *others) = longest([curve for _, curve in curves])
+    if others:
+        raise ValueError(f"there are {1 + len(others)} curves; give one of SweepResult.curves")
+    if any(point.per_iteration is None for point in curve.points):
+        raise ValueError("the curve has no error rates per iteration; make it with sweep(..., per_iteration=True)")
+    every = range(1, curve.iterations + 1)
+    chosen = every if wanted is None else [whole("iterations", value, 1, curve.iterations) for value in listed(wanted)]
+    return [("", curve)], [count for count in every if count in chosen]
+
+
+def _draw_measured(axes: Any, curves: list[tuple[str, Curve]], rate: str, over_esn0: bool) -> float:
+    """Points with their intervals, and bounds where no error was seen. Returns the lowest mark."""
     lowest = 1.0
     for index, (label, curve) in enumerate(curves):
         colour = _colour(index, len(curves))
+        shift = _shift(curve) if over_esn0 else 0
         seen = [point for point in curve.points if point.block_errors > 0]
         rates = np.array([getattr(point, rate) for point in seen])
         intervals = np.array([_interval(point, rate) for point in seen]).reshape(-1, 2)
@@ -114,10 +161,68 @@ def draw(axes: Any, curves: list[tuple[str, Curve]], rate: str, shift: float = 0
         lowest = min([lowest, *rates, *bounds])
     if any(point.block_errors == 0 for _, curve in curves for point in curve.points):
         axes.plot([], [], "v", color="black", fillstyle="none", label="no error: 95 % upper bound")
+    return lowest
+
+
+def _draw_iterations(
+    axes: Any, curve: Curve, lines: list[int], labels: Optional[list[str]], rate: str, over_esn0: bool
+) -> float:
+    """A line for each iteration. Returns the lowest mark."""
+    lowest = 1.0
+    shift = _shift(curve) if over_esn0 else 0
+    trials = curve.information_bits if rate == "ber" else 1
+    for index, count in enumerate(lines):
+        errors = [(point, (point.per_iteration or [])[count - 1]) for point in curve.points]
+        name = "bit_errors" if rate == "ber" else "block_errors"
+        marks = [(p.ebn0_db + shift, e[name] / p.blocks / trials) for p, e in errors if e[name] > 0]
+        label = labels[index] if labels else f"after {count} iteration{'s' * (count > 1)}"
+        colour, mark = _colour(index, len(lines)), _MARKS[index % len(_MARKS)]
+        axes.plot(*_columns(marks), color=colour, marker=mark, linewidth=1, label=label)
+        lowest = min([lowest, *(value for _, value in marks)])
+    return lowest
+
+
+def _draw_references(axes: Any, references: list[Reference], rate: str, over_esn0: bool) -> float:
+    """Lines with open marks. Returns the lowest mark."""
+    lowest = 1.0
+    for index, reference in enumerate(references):
+        shift = 10 * math.log10(reference.bits_per_symbol) if over_esn0 else 0
+        marks = [(ebn0 + shift, value) for ebn0, value in reference.rates[rate]]
+        colour, dashes, mark = _REFERENCE_STYLES[index % len(_REFERENCE_STYLES)]
+        axes.plot(
+            *_columns(marks), color=colour, linestyle=dashes, marker=mark, fillstyle="none", linewidth=1,
+            label=reference.label,
+        )  # fmt: skip
+        lowest = min([lowest, *(value for _, value in marks)])
+    return lowest
+
+
+def _draw_uncoded(axes: Any, curves: list[Curve], rate: str) -> None:
+    """BPSK without a code, whose Es/N0 is its Eb/N0; its block error rate where all blocks have one size."""
+    sizes = {curve.information_bits for curve in curves}
+    first, last = axes.get_xlim()
+    at = np.linspace(first, last, 101) if rate == "ber" or len(sizes) == 1 else []
+    wrong = [math.erfc(math.sqrt(10 ** (value / 10))) / 2 for value in at]
+    bits = 1 if rate == "ber" else min(sizes)
+    rates = [-math.expm1(bits * math.log1p(-value)) for value in wrong]
+    axes.plot(at, rates, color="#a0a0a0", linewidth=1, label="uncoded BPSK")
+    axes.set_xlim(first, last)
+
+
+def _frame(axes: Any, rate: str, lowest: float) -> None:
     axes.set_yscale("log")
     axes.set_ylim(10.0 ** min(-1, math.floor(math.log10(lowest / 1.5))), 1)
     axes.set(xlabel="Eb/N0 [dB]", ylabel=_NAMES[rate])
     axes.grid(True, color="#d0d0d0", linewidth=0.4)
+
+
+def _shift(curve: Curve) -> float:
+    """From Eb/N0 to Es/N0, in dB."""
+    return 10 * math.log10(bits_per_symbol(curve))
+
+
+def _columns(marks: list[tuple[float, float]]) -> tuple[list[float], list[float]]:
+    return [x for x, _ in marks], [y for _, y in marks]
 
 
 def _legend_of(axes: Any) -> tuple[list[Any], list[str]]:
@@ -153,54 +258,4 @@ def _bound(curve: Curve, point: Point, rate: str) -> float:
     if rate == "bler" or not wrong:
         return high
     nearest = min(wrong, key=lambda other: abs(other.ebn0_db - point.ebn0_db))
-    return high * nearest.bit_errors / nearest.block_errors / curve.block_size
-
-
-def _labelled(results: list[SweepResult]) -> tuple[str, list[tuple[str, Curve]]]:
-    """What all curves share, and each curve with what it differs in; those measured alike are joined."""
-    joined: list[tuple[tuple[str, ...], Curve]] = []
-    for number, result in enumerate(results, 1):
-        for curve in result.curves:
-            key = (*_setup(curve), f"seed {result.seed}", f"result {number}")
-            for index, (other, former) in enumerate(joined):
-                if other[:-2] == key[:-2] and _can_join(former, curve, other[-2] == key[-2]):
-                    joined[index] = other, _join(former, curve)
-                    break
-            else:
-                joined.append((key, curve))
-    if not joined:
-        raise ValueError("there is no curve; give the result of a sweep")
-    keys = [key for key, _ in joined]
-    fields = len(keys[0]) - 2
-    differing = [index for index in range(fields) if len({key[index] for key in keys}) > 1]
-    title = ", ".join(keys[0][index] for index in range(fields) if index not in differing)
-    for last in (fields, fields + 1):  # the seed and the result, where nothing else tells curves apart
-        if len({tuple(key[index] for index in differing) for key in keys}) < len(keys):
-            differing.append(last)
-    labels = [", ".join(key[index] for index in differing) or "quarzel" for key in keys]
-    return title, [(label, curve) for label, (_, curve) in zip(labels, joined)]
-
-
-def _can_join(a: Curve, b: Curve, have_one_seed: bool) -> bool:
-    """Whether curves of one setup are one measurement: not two of the same point."""
-    former = {point.ebn0_db: point for point in a.points}
-    common = [(former[point.ebn0_db], point) for point in b.points if point.ebn0_db in former]
-    return not common or (have_one_seed and all(x.blocks != y.blocks or x.bit_errors == y.bit_errors for x, y in common))
-
-
-def _join(a: Curve, b: Curve) -> Curve:
-    """The points of both; where both have one, that with more blocks."""
-    longest = {point.ebn0_db: point for point in sorted([*a.points, *b.points], key=lambda point: point.blocks)}
-    points = sorted(longest.values(), key=lambda point: point.ebn0_db)
-    return dataclasses.replace(a, points=points)
-
-
-def _setup(curve: Curve) -> tuple[str, ...]:
-    """What a curve was measured with, in the order in which it is told."""
-    return (
-        f"K = {curve.block_size}",
-        f"{curve.units} units",
-        curve.algorithm.replace("scaled-max-log", "scaled max-log"),
-        f"{curve.iterations} iteration{'s' * (curve.iterations > 1)}",
-        f"{'LLR' if curve.quantiser == 'llr' else 'amplitude'} \u00d7 {curve.scale:g}",
-    )
+    return high * nearest.bit_errors / nearest.block_errors / curve.information_bits

@@ -1,5 +1,5 @@
 # SPDX-License-Identifier: MIT
-"""Links over Eb/N0: random bits, encoder, white Gaussian noise, quantiser, core, counting."""
+"""Links over Eb/N0: random bits, encoder, channel, quantiser, core, counting."""
 
 from __future__ import annotations
 
@@ -15,6 +15,7 @@ from numpy.typing import ArrayLike, NDArray
 from . import _core
 from ._checks import array_of, choice, real, whole
 from ._decoder import algorithm_number, algorithms
+from ._link import USUAL, link_configuration, listed, sending_text
 from ._types import Algorithm, AlgorithmOrNumber, Units
 
 _MAX_COUNT = 2**64 - 1
@@ -41,6 +42,15 @@ class Point:
     """``"block errors"``, ``"blocks"``, ``"time"``, or None where a sweep was interrupted"""
     per_iteration: Optional[list[dict[str, int]]] = None
     """``bit_errors`` and ``block_errors`` after each iteration"""
+    throughput: Optional[float] = None
+    """information bits of right blocks for each coded bit that was sent, over a coded link"""
+    undetected_errors: Optional[int] = None
+    """transport blocks with wrong bits whose CRCs hold"""
+    mean_iterations: Optional[float] = None
+    """of a receiver that stops; how often it used each number of them is in ``iterations_used``"""
+    iterations_used: Optional[list[int]] = None
+    transmissions: Optional[list[dict[str, Any]]] = None
+    """what is left after each transmission, where there are several"""
 
 
 @dataclass(frozen=True)
@@ -55,6 +65,21 @@ class Curve:
     """``"llr"`` or ``"scale"``"""
     scale: float
     points: list[Point] = field(default_factory=list)
+    transport_block: int = 0
+    """A; 0: code blocks alone. ``block_size`` is then K of the last code block"""
+    coded_bits: int = 0
+    """of a transmission; 0: each code bit of code blocks alone once"""
+    modulation: str = "bpsk"
+    channel: str = "awgn"
+    demapping: str = "maxlog"
+    redundancy_versions: tuple[int, ...] = (0,)
+    """of each transmission"""
+    stop: str = "none"
+
+    @property
+    def information_bits(self) -> int:
+        """K, or A of transport blocks."""
+        return self.transport_block or self.block_size
 
     @property
     def ebn0_db(self) -> NDArray[np.float64]:
@@ -72,10 +97,11 @@ class Curve:
         return np.array([point.bler for point in self.points])
 
     def __str__(self) -> str:
-        return (
-            f"K = {self.block_size}, {self.units} units, {self.algorithm}, {self.iterations} iterations, "
-            f"{self.quantiser} {self.scale:g}"
+        text = (
+            f"{'A' if self.transport_block else 'K'} = {self.information_bits}, {self.units} units, {self.algorithm}, "
+            f"{self.iterations} iterations, {self.quantiser} {self.scale:g}"
         )
+        return ", ".join(part for part in (text, sending_text(self)) if part)
 
 
 class SweepResult:
@@ -119,7 +145,8 @@ class SweepResult:
         """The points as a pandas DataFrame, a row each. Needs pandas.
 
         The columns are those of a curve, then those of a point, with the ends of the intervals in ``ber_low``,
-        ``ber_high``, ``bler_low`` and ``bler_high``. Counts after each iteration are left out.
+        ``ber_high``, ``bler_low`` and ``bler_high``. Those of coded links are there when a curve has one. Lists are
+        left out: what was counted after each iteration or transmission.
 
         :raises ImportError: pandas is not installed
 
@@ -129,7 +156,9 @@ class SweepResult:
         1           6      0.8      20
         """
         pandas = _optional("pandas", "to_dataframe needs pandas; install it, or read the points of SweepResult.curves")
-        return pandas.DataFrame([_row(curve, point) for curve in self.curves for point in curve.points])
+        table = pandas.DataFrame([_row(curve, point) for curve in self.curves for point in curve.points])
+        is_plain = all(getattr(curve, name) == usual for curve in self.curves for name, usual in USUAL.items())
+        return table.drop(columns=list(USUAL)) if is_plain else table
 
     def plot(self, axes: Any = None, rate: Literal["ber", "bler"] = "bler") -> Any:
         """Draw a rate of the curves with 95 % intervals; a triangle is the upper bound where no error was seen.
@@ -161,12 +190,21 @@ class SweepResult:
 def sweep(
     ebn0_db: ArrayLike,
     *,
-    block_size: Union[int, Iterable[int]] = 1024,
+    block_size: Union[int, Iterable[int], None] = None,
     units: Union[Units, Iterable[Units]] = 2,
     algorithm: Union[AlgorithmOrNumber, Iterable[AlgorithmOrNumber]] = "scaled-max-log",
     iterations: Union[int, Iterable[int]] = 6,
     llr: Union[float, Iterable[float], None] = None,
     scale: Union[float, Iterable[float], None] = None,
+    transport_block: Union[int, Iterable[int], None] = None,
+    coded_bits: Union[int, Iterable[int], None] = None,
+    code_rate: Union[float, Iterable[float], None] = None,
+    modulation: Union[str, Iterable[str]] = "bpsk",
+    channel: Union[str, Iterable[str]] = "awgn",
+    demapping: Union[str, Iterable[str]] = "maxlog",
+    rv: Union[int, Iterable[int], None] = None,
+    harq: Optional[int] = None,
+    stop: Literal["none", "crc"] = "none",
     seed: int = 1,
     max_blocks: int = 10000,
     max_block_errors: int = 100,
@@ -177,11 +215,22 @@ def sweep(
 ) -> SweepResult:
     """Simulate a link over Eb/N0. The same arguments give the same result, whatever the threads and the machine.
 
-    :param ebn0_db: Eb/N0 of an information bit at rate 1/3, one or many, in dB
-    :param block_size: K, one or many; likewise ``units``, ``algorithm`` and ``iterations``: every combination
-        gives a curve
+    :param ebn0_db: Eb/N0 of an information bit, one or many, in dB; the rate is taken as 1/3 unless blocks are coded
+    :param block_size: K, one or many; 1024 when not given; likewise ``units``, ``algorithm`` and ``iterations``: every
+        combination gives a curve
     :param llr: units for a log-likelihood ratio of 1, one or many; 4 when neither this nor ``scale`` is given
     :param scale: units for the amplitude 1 that is sent, one or many, instead of ``llr``
+    :param transport_block: A, one or many: transport blocks with CRCs, cut into code blocks, instead of ``block_size``
+    :param coded_bits: of a transmission, one or many; each code bit is sent once when neither this nor ``code_rate``
+        is given
+    :param code_rate: the same as information bits for each coded bit, taken to whole symbols
+    :param modulation: ``"bpsk"``, ``"qpsk"``, ``"16qam"``, ``"64qam"`` or ``"256qam"``, one or many
+    :param channel: ``"awgn"``, ``"rayleigh"`` (each symbol fades by itself) or ``"rayleigh-block"`` (each transmission
+        does), one or many
+    :param demapping: ``"maxlog"`` or ``"exact"`` log-likelihood ratios of symbols, one or many
+    :param rv: redundancy version of each transmission, in turn; 0, with ``harq`` 0, 2, 3, 1 when not given
+    :param harq: send a block up to so many times until it is right, soft values added up
+    :param stop: ``"crc"``: the receiver ends the iterations of a transport block when its CRCs hold
     :param max_blocks: a point ends after so many blocks,
     :param max_block_errors: or with this block error (0: however many there are),
     :param max_seconds: or after this time (0: however long it takes); the result then depends on the clock
@@ -195,6 +244,9 @@ def sweep(
     >>> (curve,) = quarzel.sweep([0.0, 6.0], block_size=40, max_blocks=50).curves
     >>> bool(curve.ber[1] < curve.ber[0])
     True
+    >>> (curve,) = quarzel.sweep(6.0, block_size=40, code_rate=0.75, modulation="16qam", max_blocks=50).curves
+    >>> curve.coded_bits
+    52
     """
     if llr is not None and scale is not None:
         raise ValueError("llr and scale are two quantisers; give one of them")
@@ -208,12 +260,15 @@ def sweep(
         "max_seconds": whole("max_seconds", max_seconds, 0, _MAX_COUNT),
         "per_iteration": bool(per_iteration),
         "quantiser": kind,
-        "scale": [real(kind, value) for value in _listed(units_of_one)],
-        "block_size": [whole("block_size", value, 40, 6144) for value in _listed(block_size)],
-        "units": [choice("units", value, (2, 4, 8)) for value in _listed(units)],
-        "algorithm": [algorithm_number(value) for value in _listed(algorithm)],
-        "iterations": [whole("iterations", value, 1, 15) for value in _listed(iterations)],
+        "scale": [real(kind, value) for value in listed(units_of_one)],
+        "units": [choice("units", value, (2, 4, 8)) for value in listed(units)],
+        "algorithm": [algorithm_number(value) for value in listed(algorithm)],
+        "iterations": [whole("iterations", value, 1, 15) for value in listed(iterations)],
         "ebn0_db": _decibels(ebn0_db),
+        **link_configuration(
+            block_size=block_size, transport_block=transport_block, coded_bits=coded_bits, code_rate=code_rate,
+            modulation=modulation, channel=channel, demapping=demapping, rv=rv, harq=harq, stop=stop,
+        ),  # fmt: skip
     }
 
     def tell(text: str) -> None:
@@ -255,13 +310,15 @@ def _decibels(ebn0_db: ArrayLike) -> list[float]:
     return [round(float(value), 6) for value in array.reshape(-1)]
 
 
-def _listed(values: Any) -> list[Any]:
-    return list(values) if isinstance(values, Iterable) and not isinstance(values, str) else [values]
-
-
 def _curve(values: dict[str, Any]) -> Curve:
-    points = [_point(point) for point in values["points"]]
-    return Curve(**{**values, "algorithm": algorithms[values["algorithm"]], "points": points})
+    return Curve(
+        **{
+            **values,
+            "algorithm": algorithms[values["algorithm"]],
+            "points": [_point(point) for point in values["points"]],
+            "redundancy_versions": tuple(values.get("redundancy_versions", (0,))),
+        }
+    )
 
 
 def _point(values: dict[str, Any]) -> Point:
@@ -277,6 +334,6 @@ def _row(curve: Curve, point: Point) -> dict[str, Any]:
         if name.endswith("_interval"):
             rate = name.removesuffix("_interval")
             row[f"{rate}_low"], row[f"{rate}_high"] = value
-        elif name != "per_iteration":
+        elif name == "stopped_by" or not (value is None or isinstance(value, list)):
             row[name] = value
     return row

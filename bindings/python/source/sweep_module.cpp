@@ -6,6 +6,8 @@
 #include <functional>
 #include <optional>
 #include <string>
+#include <string_view>
+#include <vector>
 
 #include "common/outcome.hpp"
 #include "raise.hpp"
@@ -82,6 +84,16 @@ class PythonObserver : public Observer {
     std::optional<py::error_already_set> itsError;
 };
 
+/// What the names of a list stand for.
+template <class Value>
+std::vector<Value> valuesFrom(const Json& names, Value (*valueOf)(std::string_view)) {
+    std::vector<Value> values;
+    for (const Json& name : names) {
+        values.push_back(valueOf(name.get<std::string>()));
+    }
+    return values;
+}
+
 Configuration configurationFrom(const Json& json) {
     Configuration configuration;
     json.at("seed").get_to(configuration.seed);
@@ -92,6 +104,16 @@ Configuration configurationFrom(const Json& json) {
     json.at("block_size").get_to(configuration.blockSizes);
     json.at("units").get_to(configuration.units);
     json.at("algorithm").get_to(configuration.algorithms);
+    json.at("transport_block").get_to(configuration.transportBlocks);
+    configuration.codedSizes.clear();
+    for (const Json& size : json.at("coded_size")) {
+        configuration.codedSizes.push_back({size.at(0).get<std::uint32_t>(), size.at(1).get<double>()});
+    }
+    configuration.modulations = valuesFrom(json.at("modulation"), quarzel::link::modulationOf);
+    configuration.fadings = valuesFrom(json.at("channel"), quarzel::link::fadingOf);
+    configuration.demappings = valuesFrom(json.at("demapping"), quarzel::link::demappingOf);
+    json.at("redundancy_versions").get_to(configuration.redundancyVersions);
+    configuration.stop = stopOf(json.at("stop").get<std::string>()).value();
     json.at("iterations").get_to(configuration.iterations);
     configuration.quantisers.clear();
     for (const Json& scale : json.at("scale")) {

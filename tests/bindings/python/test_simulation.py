@@ -56,6 +56,48 @@ def test_quantisers_are_a_dimension():
     assert quarzel.sweep(1.0, block_size=40, max_blocks=100, llr=2).curves == result.curves[1:]
 
 
+def test_a_coded_link_gives_the_file_of_the_tool(tool, tmp_path):
+    for ours, theirs in (
+        (
+            {"block_size": 104, "code_rate": 0.75, "modulation": ["16qam", "bpsk"], "channel": ["awgn", "rayleigh"],
+             "demapping": "exact", "rv": [0, 2]},
+            ["--block-size", "104", "--code-rate", "3/4", "--modulation", "16qam,bpsk", "--channel", "awgn,rayleigh",
+             "--demapping", "exact", "--rv", "0,2"],
+        ),
+        (
+            {"transport_block": [90, 6200], "code_rate": 0.5, "modulation": "qpsk", "channel": "rayleigh-block",
+             "harq": 3, "stop": "crc"},
+            ["--transport-block", "90,6200", "--code-rate", "1/2", "--modulation", "qpsk",
+             "--channel", "rayleigh-block", "--harq", "3", "--stop", "crc"],
+        ),
+    ):  # fmt: skip
+        file = tmp_path / "theirs.json"
+        result = quarzel.sweep([1.0, 4.0], max_blocks=40, **ours)
+        subprocess.run([tool, "sweep", "--ebn0", "1,4", "--max-blocks", "40", *theirs, "-o", file],
+                       check=True, capture_output=True)  # fmt: skip
+        assert file.read_text() == result.text
+        file.unlink()
+
+
+def test_a_coded_link_is_told():
+    result = quarzel.sweep([2.0], transport_block=90, code_rate=0.5, harq=2, stop="crc", max_blocks=50)
+    (curve,) = result.curves
+    assert (curve.information_bits, curve.coded_bits, curve.redundancy_versions, curve.stop) == (90, 180, (0, 2), "crc")
+    assert str(curve) == "A = 90, 2 units, scaled-max-log, 6 iterations, llr 4, 180 coded bits, rv 0 2, stop crc"
+    (point,) = curve.points
+    assert len(point.transmissions) == 2 and point.transmissions[-1]["block_errors"] == point.block_errors
+    assert len(point.iterations_used) == 6 and 1 <= point.mean_iterations <= 6
+    assert 0 < point.throughput <= 0.5
+
+
+def test_stored_coded_links_are_read():
+    data = Path(__file__).parents[2] / "sweep" / "data"
+    curves = quarzel.SweepResult.read(data / "coded_links.json").curves
+    assert {"bpsk", "16qam", "256qam"} <= {curve.modulation for curve in curves}
+    assert {(curve.demapping, len(curve.redundancy_versions)) for curve in curves} == {("exact", 3)}
+    assert all(curve.transport_block for curve in quarzel.SweepResult.read(data / "transport_blocks.json").curves)
+
+
 def test_a_result_of_an_older_version_is_read():
     old = quarzel.SweepResult.read(Path(__file__).parents[2] / "sweep" / "data" / "small_sweep.json")
     assert json.loads(old.text)["version"] == 2
@@ -109,6 +151,16 @@ def test_errors_after_each_iteration():
         ({"ebn0_db": []}, "no Eb/N0"),
         ({"ebn0_db": [100]}, "outside -20 to 40 dB"),
         ({"ebn0_db": [float("nan")]}, "finite"),
+        ({"modulation": "8psk"}, "there is no modulation '8psk'; choose bpsk, qpsk, 16qam, 64qam, 256qam"),
+        ({"channel": ["awgn", 1]}, "there is no channel 1; choose awgn, rayleigh, rayleigh-block"),
+        ({"demapping": "none"}, "there is no demapping 'none'; choose maxlog, exact"),
+        ({"code_rate": 1.5}, "a code rate is above 0 and up to 1"),
+        ({"coded_bits": 0}, "coded_bits must be a number from 1 to 16777216, not 0"),
+        ({"transport_block": 40}, "coded bits of a transmission are not told; give code_rate or coded_bits"),
+        ({"transport_block": 40, "block_size": 40, "code_rate": 0.5}, "leave out block_size"),
+        ({"stop": "crc"}, "code blocks alone have no CRC to stop at; give transport blocks"),
+        ({"rv": 4}, "rv must be a number from 0 to 3, not 4"),
+        ({"harq": 0}, "harq must be a number from 1 to 32, not 0"),
     ],
 )
 def test_refuses_what_is_not_possible(arguments, text):
@@ -144,7 +196,10 @@ def test_a_table_has_a_row_for_each_point(result):
         assert (row.bit_errors, row.bler, row.bler_low, row.bler_high) == (
             point.bit_errors, point.bler, *point.bler_interval
         )  # fmt: skip
-    assert "per_iteration" not in table
+    assert not {"per_iteration", "modulation", "throughput"} & set(table)
+    coded = quarzel.sweep(3.0, modulation=["qpsk", "bpsk"], harq=2, max_blocks=8).to_dataframe()
+    assert list(coded["modulation"]) == ["bpsk", "qpsk"]
+    assert (coded["throughput"] > 0).all() and "transmissions" not in coded
 
 
 def test_a_table_without_pandas_says_what_it_needs(result, monkeypatch):

@@ -1,6 +1,6 @@
 // SPDX-License-Identifier: MIT
 // Decodes with dynamic, fixed and open arrays and with scalars, the encoder, tags, traces, warnings and refusals. With
-// +refused it ends with a wrong call of the class, which must stop the simulation.
+// +refused or +too_long it ends with a wrong call of the class, which must stop the simulation.
 
 module dpi_calls_test;
   import quarzel_pkg::*;
@@ -13,6 +13,7 @@ module dpi_calls_test;
   byte soft0[], soft1[], soft2[], none[];
   byte fixed0[K+4], fixed1[K+4], fixed2[K+4];
   quarzel_stream_t longest0, longest1, longest2;
+  quarzel_logic_stream_t logic0, logic1, logic2;
   quarzel_bits_t longest_bits;
   bit fixed_bits[K];
   bit too_few_bits[K-1];
@@ -46,6 +47,9 @@ module dpi_calls_test;
       longest0[i] = soft0[i];
       longest1[i] = soft1[i];
       longest2[i] = soft2[i];
+      logic0[i] = 32'(soft0[i]);
+      logic1[i] = 32'(soft1[i]);
+      logic2[i] = 32'(soft2[i]);
     end
     check(model.decode(soft0, soft1, soft2, decoded, 6, 32'h107) == K, "the class decodes dynamic arrays");
     check(decoded.size() == K, "the class sizes the bits");
@@ -66,6 +70,14 @@ module dpi_calls_test;
           "arrays of the greatest size");
     for (int i = 0; i < K; i++) if (longest_bits[i] != information[i]) $fatal(1, "bit %0d is wrong", i);
     check(quarzel_dpi_tag(handle) == 9, "the tag comes back");
+    for (int i = 0; i < K; i++) longest_bits[i] = 0;
+    check(quarzel_dpi_decode_logic(handle, K + 4, logic0, logic1, logic2, 3, 9, longest_bits) == K,
+          "arrays of four-valued integers");
+    for (int i = 0; i < K; i++) if (longest_bits[i] != information[i]) $fatal(1, "bit %0d is wrong", i);
+    for (int i = 0; i < K + 4; i++) quarzel_dpi_push(handle, int'(soft0[i]), int'(soft1[i]), int'(soft2[i]));
+    check(quarzel_dpi_run(handle, 3, 9) == K, "scalars");
+    for (int i = 0; i < K; i++)
+      if (quarzel_dpi_pop(handle) != int'(information[i])) $fatal(1, "bit %0d is wrong", i);
 
     // What is refused, with the remedy.
     check(quarzel_dpi_decode_open(handle, fixed0, fixed1, short_stream, 3, 0, fixed_bits) == -1, "other sizes");
@@ -91,6 +103,10 @@ module dpi_calls_test;
     handle = quarzel_dpi_open(3, 1, 8);
     $display("%s", quarzel_dpi_error(handle));
 
+    if ($test$plusargs("too_long")) begin
+      for (int i = 0; i < QUARZEL_MAX_POSITIONS + 1; i++) model.push(0, 0, 0);
+      void'(model.run());
+    end
     if ($test$plusargs("refused")) void'(model.decode(soft0, soft1, none, decoded));
     model.close();
     $finish;

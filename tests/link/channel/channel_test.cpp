@@ -13,6 +13,7 @@
 namespace {
 
 using namespace quarzel::link;
+using quarzel::test::Against;
 using quarzel::test::Counts;
 using quarzel::test::deviation;
 using quarzel::test::placeOf;
@@ -108,7 +109,7 @@ TEST(Channel, DrawsWhatFloatingPointGivesForEveryModulation) {
         }
         for (std::size_t bit = 0; bit < drawn.size(); ++bit) {
             for (const std::size_t value : {0U, 1U}) {
-                EXPECT_LT(deviation(drawn[bit][value], expected[bit][value], 2), 5)
+                EXPECT_LT(deviation(drawn[bit][value], expected[bit][value], Against::draw), 5)
                     << "Qm " << drawn.size() << " fading " << static_cast<int>(one.setup.fading)
                     << " demapping " << static_cast<int>(one.setup.demapping) << " scale "
                     << one.setup.quantiser.scale << " bit " << bit << " of " << value;

@@ -62,16 +62,22 @@ void writeBits(const std::string& file, const PackedBits& bits) {
     writeOutput(file, npyOf(bits));
 }
 
-BitErrors countErrors(const PackedBits& decided, const PackedBits& sent) {
+BitErrors findErrors(const PackedBits& decided, const PackedBits& sent) {
     BitErrors errors;
     for (std::size_t block = 0; block < sent.blocks(); ++block) {
-        std::size_t bits = 0;
-        for (std::size_t i = block * sent.bytesPerBlock; i < (block + 1) * sent.bytesPerBlock; ++i) {
-            bits += static_cast<std::size_t>(
-                std::popcount(static_cast<std::uint8_t>(decided.bytes[i] ^ sent.bytes[i])));
+        WrongBlock wrong{block, 0, 0};
+        for (std::size_t i = 0; i < sent.bytesPerBlock; ++i) {
+            const std::size_t at = block * sent.bytesPerBlock + i;
+            const auto differing = static_cast<std::uint8_t>(decided.bytes[at] ^ sent.bytes[at]);
+            if (differing != 0 && wrong.bits == 0) {
+                wrong.firstBit = 8 * i + static_cast<std::size_t>(std::countl_zero(differing));
+            }
+            wrong.bits += static_cast<std::size_t>(std::popcount(differing));
         }
-        errors.bits += bits;
-        errors.blocks += bits > 0 ? 1 : 0;
+        if (wrong.bits > 0) {
+            errors.bits += wrong.bits;
+            errors.blocks.push_back(wrong);
+        }
     }
     return errors;
 }

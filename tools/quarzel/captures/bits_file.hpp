@@ -44,13 +44,20 @@ std::string npyOf(const PackedBits& bits);
 /// @throws ToolError when that fails
 void writeBits(const std::string& file, const PackedBits& bits);
 
-/// How two sets of blocks differ.
-struct BitErrors {
-    std::size_t bits = 0;    ///< bits that differ
-    std::size_t blocks = 0;  ///< blocks with a bit that differs
+/// A block that differs from another one.
+struct WrongBlock {
+    std::size_t block;     ///< from 0
+    std::size_t bits;      ///< that differ
+    std::size_t firstBit;  ///< the first of them, from 0
 };
 
-/// Count the differences of two sets of the same shape.
-BitErrors countErrors(const PackedBits& decided, const PackedBits& sent);
+/// How two sets of blocks differ.
+struct BitErrors {
+    std::size_t bits = 0;            ///< bits that differ
+    std::vector<WrongBlock> blocks;  ///< those with a bit that differs, in ascending order
+};
+
+/// Find the differences of two sets of the same shape.
+BitErrors findErrors(const PackedBits& decided, const PackedBits& sent);
 
 }  // namespace quarzel::tool

@@ -97,10 +97,11 @@ struct OpenBlock {
         if (capture.soft.empty()) {
             capture.blockSize = K;
         } else if (K != capture.blockSize) {
-            throw fileError(file,
-                            fmt::format("line {}: block {} has {} positions, the blocks before have {}",
-                                        firstLine, capture.blocks() + 1, positions, capture.positions()),
-                            "give blocks of one size a file");
+            throw fileError(
+                file,
+                fmt::format("line {}: block {}, counted from 0, has {} positions, the blocks before have {}",
+                            firstLine, capture.blocks(), positions, capture.positions()),
+                "give blocks of one size a file");
         }
         for (std::vector<std::int32_t>& stream : streams) {
             capture.soft.insert(capture.soft.end(), stream.begin(), stream.end());

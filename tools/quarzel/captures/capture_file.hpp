@@ -38,4 +38,8 @@ struct Capture {
 /// @throws ToolError when it is not well-formed, holds no block or has a K that LTE does not have
 Capture readCapture(std::istream& stream, const std::string& file, std::optional<double> scale = {});
 
+/// The bytes of an npy file of shape (blocks, 3, K + 4) that holds soft values of 8 bits.
+/// @param soft  blocks of 3 (K + 4) values each
+std::string softNpy(std::span<const std::int8_t> soft, std::uint32_t K);
+
 }  // namespace quarzel::tool

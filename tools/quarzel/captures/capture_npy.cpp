@@ -5,6 +5,8 @@
 #include <array>
 #include <concepts>
 #include <cstdint>
+#include <xtensor/xadapt.hpp>
+#include <xtensor/xnpy.hpp>
 
 #include "captures/capture_readers.hpp"
 #include "captures/npy_header.hpp"
@@ -26,7 +28,7 @@ std::vector<std::int32_t> readBlocks(std::istream& stream, std::uint64_t count, 
     const auto bytes = static_cast<std::streamsize>(values * sizeof(Element));
     for (std::uint64_t block = 0; block < count; ++block) {
         if (!stream.read(reinterpret_cast<char*>(elements.data()), bytes)) {
-            throw fileError(file, fmt::format("ends within block {} of {}", block + 1, count),
+            throw fileError(file, fmt::format("ends within block {} of 0 to {}", block, count - 1),
                             "copy it again, it was cut short");
         }
         if constexpr (std::floating_point<Element>) {
@@ -34,10 +36,10 @@ std::vector<std::int32_t> readBlocks(std::istream& stream, std::uint64_t count, 
             try {
                 quantise(elements, quantised, scale);
             } catch (const std::invalid_argument&) {
-                throw fileError(
-                    file,
-                    fmt::format("block {} of {} has values that are not a number (NaN)", block + 1, count),
-                    "give 0 for a bit that is unknown");
+                throw fileError(file,
+                                fmt::format("block {} of 0 to {} has values that are not a number (NaN)",
+                                            block, count - 1),
+                                "give 0 for a bit that is unknown");
             }
             soft.insert(soft.end(), quantised.begin(), quantised.end());
         } else {
@@ -99,6 +101,12 @@ Capture readNpyCapture(std::istream& stream, const std::string& file, std::optio
         type.read(stream, header.shape[0], 3 * capture.positions(), file, scale.value_or(llrScale));
     requireEnd(stream, file);
     return capture;
+}
+
+std::string softNpy(std::span<const std::int8_t> soft, std::uint32_t K) {
+    const std::size_t positions = K + tailPositions;
+    const std::array<std::size_t, 3> shape = {soft.size() / (3 * positions), 3, positions};
+    return xt::dump_npy(xt::adapt(soft.data(), soft.size(), xt::no_ownership(), shape));
 }
 
 }  // namespace quarzel::tool

@@ -35,8 +35,9 @@ std::size_t littleEndian(std::string_view bytes) {
     return value;
 }
 
-/// Takes a header's text apart: a Python dictionary of a string, a truth value and a tuple of integers. The
-/// functions that return bool tell whether the text goes on as asked for, and step over it if it does.
+/// Takes a header's text apart: a Python dictionary of a string or a list of fields, a truth value and a
+/// tuple of integers. The functions that return bool tell whether the text goes on as asked for, and step
+/// over it if it does.
 class HeaderScanner {
   public:
     explicit HeaderScanner(std::string_view text) : itsRest(text) {}
@@ -46,13 +47,15 @@ class HeaderScanner {
         std::optional<std::string> type;
         std::optional<bool> fortranOrder;
         std::optional<std::vector<std::uint64_t>> shape;
+        std::vector<NpyField> fields;
         if (!skip("{")) {
             return {};
         }
         while (!skip("}")) {
             bool understood = false;
             if (skip("'descr'") && skip(":")) {
-                understood = (type = quoted()).has_value();
+                type = next("[") ? "record" : quoted();
+                understood = type && (*type != "record" || takeFields(fields));
             } else if (skip("'fortran_order'") && skip(":")) {
                 understood = (fortranOrder = truth()).has_value();
             } else if (skip("'shape'") && skip(":")) {
@@ -66,7 +69,7 @@ class HeaderScanner {
         if (!itsRest.empty() || !type || !fortranOrder || !shape) {
             return {};
         }
-        return NpyHeader{*type, *fortranOrder, *shape};
+        return NpyHeader{*type, *fortranOrder, *shape, fields};
     }
 
   private:
@@ -92,6 +95,27 @@ class HeaderScanner {
         const std::string_view text = itsRest.substr(0, itsRest.find('\''));
         itsRest.remove_prefix(text.size());
         return skip("'") ? std::optional(std::string(text)) : std::nullopt;
+    }
+
+    /// The fields of a structured array: a list of tuples of name, type and maybe shape.
+    bool takeFields(std::vector<NpyField>& fields) {
+        if (!skip("[")) {
+            return false;
+        }
+        while (!skip("]")) {
+            const bool isOpen = skip("(");
+            const std::optional<std::string> name = isOpen ? quoted() : std::nullopt;
+            const std::optional<std::string> type = name && skip(",") ? quoted() : std::nullopt;
+            auto shape = std::optional(std::vector<std::uint64_t>());
+            if (type && skip(",")) {
+                shape = tuple();
+            }
+            if (!type || !shape || !skip(")") || !(skip(",") || next("]"))) {
+                return false;
+            }
+            fields.push_back({*name, *type, *shape});
+        }
+        return true;
     }
 
     std::optional<bool> truth() {

@@ -8,11 +8,20 @@
 
 namespace quarzel::tool {
 
+/// A field of the elements of a structured array.
+struct NpyField {
+    std::string name;
+    std::string type;                  ///< as numpy spells it
+    std::vector<std::uint64_t> shape;  ///< of the values in an element; empty: one value
+};
+
 /// What the header of an npy file says about the array that follows it.
 struct NpyHeader {
-    std::string type;  ///< element type as numpy spells it, "<i2" for example
+    std::string
+        type;  ///< element type as numpy spells it, "<i2" for example; "record" for a structured array
     bool fortranOrder;
     std::vector<std::uint64_t> shape;
+    std::vector<NpyField> fields;  ///< of a structured array
 };
 
 /// Whether an input is an npy file: by its name, or by its first byte, with which no text begins.

@@ -9,12 +9,12 @@
 #include <memory>
 #include <optional>
 #include <string>
-#include <string_view>
 
 #include "captures/bits_file.hpp"
 #include "captures/capture_file.hpp"
 #include "decode/decode_report.hpp"
 #include "decode/decode_together.hpp"
+#include "decode/decode_traced.hpp"
 #include "decode/progress.hpp"
 #include "files/input_file.hpp"
 #include "files/output_file.hpp"
@@ -65,20 +65,22 @@ Files:
            highest, as numpy.packbits(bits, axis=1) makes them.
   OUT      the same. It is written whole or not at all. With - it goes to
            standard output, and the report to standard error.
-  FILE     every value of every trellis step of the passes traced, as text for
-           'quarzel trace-diff' or as rows of block, pass, step, signal, state,
-           raw and real value. It is written whole or not at all, too.
+  FILE     every value of every trellis step of the passes traced: as text, as
+           rows of block, pass, step, signal, state, raw and real value, or as
+           waves. It is written whole or not at all, too. 'quarzel trace-diff'
+           compares it with another.
 
 Examples:
   quarzel decode capture.npy --units 8 --reference sent.npy -o decided.npy
-  quarzel decode capture.npy --units 8 --trace 12 --trace-block 5
+  quarzel decode capture.npy --units 8 --trace 12 --trace-block 4
   quarzel decode ratios.npy --llr 4
 
   The first decodes capture.npy as a core with 8 processing units does, compares
   the decisions with the bits that were sent and keeps them in decided.npy. Bit
-  errors are a result, not a failure: the exit code is 0. The second prints the
-  trace of 12 passes, which are 6 iterations, of the fifth block. The third
-  decodes log-likelihood ratios.
+  errors are a result, not a failure: the exit code is 0. The report names the
+  wrong blocks, the first ten or, with --json, all. The second prints the trace
+  of 12 passes, which are 6 iterations, of the fifth block: blocks, passes and
+  steps count from 0. The third decodes log-likelihood ratios.
 )";
 
 /// Throw when the file could not be written, or writing it would replace a file that is read.
@@ -126,40 +128,17 @@ std::unique_ptr<TraceFile> openTrace(const Capture& capture, const DecodeOptions
     if (!trace.passes) {
         return nullptr;
     }
-    if (trace.block > capture.blocks()) {
+    if (trace.block >= capture.blocks()) {
         throw ToolError(ExitCode::usage, "--trace-block",
                         fmt::format("{} has no block {}", options.capture, trace.block),
-                        fmt::format("give a number from 1 to {}", capture.blocks()));
+                        fmt::format("give a number from 0 to {}", capture.blocks() - 1));
     }
     return std::make_unique<TraceFile>(trace, results);
 }
 
-/// Decode one block after the other and trace what the user wants traced.
-PackedBits decodeTraced(const Capture& capture, const DecodeOptions& options, TraceFile& trace,
-                        Progress& progress) {
-    Core core = coreOf(options.core);
-    core.onMessage([&trace](MessageKind kind, std::string_view text) {
-        if (kind == MessageKind::trace) {
-            trace.writeLine(text);
-        } else {
-            std::cerr << fmt::format("{}\n", text);
-        }
-    });
-    PackedBits decisions(capture.blocks(), capture.blockSize);
-    for (std::size_t block = 0; block < capture.blocks(); ++block) {
-        if (block + 1 == options.trace.block) {
-            trace.start(core);
-        }
-        decodePart(core, capture, block, 1, options.core.iterations, decisions);
-        progress.update(block + 1);
-    }
-    trace.finish();
-    return decisions;
-}
-
 PackedBits decodeBlocks(const Capture& capture, const DecodeOptions& options, TraceFile* trace) {
     Progress progress(std::cerr, ::isatty(STDERR_FILENO) != 0, capture.blocks());
-    return trace != nullptr ? decodeTraced(capture, options, *trace, progress)
+    return trace != nullptr ? decodeTraced(capture, options.core, options.trace.block, *trace, progress)
                             : decodeTogether(capture, options.core, options.threads, progress);
 }
 
@@ -184,7 +163,7 @@ void decode(const DecodeOptions& options, std::ostream& results) {
     DecodeReport report{options.capture,  capture.blockSize, options.core,
                         capture.blocks(), duration.count(),  {}};
     if (reference) {
-        report.errors = countErrors(decisions, *reference);
+        report.errors = findErrors(decisions, *reference);
     }
     // Standard output that holds a trace or the decisions holds nothing else.
     const bool isTaken = (trace != nullptr && options.trace.isToStandardOutput()) ||
@@ -201,7 +180,7 @@ void addDecodeCommand(CLI::App& app, std::ostream& results) {
     command->add_option("CAPTURE", options->capture, "Soft values to decode")->required()->type_name("");
     addRealNumberOptions(*command, options->scale);
     addCoreOptions(*command, options->core);
-    command->add_option("--reference", options->reference, "Count errors against the bits in this file")
+    command->add_option("--reference", options->reference, "Find errors: compare with the bits in this file")
         ->type_name("BITS");
     command->add_option("-o,--output", options->output, "Write the decided bits to this file")
         ->type_name("OUT");

@@ -65,8 +65,9 @@ void decodePart(Core& core, const Capture& capture, std::size_t first, std::size
     try {
         core.decode(capture.part(first, count), iterations, bits);
     } catch (const Error& error) {
-        throw decodingError(
-            capture.file, fmt::format("block {} of {}", first + error.block() + 1, capture.blocks()), error);
+        throw decodingError(capture.file,
+                            fmt::format("block {} of 0 to {}", first + error.block(), capture.blocks() - 1),
+                            error);
     }
     for (std::size_t i = 0; i < count; ++i) {
         decisions.set(first + i, bits.data() + i * K);

@@ -7,29 +7,34 @@
 
 namespace quarzel::tool {
 
-/// A bar that tells the user of a terminal how far long work has come. It appears after a second and is wiped
-/// at the end.
+/// Tells how far long work has come: on a terminal by a bar, which appears after a second and is wiped at the
+/// end; elsewhere by a line a minute.
 class Progress {
   public:
     using Clock = std::chrono::steady_clock;
 
-    /// @param terminal  where the bar is drawn
-    /// @param visible   whether it is drawn at all
-    /// @param total     blocks that there are to decode, at least 1
-    Progress(std::ostream& terminal, bool visible, std::size_t total, Clock::time_point start = Clock::now());
+    /// @param stream      where it is told
+    /// @param isTerminal  whether that is a terminal
+    /// @param total       blocks that there are to decode, at least 1
+    Progress(std::ostream& stream, bool isTerminal, std::size_t total,
+             Clock::time_point start = Clock::now());
     Progress(const Progress&) = delete;
     Progress& operator=(const Progress&) = delete;
     ~Progress();
 
-    /// Tell that `done` of the blocks are decoded. Cheap: draws ten times a second at most.
+    /// Tell that `done` of the blocks are decoded. Cheap: tells it ten times a second at most.
     void update(std::size_t done, Clock::time_point now = Clock::now());
 
   private:
-    std::ostream& itsTerminal;
-    bool itsVisible;
+    void draw(std::size_t done);
+    void log(std::size_t done, double seconds);
+
+    std::ostream& itsStream;
+    bool itsIsTerminal;
     std::size_t itsTotal;
-    Clock::time_point itsNextDrawing;
-    bool itsDrawn = false;
+    Clock::time_point itsStart;
+    Clock::time_point itsNextTime;
+    bool itsIsDrawn = false;
 };
 
 }  // namespace quarzel::tool

@@ -15,6 +15,7 @@
 #include <thread>
 
 #include "files/open_file.hpp"
+#include "files/output_file.hpp"
 #include "tool_error.hpp"
 
 namespace quarzel::tool {
@@ -100,6 +101,10 @@ FileLock::FileLock(const std::string& file)
 FileLock::~FileLock() {
     ::unlink(itsName.c_str());
     ::close(itsDescriptor);
+}
+
+std::unique_ptr<FileLock> lockOutput(const std::optional<std::string>& output) {
+    return output && isWhole(*output) ? std::make_unique<FileLock>(*output) : nullptr;
 }
 
 }  // namespace quarzel::tool

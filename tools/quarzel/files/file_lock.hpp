@@ -1,6 +1,8 @@
 // SPDX-License-Identifier: MIT
 #pragma once
 
+#include <memory>
+#include <optional>
 #include <string>
 
 namespace quarzel::tool {
@@ -21,5 +23,10 @@ class FileLock {
     std::string itsName;
     int itsDescriptor;
 };
+
+/// Keep other commands that extend an output from it.
+/// @return the lock; null where there is no output, or none that is a file
+/// @throws ToolError when another process holds it
+std::unique_ptr<FileLock> lockOutput(const std::optional<std::string>& output);
 
 }  // namespace quarzel::tool

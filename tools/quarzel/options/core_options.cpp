@@ -44,7 +44,7 @@ Core coreOf(const CoreOptions& options) {
     return core;
 }
 
-void addCoreOptions(CLI::App& command, CoreOptions& options) {
+void addModelOptions(CLI::App& command, CoreOptions& options) {
     const auto add = [&command](const char* name, int& value, const char* text, const CLI::Validator& check) {
         command.add_option(name, value, fmt::format("{} (default {})", text, value))
             ->type_name("N")
@@ -55,6 +55,10 @@ void addCoreOptions(CLI::App& command, CoreOptions& options) {
         "0 max-log, 1 scaled-max-log (extrinsic values\nscaled by 0.75), 2 max-star; number or name",
         algorithmCheck());
     add("--iterations", options.iterations, "Iterations, 1 to 15; every one of them runs", iterationsCheck());
+}
+
+void addCoreOptions(CLI::App& command, CoreOptions& options) {
+    addModelOptions(command, options);
     const std::vector<std::string> names = implementations();
     command
         .add_option(

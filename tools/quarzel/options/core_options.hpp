@@ -24,7 +24,11 @@ CLI::Validator unitsCheck();
 CLI::Validator algorithmCheck();
 CLI::Validator iterationsCheck();
 
-/// Add --units, --algorithm, --iterations and --implementation to a command.
+/// Add --units, --algorithm and --iterations to a command.
+/// @param options  holds the defaults and receives the choice; must outlive the parse
+void addModelOptions(CLI::App& command, CoreOptions& options);
+
+/// Add the same and --implementation to a command.
 /// @param options  holds the defaults and receives the choice; must outlive the parse
 void addCoreOptions(CLI::App& command, CoreOptions& options);
 

@@ -20,7 +20,9 @@ using Field = std::function<std::string(const SweepCurve&)>;
 
 /// What may differ, in the order in which it is told.
 const std::array<Field, 6> fields = {
-    [](const SweepCurve& curve) { return fmt::format("K = {}", curve.blockSize); },
+    [](const SweepCurve& curve) {
+        return fmt::format("{} = {}", curve.isTransportBlock ? "A" : "K", curve.blockSize);
+    },
     [](const SweepCurve& curve) { return fmt::format("{} units", curve.units); },
     [](const SweepCurve& curve) {
         return std::string(algorithms.at(static_cast<std::size_t>(curve.algorithm)));
@@ -28,7 +30,11 @@ const std::array<Field, 6> fields = {
     [](const SweepCurve& curve) {
         return counted(static_cast<std::size_t>(curve.iterations), "iteration", "iterations");
     },
-    [](const SweepCurve& curve) { return curve.quantiser; },
+    [](const SweepCurve& curve) {
+        return fmt::format("{} \u00d7 {}",
+                           curve.quantiser.kind == link::Quantiser::Kind::llr ? "LLR" : "amplitude",
+                           curve.quantiser.scale);
+    },
     [](const SweepCurve& curve) { return curve.sending; },
 };
 

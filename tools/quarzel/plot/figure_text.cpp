@@ -3,8 +3,9 @@
 
 #include <fmt/format.h>
 
-#include <nlohmann/json.hpp>
 #include <string_view>
+
+#include "report_text.hpp"
 
 namespace quarzel::tool {
 
@@ -54,17 +55,10 @@ std::string takeLine(std::string_view& text, double width) {
 }  // namespace
 
 std::string mendedText(const std::string& text) {
-    using Json = nlohmann::json;
-    std::string mended =
-        Json::parse(Json(text).dump(-1, ' ', false, Json::error_handler_t::replace)).get<std::string>();
+    std::string mended = validText(text);
     for (char& c : mended) {
         if (static_cast<unsigned char>(c) < ' ' || c == '\x7f') {
             c = ' ';
-        }
-    }
-    for (const char* const none : {"\xef\xbf\xbe", "\xef\xbf\xbf"}) {  // U+FFFE and U+FFFF, which XML forbids
-        for (std::size_t at = 0; (at = mended.find(none, at)) != std::string::npos;) {
-            mended.replace(at, 3, "\xef\xbf\xbd");
         }
     }
     return mended;

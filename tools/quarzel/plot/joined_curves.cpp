@@ -10,8 +10,8 @@ namespace quarzel::tool {
 namespace {
 
 auto setupOf(const SweepCurve& curve) {
-    return std::tie(curve.blockSize, curve.units, curve.algorithm, curve.iterations, curve.quantiser,
-                    curve.sending, curve.bitsPerSymbol);
+    return std::tie(curve.isTransportBlock, curve.blockSize, curve.units, curve.algorithm, curve.iterations,
+                    curve.quantiser, curve.sending, curve.bitsPerSymbol);
 }
 
 std::vector<MeasuredPoint>::iterator pointAt(SweepCurve& curve, double ebN0) {

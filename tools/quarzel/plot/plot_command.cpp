@@ -7,6 +7,7 @@
 #include <filesystem>
 #include <functional>
 #include <memory>
+#include <nlohmann/json.hpp>
 #include <string>
 #include <tuple>
 #include <utility>
@@ -16,6 +17,7 @@
 #include "options/choices.hpp"
 #include "options/core_options.hpp"
 #include "options/list_option.hpp"
+#include "options/quantiser_options.hpp"
 #include "options/whole_number.hpp"
 #include "plot/figure_options.hpp"
 #include "plot/gnuplot.hpp"
@@ -98,7 +100,22 @@ void checkOutputs(const PlotOptions& options) {
     }
 }
 
-void plot(PlotOptions& options) {
+/// Tell what is drawn. All panels have the same curves.
+void printJson(std::ostream& stream, const PlotOptions& options, const Picture& picture) {
+    using Json = nlohmann::ordered_json;
+    Json object = {{"picture", options.output},
+                   {"csv", options.csv.empty() ? Json() : Json(options.csv)},
+                   {"title", picture.title},
+                   {"panels", options.picture.panels},
+                   {"curves", Json::array()}};
+    for (const DrawnCurve& curve : picture.panels.front().curves) {
+        object["curves"].push_back({{"label", curve.label}, {"kind", nameOf(curve.kind)}});
+    }
+    // Names and labels need not be UTF-8; what is not becomes U+FFFD.
+    stream << object.dump(-1, ' ', false, Json::error_handler_t::replace) << '\n';
+}
+
+void plot(PlotOptions& options, std::ostream& results) {
     const std::string terminal = terminalOf(options.output);
     if (options.figure.yLabel && options.picture.panels.size() > 1) {
         throw ToolError(ExitCode::usage, "--y-label", "there are two vertical axes",
@@ -118,11 +135,14 @@ void plot(PlotOptions& options) {
         writeOutput(options.csv, pictureCsv(picture, axesOf(picture, options.figure)));
     }
     writeOutput(options.output, drawn);
+    if (options.json) {
+        printJson(results, options, picture);
+    }
 }
 
 }  // namespace
 
-void addPlotCommand(CLI::App& app) {
+void addPlotCommand(CLI::App& app, std::ostream& results) {
     auto options = std::make_shared<PlotOptions>();
     CLI::App* command = app.add_subcommand("plot", description)->group("Commands");
     command->footer(std::string(footer) + '\n' + exitCodesHelp);
@@ -141,6 +161,8 @@ void addPlotCommand(CLI::App& app) {
                   unitsCheck());
     addListOption(*command, "--algorithm", options->algorithms, "Draw only curves of these algorithms",
                   "N,...", algorithmCheck());
+    addListOption(*command, "--llr", options->llrScales, "Draw only curves of these factors of --llr",
+                  "S,...", scaleCheck());
     addListOption(*command, "--iterations", options->iterations,
                   "Draw only curves of these numbers of\niterations; with --per-iteration, only these lines",
                   "N,...", iterationsCheck());
@@ -173,7 +195,8 @@ void addPlotCommand(CLI::App& app) {
         ->allow_extra_args(false)
         ->check(anyText());
     addFigureOptions(*command, options->figure);
-    command->callback([options] { plot(*options); });
+    command->add_flag("--json", options->json, "Print what is drawn as one JSON object");
+    command->callback([options, &results] { plot(*options, results); });
 }
 
 }  // namespace quarzel::tool

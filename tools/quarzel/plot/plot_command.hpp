@@ -2,10 +2,12 @@
 #pragma once
 
 #include <CLI/CLI.hpp>
+#include <ostream>
 
 namespace quarzel::tool {
 
 /// Add `quarzel plot`, which draws the error rates of stored sweeps.
-void addPlotCommand(CLI::App& app);
+/// @param results  where it tells what it has drawn; must outlive the parse
+void addPlotCommand(CLI::App& app, std::ostream& results);
 
 }  // namespace quarzel::tool

@@ -19,11 +19,16 @@ bool isWanted(const std::vector<Value>& wanted, Value value) {
     return wanted.empty() || std::find(wanted.begin(), wanted.end(), value) != wanted.end();
 }
 
+bool isWantedQuantiser(const std::vector<double>& llrScales, const link::Quantiser& quantiser) {
+    return isWanted(llrScales, quantiser.scale) &&
+           (llrScales.empty() || quantiser.kind == link::Quantiser::Kind::llr);
+}
+
 /// Leave out the curves that differ from the longest in their iterations alone, which it contains.
 void keepLongest(std::vector<SweepCurve>& curves) {
     const auto setupOf = [](const SweepCurve& curve) {
-        return std::tie(curve.blockSize, curve.units, curve.algorithm, curve.quantiser, curve.sending,
-                        curve.seed);
+        return std::tie(curve.isTransportBlock, curve.blockSize, curve.units, curve.algorithm,
+                        curve.quantiser, curve.sending, curve.seed);
     };
     const SweepCurve longest = *std::max_element(
         curves.begin(), curves.end(),
@@ -39,6 +44,7 @@ std::vector<SweepCurve> allCurves(const PlotOptions& options) {
         for (SweepCurve& curve : readSweepCurves(result)) {
             if (isWanted(options.blockSizes, curve.blockSize) && isWanted(options.units, curve.units) &&
                 isWanted(options.algorithms, curve.algorithm) &&
+                isWantedQuantiser(options.llrScales, curve.quantiser) &&
                 (options.picture.perIteration || isWanted(options.iterations, curve.iterations))) {
                 curves.push_back(std::move(curve));
             }
@@ -46,7 +52,7 @@ std::vector<SweepCurve> allCurves(const PlotOptions& options) {
     }
     if (curves.empty()) {
         throw ToolError(ExitCode::usage, "", "the results have no curve that was asked for",
-                        "leave out --block-size, --units, --algorithm and --iterations");
+                        "leave out --block-size, --units, --algorithm, --llr and --iterations");
     }
     return joinedCurves(std::move(curves));
 }
@@ -55,7 +61,7 @@ std::vector<SweepCurve> allCurves(const PlotOptions& options) {
 void checkIterations(const PlotOptions& options, const std::vector<SweepCurve>& curves) {
     if (curves.size() > 1) {
         throw ToolError(ExitCode::usage, "--per-iteration", fmt::format("there are {} curves", curves.size()),
-                        "choose one with --block-size, --units and --algorithm");
+                        "choose one with --block-size, --units, --algorithm and --llr");
     }
     const SweepCurve& curve = curves.front();
     for (const int iteration : options.iterations) {

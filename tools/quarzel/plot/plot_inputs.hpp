@@ -21,9 +21,11 @@ struct PlotOptions {
     std::vector<std::uint32_t> blockSizes;
     std::vector<int> units;
     std::vector<int> algorithms;
+    std::vector<double> llrScales;
     std::vector<int> iterations;  ///< of curves; with perIteration the lines of one
     PictureChoice picture;
     FigureChoice figure;
+    bool json = false;  ///< tell what is drawn
 };
 
 /// The curves of all results that the user wants, at least one.

@@ -1,8 +1,6 @@
 // SPDX-License-Identifier: MIT
 #include "plot/sweep_curves.hpp"
 
-#include <fmt/format.h>
-
 #include <iterator>
 
 #include "files/input_file.hpp"
@@ -22,9 +20,10 @@ double bitsPerSymbol(const sweep::Setup& setup) {
                : static_cast<double>(setup.informationBits()) / setup.codedBits() * bits;
 }
 
-/// Without the comma that comes before it elsewhere.
-std::string sendingOf(const sweep::Setup& setup) {
-    const std::string text = sweep::sendingText(setup.sending);
+/// Without the size of transport blocks, and without the comma that comes before it elsewhere.
+std::string sendingOf(sweep::Sending sending) {
+    sending.transportBlock = 0;
+    const std::string text = sweep::sendingText(sending);
     return text.empty() ? text : text.substr(2);
 }
 
@@ -34,11 +33,6 @@ sweep::PointState drawnState(const sweep::Setup& setup, sweep::PointState point)
         point.counts = {point.last()};
     }
     return point;
-}
-
-std::string quantiserText(const link::Quantiser& quantiser) {
-    return fmt::format("{} \u00d7 {}", quantiser.kind == link::Quantiser::Kind::llr ? "LLR" : "amplitude",
-                       quantiser.scale);
 }
 
 }  // namespace
@@ -53,12 +47,13 @@ std::vector<SweepCurve> readSweepCurves(const std::string& file) {
         for (const auto& [setup, point] : result.points) {
             if (last == nullptr || !sweep::isSameCurve(setup, *last)) {
                 curves.push_back({file,
+                                  setup.sending.transportBlock != 0,
                                   setup.informationBits(),
                                   setup.units,
                                   setup.algorithm,
                                   setup.iterations,
-                                  quantiserText(setup.quantiser),
-                                  sendingOf(setup),
+                                  setup.quantiser,
+                                  sendingOf(setup.sending),
                                   result.seed,
                                   bitsPerSymbol(setup),
                                   {}});

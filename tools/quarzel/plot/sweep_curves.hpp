@@ -5,6 +5,7 @@
 #include <string>
 #include <vector>
 
+#include "link/channel_thresholds.hpp"
 #include "sweep/point_state.hpp"
 
 namespace quarzel::tool {
@@ -17,12 +18,13 @@ struct MeasuredPoint {
 /// A curve of a stored sweep and what it was measured with.
 struct SweepCurve {
     std::string file;
+    bool isTransportBlock;
     std::uint32_t blockSize;  ///< K, or A of transport blocks
     int units;
     int algorithm;
     int iterations;
-    std::string quantiser;  ///< for people: "LLR x 8"
-    std::string sending;    ///< for people: "2048 coded bits, qpsk"; empty for the default
+    link::Quantiser quantiser;
+    std::string sending;  ///< for people: "2048 coded bits, qpsk"; empty for the default
     std::uint64_t seed;
     double bitsPerSymbol;  ///< information bits that a symbol of the channel carries: Es/N0 over Eb/N0
     std::vector<MeasuredPoint> points;

@@ -9,6 +9,7 @@
 #include <string>
 #include <vector>
 
+#include "files/file_lock.hpp"
 #include "files/input_file.hpp"
 #include "files/output_file.hpp"
 #include "sweep/merge.hpp"
@@ -45,6 +46,9 @@ void mergeFiles(const Options& options, std::ostream& results) {
     std::error_code ignored;
     if (options.output) {
         probeOutput(*options.output);
+    }
+    const std::unique_ptr<FileLock> lock = lockOutput(options.output);
+    if (options.output) {
         const bool isGiven = std::any_of(files.begin(), files.end(), [&](const std::string& file) {
             return isSameFile(file, *options.output);
         });

@@ -15,6 +15,7 @@
 #include "options/whole_number.hpp"
 #include "report_text.hpp"
 #include "sweeps/checkpoint.hpp"
+#include "sweeps/failure_folder.hpp"
 #include "sweeps/sweep_files.hpp"
 #include "sweeps/sweep_options.hpp"
 #include "sweeps/sweep_table.hpp"
@@ -31,7 +32,8 @@ struct Options {
     std::optional<std::string> checkpoint;
     std::uint64_t checkpointSeconds = 30;
     bool resume = false;
-    unsigned threads = 0;  // the usual number
+    std::uint64_t keptFailures = 0;  // of each point
+    unsigned threads = 0;            // the usual number
     SweepForm form = SweepForm::table;
 
     bool isShard() const { return sweep.shard != "1/1"; }
@@ -72,7 +74,16 @@ Files:
   FILE        what is done so far, renewed while the sweep runs and when it is
               interrupted (SIGINT, SIGTERM, SIGHUP), removed once the result is
               in its place. --resume goes on from it, or begins at the beginning
-              when there is none. FILE.lock keeps other sweeps from it.
+              when there is none. FILE.lock and OUT.lock keep other
+              commands from them.
+
+  OUT.failures
+              with --keep-failures: captures of failing blocks, those with the
+              lowest numbers at each point of OUT, for 'quarzel decode'. For
+              each size and core NAME.soft.npy holds the soft values and
+              NAME.sent.npy the bits that were sent; failures.csv tells of each
+              row the seed, the point in OUT and the number of the block, all
+              counted from 0. 'quarzel rebuild' makes any block again.
 
 A sweep of more than a second tells on standard error how far it is: on a
 terminal as a growing table, elsewhere as a line for each point that has ended
@@ -103,6 +114,13 @@ void checkOptions(const Options& options, Checkpoint& checkpoint) {
     if (options.output) {
         probeOutput(*options.output);
     }
+    if (options.keptFailures != 0) {
+        if (!options.output || !isWhole(*options.output)) {
+            throw ToolError(ExitCode::usage, "--keep-failures", "there is no result to keep them beside",
+                            "name a file with -o");
+        }
+        FailureFolder(*options.output).probe();
+    }
     checkpoint.lock();
     if (!options.resume && checkpoint.exists()) {
         throw fileError(checkpoint.file(), "is the checkpoint of an interrupted sweep",
@@ -124,11 +142,23 @@ sweep::Result knownResult(const Options& options, const Checkpoint& checkpoint, 
     return known.result;
 }
 
+/// Keep the first failing blocks of each point beside the result, which is there.
+void keepFailures(const Options& options, const sweep::Result& result, const sweep::Dispatcher& dispatcher,
+                  const MakeWorkers& makeWorkers) {
+    if (options.keptFailures != 0) {
+        const FailingBlocks failing =
+            failingBlocksOf(result.points, dispatcher, *makeWorkers(options.threads));
+        FailureFolder(*options.output).write(result, failing);
+    }
+}
+
 /// The plan of a sweep that goes on from what is known.
 sweep::Plan planOf(const Options& options, const sweep::Configuration& configuration,
                    const sweep::Shard& shard, const sweep::Points& known) {
     try {
-        return sweep::planOf(configuration, shard, known);
+        sweep::Plan plan = sweep::planOf(configuration, shard, known);
+        plan.keptFailures = options.keptFailures;
+        return plan;
     } catch (const sweep::Error& error) {
         throw fileError(options.output.value_or(""), error.problem(), error.remedy());
     }
@@ -206,15 +236,13 @@ void runSweep(const Options& options, std::ostream& results, const MakeWorkers& 
     Checkpoint checkpoint(checkpointOf(options), std::chrono::seconds(options.checkpointSeconds), part);
     checkOptions(options, checkpoint);
     // What the output has meanwhile received would be lost, too.
-    std::optional<FileLock> lock;
-    if (options.checkpoint && options.output && isWhole(*options.output)) {
-        lock.emplace(*options.output);
-    }
+    const std::unique_ptr<FileLock> lock = lockOutput(options.output);
     sweep::Result result = knownResult(options, checkpoint, configuration.seed, part);
     sweep::Dispatcher dispatcher(planOf(options, configuration, shard, result.points));
     const bool isThere = !result.points.empty() && !checkpoint.exists();
     if (dispatcher.hasFinished() && isThere) {
         printResult(options, result, results);
+        keepFailures(options, result, dispatcher, makeWorkers);
         return;
     }
     bool isShown = false;
@@ -254,6 +282,7 @@ void runSweep(const Options& options, std::ostream& results, const MakeWorkers& 
     if (!options.output && results.flush()) {
         checkpoint.remove();
     }
+    keepFailures(options, result, dispatcher, makeWorkers);
 }
 
 }  // namespace
@@ -277,6 +306,12 @@ void addSweepCommand(CLI::App& app, std::ostream& results, MakeWorkers makeWorke
         ->type_name("SECONDS")
         ->transform(wholeNumber([](std::uint64_t n) { return n <= 86400; }, "a number from 0 to 86400"));
     command->add_flag("--resume", options->resume, "Go on where an earlier run was interrupted");
+    command
+        ->add_option("--keep-failures", options->keptFailures,
+                     "Keep the first N failing blocks of each point in\nOUT.failures (default none)")
+        ->type_name("N")
+        ->transform(
+            wholeNumber([](std::uint64_t n) { return n >= 1 && n <= 1000; }, "a number from 1 to 1000"));
     addThreadsOption(*command, options->threads);
     addFormOptions(*command, options->form);
     command->callback([options, &results, makeWorkers = std::move(makeWorkers)] {

@@ -7,14 +7,11 @@
 #include <utility>
 #include <vector>
 
+#include "report_text.hpp"
+
 namespace quarzel::tool {
 
 namespace {
-
-std::string durationText(double seconds) {
-    const auto whole = static_cast<std::uint64_t>(seconds);
-    return fmt::format("{}:{:02}:{:02}", whole / 3600, whole / 60 % 60, whole % 60);
-}
 
 /// The blocks that each point will probably have at its end.
 std::vector<double> expectedBlocks(const std::vector<sweep::PointState>& points, const sweep::Plan& plan) {

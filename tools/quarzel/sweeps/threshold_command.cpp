@@ -10,6 +10,7 @@
 #include <utility>
 #include <vector>
 
+#include "files/file_lock.hpp"
 #include "files/output_file.hpp"
 #include "options/list_option.hpp"
 #include "options/threads_option.hpp"
@@ -52,7 +53,7 @@ holds, not on threads, interruptions or the machine.
   OUT         the points that were simulated, a result as of 'quarzel sweep'. If
               it is there, its points are used and it is extended. When a signal
               ends the search (SIGINT, SIGTERM), it receives what is done; the
-              same command then goes on.
+              same command then goes on. OUT.lock keeps other commands from it.
 
 Examples:
   quarzel threshold --block-size 40,1024,6144 --target-bler 0.1,0.01
@@ -133,7 +134,6 @@ sweep::Result knownResult(const Options& options, const sweep::Configuration& co
     sweep::NamedResult known{options.output.value_or(""), {configuration.seed, {}, {}}};
     std::error_code ignored;
     if (options.output) {
-        probeOutput(*options.output);
         if (std::filesystem::is_regular_file(*options.output, ignored)) {
             joinSweepFile(known, *options.output);
         }
@@ -154,6 +154,10 @@ sweep::Result knownResult(const Options& options, const sweep::Configuration& co
 void findThresholds(const Options& options, std::ostream& results, const MakeWorkers& makeWorkers) {
     const sweep::Configuration configuration = decodedCurves(options);
     const std::vector<sweep::Target> targets = targetsOf(options, configuration);
+    if (options.output) {
+        probeOutput(*options.output);
+    }
+    const std::unique_ptr<FileLock> lock = lockOutput(options.output);
     sweep::Result result = knownResult(options, configuration);
     const std::unique_ptr<sweep::Workers> workers = makeWorkers(options.threads);
     bool isExtended = false;

@@ -4,6 +4,8 @@
 #include <fmt/format.h>
 
 #include <memory>
+#include <nlohmann/json.hpp>
+#include <optional>
 #include <string>
 #include <utility>
 
@@ -20,6 +22,15 @@ namespace {
 struct Options {
     std::string file;
     unsigned threads = 0;  // the usual number
+    bool json = false;
+};
+
+/// What came out.
+struct Verdict {
+    std::size_t points;
+    std::uint64_t blocks;
+    bool isSameText;                        // byte for byte
+    std::optional<std::string> difference;  // none: every number is the same
 };
 
 constexpr const char* description = "Run the sweep of a result file again";
@@ -63,6 +74,27 @@ sweep::Points repeated(const sweep::Dispatcher& dispatcher, const sweep::Points&
     return points;
 }
 
+void print(std::ostream& stream, const Options& options, const Verdict& verdict) {
+    if (options.json) {
+        const nlohmann::ordered_json object = {
+            {"result", options.file},
+            {"same", !verdict.difference},
+            {"byte_for_byte", verdict.isSameText},
+            {"points", verdict.points},
+            {"blocks", verdict.blocks},
+            {"difference",
+             verdict.difference ? nlohmann::ordered_json(*verdict.difference) : nlohmann::ordered_json()}};
+        // A file name need not be UTF-8; what is not becomes U+FFFD.
+        stream << object.dump(-1, ' ', false, nlohmann::ordered_json::error_handler_t::replace) << '\n';
+    } else if (verdict.difference) {
+        stream << fmt::format("{}: differs: {}\n", options.file, *verdict.difference);
+    } else {
+        stream << fmt::format("{}: the same {}, {} with {} blocks\n", options.file,
+                              verdict.isSameText ? "byte for byte" : "in every number",
+                              counted(verdict.points, "point", "points"), verdict.blocks);
+    }
+}
+
 ExitCode verify(const Options& options, std::ostream& results, const MakeWorkers& makeWorkers) {
     const std::string text = readBytes(options.file);
     sweep::Result result = aboutFile(options.file, [&text] { return sweep::readResult(text); });
@@ -80,18 +112,17 @@ ExitCode verify(const Options& options, std::ostream& results, const MakeWorkers
                         "run it again");
     }
     result.points = repeated(dispatcher, stored);
-    if (sweep::resultText(result) != renewed) {
-        results << fmt::format("{}: differs: {}\n", options.file, firstDifference(stored, result.points));
-        return ExitCode::resultsDiffer;
-    }
-    std::uint64_t blocks = 0;
+    Verdict verdict{stored.size(), 0, false, {}};
     for (const auto& [setup, point] : stored) {
-        blocks += point.blocks;
+        verdict.blocks += point.blocks;
     }
-    results << fmt::format("{}: the same {}, {} with {} blocks\n", options.file,
-                           renewed == text ? "byte for byte" : "in every number",
-                           counted(stored.size(), "point", "points"), blocks);
-    return ExitCode::done;
+    const std::string repeatedText = sweep::resultText(result);
+    verdict.isSameText = repeatedText == text;
+    if (repeatedText != renewed) {
+        verdict.difference = firstDifference(stored, result.points);
+    }
+    print(results, options, verdict);
+    return verdict.difference ? ExitCode::resultsDiffer : ExitCode::done;
 }
 
 }  // namespace
@@ -103,6 +134,7 @@ void addVerifyResultCommand(CLI::App& app, std::ostream& results, ExitCode& exit
     command->footer(std::string(footer) + '\n' + exitCodesHelp);
     command->add_option("RESULT", options->file, "The result of a sweep")->required()->type_name("");
     addThreadsOption(*command, options->threads);
+    command->add_flag("--json", options->json, "Print one JSON object instead of text");
     command->callback([options, &results, &exitCode, makeWorkers = std::move(makeWorkers)] {
         exitCode = verify(*options, results, makeWorkers);
     });

@@ -4,122 +4,99 @@
 #include <fmt/format.h>
 
 #include <algorithm>
-#include <array>
 #include <iterator>
 #include <string_view>
-#include <vector>
 
 #include "report_text.hpp"
+#include "trace/trace_context.hpp"
 
 namespace quarzel::tool {
 
 namespace {
 
-/// Steps shown before and after the one that differs.
-constexpr std::size_t contextSteps = 3;
+/// What the lines behind a label begin with.
+constexpr const char* indent = "              ";
 
-std::string valuesThatDiffer(std::size_t number, std::string_view where) {
-    return fmt::format("{} of {} {}", counted(number, "value", "values"), where,
-                       number == 1 ? "differs" : "differ");
-}
-
-/// The element of the core's record of branch metrics that is in the column g4, g5, g6 or g7.
-unsigned branchElement(unsigned column) {
-    constexpr std::array<unsigned, 4> elements = {2, 1, 3, 0};
-    return elements[column - 4];
-}
-
-std::string meaningOf(const TraceTable& table, std::size_t column) {
-    const auto [signal, description, number] = table.column(column);
+std::string meaningOf(unsigned column) {
+    const auto& [signal, description, number] = traceColumns()[column];
     if (!number) {
         return description;
     }
-    return signal == std::string_view("g")
-               ? fmt::format("{}, element {}", description, branchElement(*number))
-               : fmt::format("{} of state {}", description, *number);
+    return signal == std::string_view("g") ? description
+                                           : fmt::format("{} of state {}", description, *number);
 }
 
-/// The columns that belong to the signal of a column.
-std::vector<std::size_t> columnsOfSignal(const TraceTable& table, std::size_t column) {
-    if (!table.siso) {
-        return {column};
+std::string passText(std::optional<std::uint32_t> pass) {
+    if (!pass) {
+        return "none: soft inputs of the block";
     }
-    std::vector<std::size_t> columns;
-    for (std::size_t other = 0; other < passColumns().size(); ++other) {
-        if (std::string_view(passColumns()[other].signal) == passColumns()[column].signal) {
-            columns.push_back(other);
+    const unsigned code = constituentCode(*pass);
+    return fmt::format("{}: constituent code {} in {} order", *pass, code,
+                       code == 1 ? "natural" : "interleaved");
+}
+
+std::string blockText(const TraceDifference& first) {
+    const auto text = [](const std::shared_ptr<const TraceBlock>& block) {
+        return block->number() ? std::to_string(*block->number()) : "without a number";
+    };
+    return first.blocks[0]->number() == first.blocks[1]->number()
+               ? text(first.blocks[0])
+               : fmt::format("{} in A, {} in B", text(first.blocks[0]), text(first.blocks[1]));
+}
+
+std::string valueText(const TraceDiffReport& report, std::size_t trace) {
+    const TraceDifference& first = *report.comparison.first;
+    const TraceValue value = first.value(trace);
+    const std::size_t line = first.blocks[trace]->table(first.pass)->line(first.step, first.column);
+    const std::string place = fmt::format("{} {}", report.units[trace], line);
+    return value.isNumber() ? fmt::format("{:+.6f}, raw {}, {}", value.real(), value.raw(), place)
+                            : fmt::format("{}, {}", value.text(), place);
+}
+
+void printFirstValue(std::string& text, const TraceDiffReport& report) {
+    const TraceDifference& first = *report.comparison.first;
+    reportLine(text, "block", blockText(first));
+    reportLine(text, "pass", passText(first.pass));
+    reportLine(text, "step", fmt::format("{} of 0 to {}", first.step, first.steps - 1));
+    reportLine(text, "signal",
+               fmt::format("{}: {}", traceColumns()[first.column].heading(), meaningOf(first.column)));
+    reportLine(text, "value in A", valueText(report, 0));
+    reportLine(text, "value in B", valueText(report, 1));
+}
+
+/// What a trace has where the other one has nothing, or something else.
+std::string whatComes(const TraceDifference& first, std::size_t trace) {
+    const auto& block = first.blocks[trace];
+    if (!block) {
+        return "nothing, it has ended";
+    }
+    if (first.steps == 0) {
+        return block->number() ? fmt::format("block {}", *block->number()) : "a block without a number";
+    }
+    return block->table(first.pass) != nullptr ? tableName(block->number(), first.pass)
+                                               : "no " + tableName(block->number(), first.pass);
+}
+
+void printCounts(std::string& text, const TraceComparison& comparison) {
+    reportLine(
+        text, "differ",
+        fmt::format("{} of {}", comparison.differing(), counted(comparison.values, "value", "values")));
+    std::vector<std::string> signals;
+    for (const auto& [signal, count] : differencesBySignal(comparison)) {
+        signals.push_back(fmt::format("{} {}", signal, count));
+    }
+    reportLine(text, "by signal", fmt::format("{}", fmt::join(signals, ", ")));
+    constexpr std::size_t mostTables = 8;
+    std::size_t shown = 0;
+    for (const auto& [table, count] : comparison.byTable) {
+        if (shown++ == mostTables) {
+            fmt::format_to(std::back_inserter(text), "{}and {} more passes\n", indent,
+                           comparison.byTable.size() - mostTables);
+            break;
         }
+        const auto& [block, pass] = table;
+        reportLine(text, shown == 1 ? "by pass" : "", fmt::format("{}: {}", tableName(block, pass), count));
     }
-    return columns;
-}
-
-std::string placeText(const TraceTable& table) {
-    const std::string block =
-        fmt::format("block {} (decode={}, {} steps)", blockNumber(table), table.decode, table.steps);
-    return table.siso ? fmt::format("pass {} of {}", *table.siso, block) : "soft inputs of " + block;
-}
-
-/// What a trace has where the other one has something else.
-std::string whatComes(const std::optional<TraceTable>& table, std::size_t lines) {
-    return table ? fmt::format("{}, from line {}", placeText(*table), table->firstLine)
-                 : fmt::format("nothing, it ends after line {}", lines);
-}
-
-void endRow(std::string& text) {
-    text.resize(text.find_last_not_of(' ') + 1);
-    text += '\n';
-}
-
-/// The signal that differs around the step where it does: a row of A and one of B for each step.
-void printContext(std::string& text, const TraceTable& a, const TraceTable& b, std::size_t index) {
-    const std::vector<std::size_t> columns = columnsOfSignal(a, a.columnOf(index));
-    const std::size_t steps =
-        std::min(a.values.size(), b.values.size()) / (a.siso ? a.rowLength() : traceStreams.size());
-    const std::size_t step = a.stepOf(index);
-    text += "\nstep    ";
-    for (const std::size_t column : columns) {
-        fmt::format_to(std::back_inserter(text), " {:12}", a.column(column).heading());
-    }
-    endRow(text);
-    for (std::size_t s = step - std::min(step, contextSteps); s < std::min(steps, step + contextSteps + 1);
-         ++s) {
-        for (const bool isA : {true, false}) {
-            fmt::format_to(std::back_inserter(text), "{:4}  {} ", s, isA ? 'A' : 'B');
-            for (const std::size_t column : columns) {
-                const double realA = a.real(a.indexOf(s, column));
-                const double realB = b.real(b.indexOf(s, column));
-                fmt::format_to(std::back_inserter(text), "{}{:<+12.6f}", isA || realA == realB ? ' ' : '*',
-                               isA ? realA : realB);
-            }
-            endRow(text);
-        }
-    }
-}
-
-std::string valueText(const TraceTable& table, std::size_t index) {
-    return fmt::format("{:+.6f}, raw {}, line {}", table.real(index), table.raw(index), table.lineOf(index));
-}
-
-void printFirstValue(std::string& text, const TraceDifference& first) {
-    const TraceTable& a = *first.a;
-    const TraceTable& b = *first.b;
-    const std::size_t index = *first.index;
-    const std::size_t column = a.columnOf(index);
-    reportLine(text, "block", fmt::format("{} (decode={})", blockNumber(a), a.decode));
-    if (a.siso) {
-        const unsigned code = constituentCode(*a.siso);
-        reportLine(text, "pass",
-                   fmt::format("{}: constituent code {} in {} order", *a.siso, code,
-                               code == 1 ? "natural" : "interleaved"));
-    } else {
-        reportLine(text, "pass", "none: soft inputs of the block");
-    }
-    reportLine(text, "step", fmt::format("{} of 0 to {}", a.stepOf(index), a.steps - 1));
-    reportLine(text, "signal", fmt::format("{}: {}", a.column(column).heading(), meaningOf(a, column)));
-    reportLine(text, "value in A", valueText(a, index));
-    reportLine(text, "value in B", valueText(b, index));
-    reportLine(text, "further",
-               valuesThatDiffer(first.values - 1, a.siso ? "this pass" : "these soft inputs"));
 }
 
 /// In what way the traces are equal or not.
@@ -129,44 +106,81 @@ std::string resultText(const TraceComparison& comparison) {
         return comparison.termination == 0 ? "the traces are equal"
                                            : "the traces are equal but for termination steps";
     }
-    if (first->index) {
+    if (first->isValue) {
         return comparison.elsewhere ? "the traces differ" : "the traces differ in termination steps alone";
     }
-    return first->a && first->b ? "the traces differ: they go on with different tables"
-                                : fmt::format("the traces differ: {} ends first", first->a ? 'B' : 'A');
+    for (const std::size_t trace : {0U, 1U}) {
+        const auto& block = first->blocks[trace];
+        if (!block || (first->steps != 0 && block->table(first->pass) == nullptr)) {
+            return fmt::format("the traces differ: {} lacks something", trace == 0 ? 'A' : 'B');
+        }
+    }
+    return "the traces differ: they go on with different blocks";
+}
+
+std::string signalsText(const TraceColumnSet& columns) {
+    std::vector<std::string> names;
+    for (const unsigned column : columnsAsComputed()) {
+        const std::string name = isInput(column) ? "soft inputs" : traceColumns()[column].signal;
+        if (columns[column] && (names.empty() || names.back() != name)) {
+            names.push_back(name);
+        }
+    }
+    return fmt::format("{}", fmt::join(names, ", "));
 }
 
 }  // namespace
+
+std::vector<std::pair<std::string, std::size_t>> differencesBySignal(const TraceComparison& comparison) {
+    std::vector<std::pair<std::string, std::size_t>> counts;
+    for (const unsigned column : columnsAsComputed()) {
+        const auto found = comparison.byColumn.find(column);
+        if (found == comparison.byColumn.end()) {
+            continue;
+        }
+        const char* const signal = traceColumns()[column].signal;
+        if (counts.empty() || counts.back().first != signal) {
+            counts.emplace_back(signal, 0);
+        }
+        counts.back().second += found->second;
+    }
+    return counts;
+}
 
 void printText(std::ostream& stream, const TraceDiffReport& report) {
     const TraceComparison& comparison = report.comparison;
     const auto& first = comparison.first;
     std::string text;
-    reportLine(text, "A", report.fileA);
-    reportLine(text, "B", report.fileB);
+    reportLine(text, "A", report.files[0]);
+    reportLine(text, "B", report.files[1]);
     reportLine(text, "result", resultText(comparison));
-    if (!first) {
-        reportLine(text, "compared",
-                   counted(comparison.blocks, "block", "blocks") + ", " +
-                       counted(comparison.passes, "pass", "passes"));
-    } else if (first->index) {
-        printFirstValue(text, *first);
-    } else {
-        reportLine(text, "next in A", whatComes(first->a, report.linesA));
-        reportLine(text, "next in B", whatComes(first->b, report.linesB));
+    reportLine(text, "compared",
+               fmt::format("{}, {}: {}", counted(comparison.blocks, "block", "blocks"),
+                           counted(comparison.passes, "pass", "passes"), signalsText(comparison.columns)));
+    if (first && !first->isValue) {
+        reportLine(text, "next in A", whatComes(*first, 0));
+        reportLine(text, "next in B", whatComes(*first, 1));
+    } else if (first) {
+        printFirstValue(text, report);
+    } else if (comparison.termination > 0) {
+        reportLine(text, "ignored",
+                   fmt::format("{} of termination steps",
+                               counted(comparison.termination, "value that differs", "values that differ")));
     }
-    if (!first && comparison.termination > 0) {
-        reportLine(text, "ignored", valuesThatDiffer(comparison.termination, "termination steps"));
-    } else if (first && first->isTermination()) {
+    if (!comparison.byColumn.empty()) {
+        printCounts(text, comparison);
+    }
+    if (first && first->isTermination()) {
         reportLine(text, "note",
-                   comparison.elsewhere
-                       ? "a termination step, which hardware does not compute; the traces\n"
-                         "              differ elsewhere too, --ignore-termination tells where"
-                       : "termination steps, which hardware does not compute, hold every\n"
-                         "              difference of these traces; see --ignore-termination");
+                   fmt::format("hardware does not compute the termination steps, which hold every\n"
+                               "{}difference of these traces; see --ignore-termination",
+                               indent));
     }
-    if (first && first->index) {
-        printContext(text, *first->a, *first->b, *first->index);
+    for (std::size_t i = 0; i < report.cause.size(); ++i) {
+        reportLine(text, i == 0 ? "recomputed" : "", report.cause[i]);
+    }
+    if (first && first->isValue) {
+        appendContext(text, *first);
     }
     stream << text;
 }

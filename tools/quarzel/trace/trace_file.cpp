@@ -3,6 +3,9 @@
 
 #include <string>
 
+#include "trace/trace_rows.hpp"
+#include "trace/trace_vcd.hpp"
+
 namespace quarzel::tool {
 
 TraceFile::TraceFile(const TraceOptions& options, std::ostream& results)
@@ -10,15 +13,17 @@ TraceFile::TraceFile(const TraceOptions& options, std::ostream& results)
     if (!options.isToStandardOutput()) {
         itsFile.emplace(options.file);
     }
-    if (options.form != "text") {
-        itsRows.emplace(options.form == "csv" ? csvRows : jsonRows,
-                        [this](std::string_view text) { write(text); });
+    const auto writeText = [this](std::string_view text) { write(text); };
+    if (options.form == "vcd") {
+        itsWriter = std::make_unique<TraceVcd>(writeText);
+    } else if (options.form != "text") {
+        itsWriter = std::make_unique<TraceRows>(options.form == "csv" ? csvRows : jsonRows, writeText);
     }
 }
 
 void TraceFile::start(Core& core) {
-    if (itsRows) {
-        core.passes(*itsOptions.passes, [this](const vardel_ip_quarzel_pass& pass) { itsRows->add(pass); });
+    if (itsWriter) {
+        core.passes(*itsOptions.passes, [this](const vardel_ip_quarzel_pass& pass) { itsWriter->add(pass); });
     } else {
         core.trace(*itsOptions.passes);
     }
@@ -29,8 +34,8 @@ void TraceFile::writeLine(std::string_view line) {
 }
 
 void TraceFile::finish() {
-    if (itsRows) {
-        itsRows->end();
+    if (itsWriter) {
+        itsWriter->end();
     }
     if (itsFile) {
         itsFile->finish();

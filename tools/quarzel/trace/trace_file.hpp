@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: MIT
 #pragma once
 
+#include <memory>
 #include <optional>
 #include <ostream>
 #include <string_view>
@@ -8,7 +9,7 @@
 #include "files/output_file.hpp"
 #include "quarzel/core.hpp"
 #include "trace/trace_options.hpp"
-#include "trace/trace_rows.hpp"
+#include "trace/trace_writer.hpp"
 
 namespace quarzel::tool {
 
@@ -38,8 +39,8 @@ class TraceFile {
 
     const TraceOptions& itsOptions;
     std::ostream& itsResults;
-    std::optional<OutputFile> itsFile;  ///< none: standard output
-    std::optional<TraceRows> itsRows;   ///< none: text
+    std::optional<OutputFile> itsFile;       ///< none: standard output
+    std::unique_ptr<TraceWriter> itsWriter;  ///< null: text
 };
 
 }  // namespace quarzel::tool

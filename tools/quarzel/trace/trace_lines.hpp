@@ -30,6 +30,8 @@ class TraceLines {
 
     bool isWhole() const { return itsState == State::whole; }
 
+    const std::string& name() const { return itsName; }
+
     /// Its number, from 1.
     std::size_t number() const { return itsNumber; }
 

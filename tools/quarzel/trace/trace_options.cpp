@@ -18,10 +18,9 @@ void addTraceOptions(CLI::App& command, TraceOptions& options) {
                 [](std::uint64_t n) { return n >= 1 && n <= std::numeric_limits<std::uint32_t>::max(); },
                 "a number from 1 to 4294967295"));
     command
-        .add_option("--trace-block", options.block,
-                    "Trace from this block on, the first being 1\n(default 1)")
+        .add_option("--trace-block", options.block, "Trace from this block on, counted from 0 (default 0)")
         ->type_name("N")
-        ->transform(wholeNumber([](std::uint64_t n) { return n >= 1; }, "a number from 1 on"))
+        ->transform(wholeNumber([](std::uint64_t) { return true; }, "a whole number"))
         ->needs(trace);
     command
         .add_option(
@@ -29,9 +28,12 @@ void addTraceOptions(CLI::App& command, TraceOptions& options) {
             "Write the trace to this file (default: to\nstandard output, the report to standard error)")
         ->type_name("FILE")
         ->needs(trace);
-    command.add_option("--trace-format", options.form, "text, csv or json (default text)")
+    command
+        .add_option("--trace-format", options.form,
+                    "text, csv, json or vcd, waves for a viewer\n(default text)")
         ->type_name("FORM")
-        ->check(withChoices(CLI::IsMember({"text", "csv", "json"}).description(""), {"text", "csv", "json"}))
+        ->check(withChoices(CLI::IsMember({"text", "csv", "json", "vcd"}).description(""),
+                            {"text", "csv", "json", "vcd"}))
         ->needs(trace);
 }
 

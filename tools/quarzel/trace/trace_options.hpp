@@ -12,7 +12,7 @@ namespace quarzel::tool {
 /// What the user wants traced, and where to.
 struct TraceOptions {
     std::optional<std::uint32_t> passes;  ///< counted across blocks; none: no trace
-    std::size_t block = 1;                ///< the first block that is traced, from 1
+    std::size_t block = 0;                ///< the first block that is traced, from 0
     std::string file = "-";
     std::string form = "text";
 

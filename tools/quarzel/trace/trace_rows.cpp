@@ -3,27 +3,28 @@
 
 #include <fmt/format.h>
 
-#include <array>
-#include <iterator>
 #include <utility>
+
+#include "trace/trace_signals.hpp"
+#include "trace/trace_value.hpp"
 
 namespace quarzel::tool {
 
-namespace {
-
-std::string textOr(const char* nothing, const std::optional<unsigned>& number) {
-    return number ? std::to_string(*number) : nothing;
-}
-
-}  // namespace
-
-const TraceRowForm csvRows = {"block,pass,step,signal,state,raw,real\n", "", "", "{},{},{},{},{},{},{:.6f}\n",
-                              ""};
+const TraceRowForm csvRows = {
+    "block,pass,step,signal,state,raw,real\n", "", "\n", ",", ",", ",", ",", ",", ",", "\n", ""};
 const TraceRowForm jsonRows = {
-    "[\n", ",\n", "\n]\n",
-    R"({{"block":{},"pass":{},"step":{},"signal":"{}","state":{},"raw":{},"real":{:.6f}}})", "null"};
+    "[\n",           "{\"block\":", "},\n{\"block\":", ",\"pass\":", ",\"step\":", ",\"signal\":\"",
+    "\",\"state\":", ",\"raw\":",   ",\"real\":",      "}\n]\n",     "null"};
 
 TraceRows::TraceRows(const TraceRowForm& form, Write write) : itsForm(form), itsWrite(std::move(write)) {
+    for (const TraceColumn& column : traceColumns()) {
+        itsColumns.push_back(fmt::format("{}{}{}{}{}", form.signal, column.signal, form.state,
+                                         column.number ? std::to_string(*column.number) : form.nothing,
+                                         form.raw));
+    }
+    for (int raw = TraceValue::lowest; raw <= TraceValue::highest; ++raw) {
+        itsValues.push_back(fmt::format("{}{}{:.6f}", raw, form.real, raw / 8.0));
+    }
     itsWrite(itsForm.start);
 }
 
@@ -31,36 +32,44 @@ void TraceRows::add(const vardel_ip_quarzel_pass& pass) {
     if (pass.pass == 0) {
         addInputs(pass);
     }
-    const std::array<const std::int16_t*, 6> signalWords = {pass.intrinsic, pass.alpha, pass.beta,
-                                                            pass.gamma,     pass.llr,   pass.extrinsic};
-    const std::vector<Signal> all = signals();
-    for (std::uint32_t step = 0; step < pass.steps; ++step) {
-        auto column = passColumns().begin();
-        for (std::size_t signal = 0; signal < signalWords.size(); ++signal) {
-            const std::int16_t* words = signalWords[signal] + std::size_t{step} * all[signal].width;
-            for (unsigned i = 0; i < all[signal].width; ++i) {
-                append({pass.block + 1, pass.pass, step}, *column++, words[i]);
-            }
-        }
-        write();
-    }
+    startTable(pass.block, pass.pass);
+    forEachValue(
+        pass, [this](std::uint32_t step, unsigned column, std::int16_t word) { append(step, column, word); });
+    write();
 }
 
 void TraceRows::addInputs(const vardel_ip_quarzel_pass& pass) {
-    for (std::size_t i = 0; i < traceStreams.size(); ++i) {
-        const TraceColumn column{traceStreams[i].signal, traceStreams[i].description, std::nullopt};
+    startTable(pass.block, std::nullopt);
+    for (unsigned stream = 0; stream < traceStreams.size(); ++stream) {
         for (std::uint32_t step = 0; step < pass.steps; ++step) {
-            append({pass.block + 1, std::nullopt, step}, column, pass.inputs[i / 3][i % 3][step]);
+            append(step, static_cast<unsigned>(passColumns().size()) + stream,
+                   pass.inputs[stream / 3][stream % 3][step]);
         }
+    }
+}
+
+/// Begin the rows of a pass, or of soft inputs.
+void TraceRows::startTable(unsigned long long block, std::optional<unsigned> pass) {
+    itsBefore = fmt::format("{}{}{}{}", block, itsForm.pass, pass ? std::to_string(*pass) : itsForm.nothing,
+                            itsForm.step);
+}
+
+void TraceRows::append(std::uint32_t step, unsigned column, std::int16_t word) {
+    constexpr std::size_t enough = 1 << 16;
+    itsText += std::exchange(itsHasRows, true) ? itsForm.next : itsForm.first;
+    itsText += itsBefore;
+    const fmt::format_int digits(step);
+    itsText.append(digits.data(), digits.size());
+    itsText += itsColumns[column];
+    itsText += itsValues[static_cast<std::size_t>(rawOf(word) - TraceValue::lowest)];
+    if (itsText.size() > enough) {
         write();
     }
 }
 
-void TraceRows::append(const Place& place, const TraceColumn& column, std::int16_t word) {
-    itsText += std::exchange(itsSeparator, itsForm.separator);
-    fmt::format_to(std::back_inserter(itsText), fmt::runtime(itsForm.row), place.block,
-                   textOr(itsForm.nothing, place.pass), place.step, column.signal,
-                   textOr(itsForm.nothing, column.number), rawOf(word), realOf(word));
+void TraceRows::end() {
+    itsText += itsForm.end;
+    write();
 }
 
 void TraceRows::write() {

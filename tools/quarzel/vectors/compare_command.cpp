@@ -2,10 +2,14 @@
 #include "vectors/compare_command.hpp"
 
 #include <memory>
+#include <optional>
 #include <string>
+#include <utility>
 
 #include "captures/npy_header.hpp"
 #include "files/input_file.hpp"
+#include "files/output_file.hpp"
+#include "junit_report.hpp"
 #include "vectors/compare_report.hpp"
 
 namespace quarzel::tool {
@@ -15,6 +19,7 @@ namespace {
 struct CompareOptions {
     std::string expected;
     std::string actual;
+    std::optional<std::string> junit;
     bool json = false;
 };
 
@@ -32,10 +37,17 @@ ACTUAL is what the simulation gave for the same blocks in the same order:
   npy of truth values or integers, a decision an element, whatever its shape; or
   of uint8, shape (blocks, K/8), 8 bits to a byte, the first bit highest
 
-Told are the first block and bit that differ (blocks count from 1, bits and
-addresses from 0), what is there instead, and how many blocks and bits differ:
-wrong, undefined (x), undriven (z) or missing. For a block of a vector set
-follows the command that prints the model's trace of it.
+Told are the first block and bit that differ (blocks, bits and addresses count
+from 0, lines from 1), what is there instead, the blocks that differ (ten in
+text, all with --json), and how many blocks and bits do: wrong, undefined (x),
+undriven (z) or missing; by K, iterations, stimulus and eighth of the block. A
+hint is given when decisions that are inverted, reversed, shifted or those of
+other blocks explain it. For a block of a vector set follows the command that
+prints the model's trace of it.
+
+The report of --junit is XML for continuous integration, with a test for each
+block. It is written whole, whether decisions differ or not, but not when there
+is an error.
 
 Example:
   quarzel compare vectors/u2_a1 simulated.hex
@@ -48,9 +60,17 @@ MemoryImage readActual(const std::string& file, const ExpectedDecisions& expecte
 }
 
 ExitCode compare(const CompareOptions& options, std::ostream& results) {
+    if (options.junit) {
+        checkJunitFile(*options.junit, {options.expected, options.actual});
+    }
     const ExpectedDecisions expected = readExpected(options.expected);
     const MemoryImage actual = readActual(options.actual, expected);
-    const CompareReport report{expected, options.actual, actual, compareDecisions(expected, actual)};
+    DecisionComparison comparison = compareDecisions(expected, actual);
+    std::optional<DecisionHint> hint = hintOf(expected, actual, comparison);
+    const CompareReport report{expected, options.actual, actual, std::move(comparison), std::move(hint)};
+    if (options.junit) {
+        writeOutput(*options.junit, junitText(report));
+    }
     (options.json ? printJson : printText)(results, report);
     return report.comparison.isEqual() ? ExitCode::done : ExitCode::decisionsDiffer;
 }
@@ -67,6 +87,8 @@ void addCompareCommand(CLI::App& app, std::ostream& results, ExitCode& exitCode)
     command->add_option("ACTUAL", options->actual, "The decisions of the simulation")
         ->required()
         ->type_name("");
+    command->add_option("--junit", options->junit, "Write a JUnit XML report to this file")
+        ->type_name("FILE");
     command->add_flag("--json", options->json, "Print one JSON object instead of text");
     command->callback([options, &results, &exitCode] { exitCode = compare(*options, results); });
 }

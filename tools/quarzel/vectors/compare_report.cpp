@@ -3,26 +3,18 @@
 
 #include <fmt/format.h>
 
-#include <nlohmann/json.hpp>
+#include <algorithm>
 #include <string_view>
 #include <utility>
 #include <vector>
 
 #include "report_text.hpp"
+#include "vectors/compare_groups.hpp"
 
 namespace quarzel::tool {
 
-namespace {
-
-using Json = nlohmann::ordered_json;
-using Kind = MemoryWord::Kind;
-
-/// The address at which a block and a bit are.
-std::size_t addressOf(const CompareReport& report, const FirstDifference& first) {
-    return report.expected.blocks[first.block].firstBit + first.bit;
-}
-
 std::string valueText(const MemoryWord& word) {
+    using Kind = MemoryWord::Kind;
     switch (word.kind) {
         case Kind::missing:
             return "missing";
@@ -37,6 +29,8 @@ std::string valueText(const MemoryWord& word) {
                           : std::to_string(word.value);
 }
 
+namespace {
+
 std::string placeText(const MemoryWord& word, std::size_t address) {
     return fmt::format(", address @{:x}{}", address,
                        word.line == 0 ? "" : fmt::format(", line {}", word.line));
@@ -44,65 +38,63 @@ std::string placeText(const MemoryWord& word, std::size_t address) {
 
 /// "5 of 480 differ: 3 wrong, 2 undefined (x)".
 std::string bitsText(const CompareReport& report) {
-    const DecisionComparison& comparison = report.comparison;
-    const std::vector<std::pair<std::size_t, std::string_view>> kinds = {
-        {comparison.wrong, "wrong"},
-        {comparison.undefined, "undefined (x)"},
-        {comparison.undriven, "undriven (z)"},
-        {comparison.missing, "missing"}};
+    const DifferingBits& bits = report.comparison.bits;
+    const std::vector<std::pair<std::size_t, std::string_view>> kinds = {{bits.wrong, "wrong"},
+                                                                         {bits.undefined, "undefined (x)"},
+                                                                         {bits.undriven, "undriven (z)"},
+                                                                         {bits.missing, "missing"}};
     std::vector<std::string> parts;
     for (const auto& [count, name] : kinds) {
         if (count > 0) {
             parts.push_back(fmt::format("{} {}", count, name));
         }
     }
-    return fmt::format("{} of {} differ{}{}", comparison.bits(), report.expected.bits.size(),
+    return fmt::format("{} of {} differ{}{}", bits.count(), report.expected.bits.size(),
                        parts.empty() ? "" : ": ", fmt::join(parts, ", "));
 }
 
-void printFirst(std::string& text, const CompareReport& report, const FirstDifference& first) {
+/// "2 of 30 differ: 11, 17".
+std::string blocksText(const CompareReport& report) {
+    constexpr std::size_t mostBlocks = 10;
+    std::vector<std::string> numbers;
+    for (const BlockDifference& difference : report.comparison.failing) {
+        numbers.push_back(std::to_string(difference.block));
+    }
+    return fmt::format("{} of {} differ{}{}", numbers.size(), report.expected.blocks.size(),
+                       numbers.empty() ? "" : ": ", listText(numbers, mostBlocks));
+}
+
+void printFirst(std::string& text, const CompareReport& report) {
+    const BlockDifference& first = report.comparison.failing.front();
     const ExpectedBlock& block = report.expected.blocks[first.block];
-    const std::size_t address = addressOf(report, first);
+    const std::size_t address = report.firstAddress(first);
     const MemoryWord& word = report.actual.words[address];
+    const std::string about = block.about();
     reportLine(text, "block",
-               fmt::format("{} of {} (K = {}{}{})", first.block + 1, report.expected.blocks.size(),
-                           block.blockSize, block.about.empty() ? "" : ", ", block.about));
-    reportLine(text, "bit", fmt::format("{} of 0 to {}", first.bit, block.blockSize - 1));
+               fmt::format("{} of 0 to {} (K = {}{}{})", first.block, report.expected.blocks.size() - 1,
+                           block.blockSize, about.empty() ? "" : ", ", about));
+    reportLine(text, "bit", fmt::format("{} of 0 to {}", first.firstBit, block.blockSize - 1));
     reportLine(text, "expected bit", std::to_string(report.expected.bits[address]));
     reportLine(text, "actual bit", valueText(word) + placeText(word, address));
 }
 
-Json orNull(const std::string& text) {
-    return text.empty() ? Json() : Json(text);
-}
-
-Json valueJson(const MemoryWord& word) {
-    switch (word.kind) {
-        case Kind::missing:
-            return {};
-        case Kind::x:
-            return "x";
-        case Kind::z:
-            return "z";
-        case Kind::known:
-            break;
+/// What the blocks and bits that differ have in common.
+void printGroups(std::string& text, const CompareReport& report) {
+    constexpr std::size_t mostGroups = 6;
+    for (const Grouping& grouping : groupingsOf(report.expected, report.comparison)) {
+        std::vector<std::string> items;
+        for (const BlockGroup& group : grouping.groups) {
+            if (group.differing > 0) {
+                items.push_back(fmt::format("{}: {} of {}", group.name, group.differing, group.blocks));
+            }
+        }
+        reportLine(text, "by " + grouping.property, listText(items, mostGroups));
     }
-    return word.value;
-}
-
-Json firstJson(const CompareReport& report, const FirstDifference& first) {
-    const ExpectedBlock& block = report.expected.blocks[first.block];
-    const std::size_t address = addressOf(report, first);
-    const MemoryWord& word = report.actual.words[address];
-    return {{"block", first.block + 1},
-            {"block_size", block.blockSize},
-            {"about", orNull(block.about)},
-            {"bit", first.bit},
-            {"value_expected", report.expected.bits[address]},
-            {"value_actual", valueJson(word)},
-            {"address", address},
-            {"line", word.line == 0 ? Json() : Json(word.line)},
-            {"trace_command", orNull(block.traceCommand)}};
+    reportLine(text, "by place",
+               fmt::format("{} bits in the eighths of a block", fmt::join(report.comparison.eighths, " ")));
+    if (report.hint) {
+        reportLine(text, "hint", report.hint->text);
+    }
 }
 
 }  // namespace
@@ -121,42 +113,24 @@ void printText(std::ostream& stream, const CompareReport& report) {
         stream << text;
         return;
     }
-    reportLine(
-        text, "result",
-        comparison.first ? "the decisions differ" : "the decisions are equal, but go on after the last");
-    if (comparison.first) {
-        printFirst(text, report, *comparison.first);
+    const bool isEqualSoFar = comparison.failing.empty();
+    reportLine(text, "result",
+               isEqualSoFar ? "the decisions are equal, but go on after the last" : "the decisions differ");
+    if (!isEqualSoFar) {
+        printFirst(text, report);
     }
-    reportLine(text, "blocks", fmt::format("{} of {} differ", comparison.blocks, blocks));
+    reportLine(text, "blocks", blocksText(report));
     reportLine(text, "bits", bitsText(report));
     if (comparison.beyond > 0) {
         reportLine(text, "too many",
                    counted(comparison.beyond, "word", "words") + " after the last decision expected");
     }
-    if (comparison.first) {
-        const std::string& command = report.expected.blocks[comparison.first->block].traceCommand;
+    if (!isEqualSoFar) {
+        printGroups(text, report);
+        const std::string& command = report.expected.blocks[comparison.failing.front().block].traceCommand;
         text += command.empty() ? "" : "\nThe model's trace of this block:\n  " + command + '\n';
     }
     stream << text;
-}
-
-void printJson(std::ostream& stream, const CompareReport& report) {
-    const DecisionComparison& comparison = report.comparison;
-    const Json object = {{"expected", report.expected.name},
-                         {"actual", report.actualName},
-                         {"equal", comparison.isEqual()},
-                         {"blocks", report.expected.blocks.size()},
-                         {"blocks_differing", comparison.blocks},
-                         {"bits", report.expected.bits.size()},
-                         {"bits_differing", comparison.bits()},
-                         {"wrong", comparison.wrong},
-                         {"undefined", comparison.undefined},
-                         {"undriven", comparison.undriven},
-                         {"missing", comparison.missing},
-                         {"too_many", comparison.beyond},
-                         {"first", comparison.first ? firstJson(report, *comparison.first) : Json()}};
-    // A file name need not be UTF-8; what is not becomes U+FFFD.
-    stream << object.dump(-1, ' ', false, Json::error_handler_t::replace) << '\n';
 }
 
 }  // namespace quarzel::tool

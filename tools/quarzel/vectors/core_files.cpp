@@ -5,10 +5,9 @@
 
 #include <algorithm>
 #include <iterator>
-#include <xtensor/xadapt.hpp>
-#include <xtensor/xnpy.hpp>
 
 #include "captures/bits_file.hpp"
+#include "captures/capture_file.hpp"
 #include "report_text.hpp"
 #include "vectors/memory_names.hpp"
 
@@ -19,7 +18,7 @@ namespace {
 /// What a reader of a memory sees before a block.
 std::string commentOf(const VectorCore& core, std::size_t block) {
     const VectorBlock& it = core.blocks[block];
-    return fmt::format("// block {}: K {}, {}, {}\n", block + 1, it.blockSize,
+    return fmt::format("// block {}: K {}, {}, {}\n", block, it.blockSize,
                        counted(static_cast<std::size_t>(it.iterations), "iteration", "iterations"),
                        it.stimulus);
 }
@@ -46,6 +45,17 @@ std::string decisionText(const VectorCore& core, const std::vector<StimulusAndRe
         text += commentOf(core, block);
         for (const unsigned char bit : blocks[block].decisions) {
             text += bit != 0 ? "1\n" : "0\n";
+        }
+    }
+    return text;
+}
+
+/// The memory of tags, two digits a line; empty where blocks have none.
+std::string tagText(const VectorCore& core) {
+    std::string text;
+    for (std::size_t block = 0; block < core.blocks.size(); ++block) {
+        if (const auto& tag = core.blocks[block].tag) {
+            text += commentOf(core, block) + fmt::format("{:02x}\n", *tag);
         }
     }
     return text;
@@ -95,8 +105,7 @@ struct CaptureFiles {
         for (const StimulusAndResponse* const block : blocks) {
             soft.insert(soft.end(), block->soft.begin(), block->soft.end());
         }
-        const std::array<std::size_t, 3> shape = {blocks.size(), softMemories.size(), blockSize + 4};
-        return xt::dump_npy(xt::adapt(soft, shape));
+        return tool::softNpy(soft, blockSize);
     }
 
     std::string decidedNpy() const {
@@ -145,6 +154,9 @@ std::vector<VectorFile> writeCore(OutputDirectory& directory, VectorCore& core,
         write(memoryFile(softMemories[stream]), softText(core, blocks, stream));
     }
     write(memoryFile(decisionMemory), decisionText(core, blocks));
+    if (const std::string tags = tagText(core); !tags.empty()) {
+        write(memoryFile(tagMemory), tags);
+    }
     for (const CaptureFiles& capture : captures) {
         write(capture.name + ".soft.npy", capture.softNpy());
         write(capture.name + ".decided.npy", capture.decidedNpy());

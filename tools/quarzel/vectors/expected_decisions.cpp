@@ -5,7 +5,6 @@
 
 #include <algorithm>
 #include <filesystem>
-#include <iterator>
 #include <sstream>
 
 #include "captures/bits_file.hpp"
@@ -13,7 +12,6 @@
 #include "files/input_file.hpp"
 #include "options/block_sizes.hpp"
 #include "report_text.hpp"
-#include "sweep/sha256.hpp"
 #include "tool_error.hpp"
 #include "vectors/manifest.hpp"
 #include "vectors/memory_image.hpp"
@@ -24,36 +22,6 @@ namespace fs = std::filesystem;
 namespace quarzel::tool {
 
 namespace {
-
-/// The word of a shell that stands for this text.
-std::string shellWord(const std::string& text) {
-    const bool isPlain = text.find_first_not_of(
-                             "abcdefghijklmnopqrstuvwxyzABCDEFGHIJKLMNOPQRSTUVWXYZ0123456789"
-                             "_-./=,:@%+") == std::string::npos;
-    if (isPlain && !text.empty()) {
-        return text;
-    }
-    std::string word = "'";
-    for (const char c : text) {
-        word += c == '\'' ? "'\\''" : std::string(1, c);
-    }
-    return word + '\'';
-}
-
-/// The content of a file of the set, which must be as the manifest says.
-std::string readUnaltered(const std::string& directory, const std::string& name,
-                          const VectorContent& content) {
-    const std::string file = (fs::path(directory) / name).string();
-    std::ifstream stream = openInput(file);
-    std::string bytes(std::istreambuf_iterator<char>(stream), {});
-    const auto entry = std::find_if(content.files.begin(), content.files.end(),
-                                    [&name](const VectorFile& candidate) { return candidate.name == name; });
-    if (entry == content.files.end() || entry->sha256 != sweep::sha256(bytes)) {
-        throw fileError(file, "is not the file that was made with this set: its SHA-256 differs",
-                        "make the set again with 'quarzel vectors'");
-    }
-    return bytes;
-}
 
 /// Where a core and its set lie.
 struct CorePlace {
@@ -107,13 +75,11 @@ ExpectedDecisions readCore(const std::string& name) {
     std::size_t bits = 0;
     for (const VectorBlock& block : core.blocks) {
         expected.blocks.push_back(
-            {block.blockSize, bits,
-             counted(static_cast<std::size_t>(block.iterations), "iteration", "iterations") + ", " +
-                 block.stimulus,
+            {block.blockSize, bits, block.iterations, block.stimulus,
              fmt::format("quarzel decode {} --units {} --algorithm {} --iterations {} --trace {} "
                          "--trace-block {}",
                          shellWord((directory / block.capture).string()), core.units, core.algorithm,
-                         block.iterations, 2 * block.iterations, block.row + 1)});
+                         block.iterations, 2 * block.iterations, block.row)});
         bits += block.blockSize;
     }
     std::istringstream text(
@@ -137,7 +103,7 @@ ExpectedDecisions readPacked(std::istream& stream, const std::string& file) {
     const PackedBits packed = readBitsAfter(header, stream, file, header.shape[0], bytes);
     ExpectedDecisions expected{file, {}, {}};
     for (std::size_t block = 0; block < packed.blocks(); ++block) {
-        expected.blocks.push_back({static_cast<std::uint32_t>(8 * bytes), block * 8 * bytes, "", ""});
+        expected.blocks.push_back({static_cast<std::uint32_t>(8 * bytes), block * 8 * bytes, 0, "", ""});
     }
     for (const std::uint8_t byte : packed.bytes) {
         for (unsigned shift = 8; shift-- > 0;) {
@@ -148,6 +114,12 @@ ExpectedDecisions readPacked(std::istream& stream, const std::string& file) {
 }
 
 }  // namespace
+
+std::string ExpectedBlock::about() const {
+    return iterations == 0
+               ? ""
+               : counted(static_cast<std::size_t>(iterations), "iteration", "iterations") + ", " + stimulus;
+}
 
 std::size_t ExpectedDecisions::packedSize() const {
     const auto hasFirstSize = [this](const ExpectedBlock& block) {

@@ -12,8 +12,12 @@ namespace quarzel::tool {
 struct ExpectedBlock {
     std::uint32_t blockSize;   ///< K
     std::size_t firstBit;      ///< where its decisions begin
-    std::string about;         ///< what is known of it beyond that; may be empty
+    int iterations;            ///< 0: not known
+    std::string stimulus;      ///< what its soft values are; may be empty
     std::string traceCommand;  ///< prints the model's trace of it; may be empty
+
+    /// What is known of it beyond K: "6 iterations, noise", or nothing.
+    std::string about() const;
 };
 
 /// What a simulation is to give.

@@ -80,7 +80,7 @@ class StageWriter {
         for (std::size_t i = 0; i < itsBlocks.size(); ++i) {
             std::size_t number = 0;
             for (const TransmissionStages& transmission : itsBlocks[i].transmissions) {
-                appendParts(text, fmt::format("{}, transmission {}", tool::blockText(itsLink, i), ++number),
+                appendParts(text, fmt::format("{}, transmission {}", tool::blockText(itsLink, i), number++),
                             transmission.*values, size);
             }
         }
@@ -100,7 +100,7 @@ class StageWriter {
                      PartSize size) {
         auto value = values.begin();
         for (std::size_t r = 0; r < itsLink.segmentation().C; ++r) {
-            text += "// " + about + (itsLink.hasCrc() ? fmt::format(", code block {}\n", r + 1) : "\n");
+            text += "// " + about + (itsLink.hasCrc() ? fmt::format(", code block {}\n", r) : "\n");
             const auto end =
                 value + static_cast<std::ptrdiff_t>(size(
                             itsLink.codeBlock(r), link::bitsOfSymbol(itsLink.setup().channel.modulation)));
@@ -125,7 +125,7 @@ std::string modulationClause(link::Modulation modulation) {
 }  // namespace
 
 std::string blockText(const link::CodedLink& link, std::size_t block) {
-    return fmt::format("{} block {}", link.hasCrc() ? "transport" : "code", block + 1);
+    return fmt::format("{} block {}", link.hasCrc() ? "transport" : "code", block);
 }
 
 void writeLink(OutputDirectory& directory, const link::CodedLink& link, const std::vector<LinkStages>& blocks,

@@ -18,7 +18,7 @@ std::string linkLayoutText(const link::CodedLink& link) {
         fmt::format_to(std::back_inserter(text),
                        "{:08x} {:08x} {:08x} {:08x} {:08x} {:08x} {:08x} {:08x} // code block {}\n",
                        matching.K(), matching.filler(), block.codedBits(), matching.bufferSize(),
-                       link.bitsBefore(r), link.softValuesBefore(r), coded, entries, r + 1);
+                       link.bitsBefore(r), link.softValuesBefore(r), coded, entries, r);
         coded += block.codedBits();
         entries += matching.bufferSize();
     }

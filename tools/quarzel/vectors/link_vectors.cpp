@@ -27,10 +27,10 @@ CoreStimulus LinkVectors::stimulus() const {
             for (std::size_t transmission = 0; transmission < transmissions; ++transmission) {
                 for (std::size_t r = 0; r < C; ++r) {
                     const std::string about =
-                        fmt::format("{}, transmission {}", blockText(itsLink, block), transmission + 1);
+                        fmt::format("{}, transmission {}", blockText(itsLink, block), transmission);
                     stimulus.blocks.push_back(
                         {itsLink.segmentation().size(r), iterations,
-                         about + (itsLink.hasCrc() ? fmt::format(", code block {}", r + 1) : ""), "", 0});
+                         about + (itsLink.hasCrc() ? fmt::format(", code block {}", r) : ""), "", 0});
                 }
             }
         }

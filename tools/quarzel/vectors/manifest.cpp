@@ -6,9 +6,12 @@
 #include <algorithm>
 #include <iterator>
 #include <nlohmann/json.hpp>
+#include <stdexcept>
 
 #include "files/input_file.hpp"
+#include "quarzel/code.hpp"
 #include "sweep/json_text.hpp"
+#include "sweep/sha256.hpp"
 #include "tool_error.hpp"
 
 namespace quarzel::tool {
@@ -18,7 +21,7 @@ namespace {
 using Json = nlohmann::ordered_json;
 
 constexpr const char* format = "quarzel test vectors";
-constexpr int version = 1;
+constexpr int version = 2;  // in version 1 blocks counted from 1, which no reader here looks at
 
 /// Arrays of objects, and objects that hold an array or an object, are spread over lines; all else is kept on
 /// one, so that the text can be read and compared line by line.
@@ -29,7 +32,8 @@ void appendLines(std::string& text, const Json& value, const std::string& indent
                               ? std::any_of(value.begin(), value.end(), isStructured)
                               : value.is_array() && std::any_of(value.begin(), value.end(), isObject);
     if (!isSpread) {
-        text += value.dump();
+        // A file name need not be UTF-8; what is not becomes U+FFFD.
+        text += value.dump(-1, ' ', false, Json::error_handler_t::replace);
         return;
     }
     const std::string inner = indent + ' ';
@@ -46,12 +50,15 @@ void appendLines(std::string& text, const Json& value, const std::string& indent
 Json toJson(const VectorCore& core) {
     Json blocks = Json::array();
     for (const VectorBlock& block : core.blocks) {
-        blocks.push_back({{"block", blocks.size() + 1},
+        blocks.push_back({{"block", blocks.size()},
                           {"block_size", block.blockSize},
                           {"iterations", block.iterations},
                           {"stimulus", block.stimulus},
                           {"capture", block.capture},
                           {"row", block.row}});
+        if (block.tag) {
+            blocks.back()["tag"] = *block.tag;
+        }
     }
     return {{"directory", core.directory},
             {"units", core.units},
@@ -64,6 +71,9 @@ VectorCore coreFrom(const Json& object) {
     for (const Json& block : object.at("blocks")) {
         core.blocks.push_back({block.at("block_size"), block.at("iterations"), block.at("stimulus"),
                                block.at("capture"), block.at("row")});
+        if (!findBlockSize(block.at("block_size").get<std::uint64_t>())) {
+            throw std::invalid_argument("it has a block size that LTE has not");
+        }
     }
     return core;
 }
@@ -97,14 +107,18 @@ VectorContent readManifest(const std::string& directory) {
     std::ifstream stream = openInput(file);
     const std::string text(std::istreambuf_iterator<char>(stream), {});
     constexpr const char* remedy = "make the set again with 'quarzel vectors'";
+    const Json manifest = sweep::parseJson(text);
+    if (manifest.is_discarded()) {
+        throw fileError(file, "is truncated or altered: it is not a whole JSON object", remedy);
+    }
     try {
-        const Json manifest = sweep::parseJson(text);
         if (manifest.at("format") != format) {
             throw fileError(file, "is not a manifest of test vectors", remedy);
         }
-        if (manifest.at("version") != version) {
+        if (manifest.at("version") != version && manifest.at("version") != 1) {
             throw fileError(
-                file, fmt::format("has version {}, not {}", manifest.at("version").dump(), version), remedy);
+                file, fmt::format("has version {}, not 1 or {}", manifest.at("version").dump(), version),
+                remedy);
         }
         VectorContent content;
         for (const Json& core : manifest.at("cores")) {
@@ -116,7 +130,23 @@ VectorContent readManifest(const std::string& directory) {
         return content;
     } catch (const Json::exception&) {
         throw fileError(file, "is not a well-formed manifest", remedy);
+    } catch (const std::invalid_argument& error) {
+        throw fileError(file, fmt::format("is not a well-formed manifest: {}", error.what()), remedy);
     }
+}
+
+std::string readUnaltered(const std::string& directory, const std::string& name,
+                          const VectorContent& content) {
+    const std::string file = directory + '/' + name;
+    std::ifstream stream = openInput(file);
+    std::string bytes(std::istreambuf_iterator<char>(stream), {});
+    const auto entry = std::find_if(content.files.begin(), content.files.end(),
+                                    [&name](const VectorFile& candidate) { return candidate.name == name; });
+    if (entry == content.files.end() || entry->sha256 != sweep::sha256(bytes)) {
+        throw fileError(file, "is not the file that was made with this set: its SHA-256 differs",
+                        "make the set again with 'quarzel vectors'");
+    }
+    return bytes;
 }
 
 }  // namespace quarzel::tool

@@ -4,6 +4,7 @@
 #include <cstddef>
 #include <cstdint>
 #include <nlohmann/json_fwd.hpp>
+#include <optional>
 #include <string>
 #include <vector>
 
@@ -16,9 +17,10 @@ constexpr const char* manifestName = "manifest.json";
 struct VectorBlock {
     std::uint32_t blockSize;  ///< K
     int iterations;
-    std::string stimulus;  ///< what its soft values are
-    std::string capture;   ///< the npy file, in the directory of the core, that holds them too
-    std::size_t row;       ///< and where in it, from 0
+    std::string stimulus;              ///< what its soft values are
+    std::string capture;               ///< the npy file, in the directory of the core, that holds them too
+    std::size_t row;                   ///< and where in it, from 0
+    std::optional<unsigned> tag = {};  ///< what the core gets and gives back; for people, not read back
 };
 
 /// The blocks for one core, which lie in a directory of their own.
@@ -61,5 +63,12 @@ std::string manifestText(const nlohmann::ordered_json& configuration, const nloh
 /// @param directory  of the set
 /// @throws ToolError when there is none, or it is of another version or not well-formed
 VectorContent readManifest(const std::string& directory);
+
+/// The bytes of a file of a set, which must be as the manifest says.
+/// @param directory  of the set
+/// @param name       of the file, from there on
+/// @throws ToolError when it cannot be read or is another one
+std::string readUnaltered(const std::string& directory, const std::string& name,
+                          const VectorContent& content);
 
 }  // namespace quarzel::tool

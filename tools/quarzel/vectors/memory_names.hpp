@@ -11,6 +11,7 @@ namespace quarzel::tool {
 constexpr std::array<const char*, 3> softMemories = {"rsc1_sys", "rsc1_par", "rsc2_par"};
 constexpr const char* decisionMemory = "dout";
 constexpr const char* blockMemory = "blocks";
+constexpr const char* tagMemory = "tags";
 constexpr const char* crcMemory = "crc";
 
 inline std::string memoryFile(const std::string& memory) {

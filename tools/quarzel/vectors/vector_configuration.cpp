@@ -35,10 +35,19 @@ Each core has a directory:
   means bit 1, the unit is 1/8
 - dout.hex: for $readmemh; the hard decisions that the core is to give, a bit a word, K a block
 - npy/: the same blocks by K and iterations, for 'quarzel decode' and numpy
-{link}
+{tags}{link}
+Blocks count from 0, and so do transport blocks, code blocks and transmissions where there are any.
+
 A bench that writes its decisions with $writememh is checked by
 
     quarzel compare {first} simulated.hex
+)text";
+
+constexpr std::string_view tagsReadme =
+    R"text(- tags.hex: for $readmemh; the tag that each block is given and that the core, of 8-bit tags, gives back
+
+Run the blocks of a core in their order, on one core, and compare tags too: some of the faults that the set finds show in
+nothing else.
 )text";
 
 constexpr std::string_view linkReadme = R"text(
@@ -92,6 +101,10 @@ Json stimuliJson(const VectorRequest& request) {
     return names;
 }
 
+Json coverJson(Cover cover) {
+    return cover == Cover::nothing ? Json(false) : Json(cover == Cover::faults ? "faults" : "sizes");
+}
+
 bool isLlr(const VectorRequest& request) {
     return request.quantiser.kind == link::Quantiser::Kind::llr;
 }
@@ -104,9 +117,21 @@ std::string sizesText(const std::vector<std::uint32_t>& sizes) {
 }  // namespace
 
 Json configurationJson(const VectorRequest& request) {
+    if (request.cover == Cover::faults) {
+        return {{"cover", coverJson(request.cover)},
+                {"units", request.units},
+                {"algorithms", request.algorithms},
+                {"command", commandOf(request)}};
+    }
+    if (request.capture) {
+        return {{"capture", request.capture->file}, {"block_sizes", request.blockSizes},
+                {"units", request.units},           {"algorithms", request.algorithms},
+                {"iterations", request.iterations}, {"blocks", request.blocks},
+                {"command", commandOf(request)}};
+    }
     Json configuration = {
         {"seed", request.seed},
-        {"cover", request.cover},
+        {"cover", coverJson(request.cover)},
         {"block_sizes", request.blockSizes},
         {"units", request.units},
         {"algorithms", request.algorithms},
@@ -124,16 +149,26 @@ Json configurationJson(const VectorRequest& request) {
 
 std::string commandOf(const VectorRequest& request) {
     const std::string what =
-        request.cover  ? "--cover"
-        : request.link ? linkText(*request.link)
+        request.capture                  ? "--capture " + shellWord(request.capture->file)
+        : request.cover == Cover::faults ? "--cover"
+        : request.cover == Cover::sizes  ? "--cover-sizes"
+        : request.link                   ? linkText(*request.link)
                        : fmt::format("--block-size {} --stimulus {}", sizesText(request.blockSizes),
                                      fmt::join(stimuliJson(request).get<std::vector<std::string>>(), ","));
-    return fmt::format(
-        "quarzel vectors DIRECTORY {} --units {} --algorithm {} --iterations {} --blocks {} "
-        "--ebn0 {} --{} {} --seed {}",
-        what, fmt::join(request.units, ","), fmt::join(request.algorithms, ","),
-        fmt::join(request.iterations, ","), request.blocks, request.ebN0.value(),
-        isLlr(request) ? "llr" : "scale", request.quantiser.scale, request.seed);
+    const std::string command =
+        fmt::format("quarzel vectors DIRECTORY {} --units {} --algorithm {}", what,
+                    fmt::join(request.units, ","), fmt::join(request.algorithms, ","));
+    if (request.cover == Cover::faults) {
+        return command;
+    }
+    const std::string iterations = fmt::format("--iterations {}", fmt::join(request.iterations, ","));
+    const std::string quantiser =
+        fmt::format("--{} {}", isLlr(request) ? "llr" : "scale", request.quantiser.scale);
+    if (request.capture) {
+        return command + ' ' + iterations + (request.isScaled ? ' ' + quantiser : "");
+    }
+    return fmt::format("{} {} --blocks {} --ebn0 {} {} --seed {}", command, iterations, request.blocks,
+                       request.ebN0.value(), quantiser, request.seed);
 }
 
 std::string readmeText(const VectorRequest& request, const std::vector<VectorCore>& cores) {
@@ -146,6 +181,7 @@ std::string readmeText(const VectorRequest& request, const std::vector<VectorCor
     link += request.link && request.link->transportBlock != 0 ? crcReadme : "";
     return fmt::format(readme, fmt::arg("version", QUARZEL_VERSION), fmt::arg("command", commandOf(request)),
                        fmt::arg("cores", list), fmt::arg("link", link),
+                       fmt::arg("tags", request.cover == Cover::faults ? tagsReadme : ""),
                        fmt::arg("first", cores.front().directory));
 }
 

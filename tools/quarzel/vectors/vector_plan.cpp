@@ -38,7 +38,7 @@ bool isAtAnEnd(const std::vector<std::uint32_t>& sizes, std::size_t index, std::
 std::vector<PlannedBlock> planBlocks(const VectorRequest& request, std::uint32_t units) {
     std::vector<PlannedBlock> plan;
     const std::vector<std::uint32_t>& sizes = request.blockSizes;
-    if (!request.cover) {
+    if (request.cover != Cover::sizes) {
         for (const std::uint32_t K : sizes) {
             for (const int iterations : request.iterations) {
                 for (const Stimulus stimulus : request.stimuli) {

@@ -33,10 +33,21 @@ constexpr const char* footer = R"(Stimuli:
   first-segment  a code word with noise in the first thread segment alone
   last-segment   a code word with noise in the last thread segment and the tail
 
+Captures:
+  With --capture the blocks are those of a capture, as 'quarzel decode' reads
+  it, all of them with each number of iterations; soft values outside -128 to
+  127 are saturated as the core does it. Real numbers need --llr or --scale.
+  Block n of the capture is row n of the set's npy files, both from 0.
+
 Covering sets:
-  With --cover the set has, for every K, blocks of noise and one of the other
-  stimuli in turn, and all stimuli at the smallest and the greatest K of each
-  number of thread segments. That reaches every K, every shape of windows,
+  With --cover each core has about ten blocks, chosen so that their decisions
+  and tags give away every fault of a catalogue of 330 that a design can have
+  and any block can find. The manifest tells how many they find, and how many
+  of 30 further faults, which no block was chosen for. Tags are in tags.hex.
+
+  With --cover-sizes the set has, for every K, blocks of noise and one of the
+  other stimuli in turn, and all stimuli at the smallest and the greatest K of
+  each number of thread segments. That reaches every K, every shape of windows,
   first, middle and last segments, both ends of the range in each stream, and
   all iteration counts; the manifest counts what is reached.
 
@@ -59,15 +70,18 @@ Directory:
                  soft values of all blocks, two's complement bytes
     dout.hex     the decisions expected, a bit a word
     npy/         the same blocks by K and iterations, for 'quarzel decode'
+    tags.hex     with --cover: the tag of each block, 8 bits
     crc.hex      of transport blocks: which CRCs hold
   link/          the stages of a link; the manifest tells what each file holds
-  The .hex files are for $readmemh. The directory is written whole or not at
-  all. The same seed and options give the same bytes, whatever the number of
-  threads.
+  The .hex files are for $readmemh; blocks, transmissions and bits count from 0.
+  The directory is written whole or not at all. The same seed and options give
+  the same bytes, whatever the number of threads. Off a terminal a line a
+  minute on standard error tells how far it is.
 
 Examples:
   quarzel vectors vectors --block-size 40,6144 --units 8 --ebn0 0.8
   quarzel vectors covering --cover --units 4 --algorithm 2
+  quarzel vectors own --capture result.json.failures/k1024_u2_a1_i6.soft.npy
   quarzel vectors link --transport-block 4264 --coded-bits 12876 --rv 0,2
   quarzel compare vectors/u8_a1 simulated.hex
 )";

@@ -7,6 +7,7 @@
 #include <cmath>
 #include <numeric>
 
+#include "files/input_file.hpp"
 #include "options/block_sizes.hpp"
 #include "options/choices.hpp"
 #include "options/core_options.hpp"
@@ -39,11 +40,43 @@ void requireUnused(bool isGiven, const std::string& option, const std::string& o
     }
 }
 
-/// An option of the link that is given; empty when none is.
-std::string linkOptionOf(const VectorsOptions& options) {
-    const auto given = std::find_if(options.linkOptions.begin(), options.linkOptions.end(),
+/// The first one of some options that is given; empty when none is.
+std::string givenOf(const std::vector<const CLI::Option*>& options) {
+    const auto given = std::find_if(options.begin(), options.end(),
                                     [](const CLI::Option* option) { return option->count() != 0; });
-    return given == options.linkOptions.end() ? "" : (*given)->get_name();
+    return given == options.end() ? "" : (*given)->get_name();
+}
+
+/// Take the blocks of a capture, for cores and iterations of the user's choice.
+void takeCapture(VectorRequest& request, const VectorsOptions& options) {
+    constexpr const char* hasBlocks = "--capture, which has the blocks";
+    requireUnused(options.coverFaults, "--cover", hasBlocks);
+    requireUnused(options.coverSizes, "--cover-sizes", hasBlocks);
+    for (const CLI::Option* option : options.blockOptions) {
+        const std::string name = option->get_name();
+        const bool isOfQuantiser = name == "--llr" || name == "--scale";
+        const bool isGiven = option->count() != 0;
+        requireUnused(isGiven && !isOfQuantiser && name != "--iterations", name, hasBlocks);
+        request.isScaled = request.isScaled || (isGiven && isOfQuantiser);
+    }
+    std::ifstream stream = openInput(*options.capture);
+    request.capture = std::make_shared<const Capture>(readCapture(
+        stream, *options.capture, request.isScaled ? std::optional(request.quantiser.scale) : std::nullopt));
+    request.blockSizes = {request.capture->blockSize};
+    request.blocks = request.capture->blocks();
+}
+
+/// One core, and the usual iterations, where none are named.
+void takeUsualCore(VectorRequest& request) {
+    request.units = orDefault(request.units, {2});
+    request.algorithms = orDefault(request.algorithms, {1});
+    request.iterations = orDefault(request.iterations, {6});
+}
+
+/// All cores, where none are named.
+void coverAllCores(VectorRequest& request) {
+    request.units = orDefault(request.units, {2, 4, 8});
+    request.algorithms = orDefault(request.algorithms, {0, 1, 2});
 }
 
 CLI::Validator numberIn(double low, double high) {
@@ -69,15 +102,29 @@ CLI::Validator oneOfStimuli() {
 
 VectorRequest requestOf(const VectorsOptions& options) {
     VectorRequest request = options.request;
-    const std::string linkOption = linkOptionOf(options);
-    if (request.cover) {
-        constexpr const char* takesAll = "--cover, which takes all";
+    const std::string linkOption = givenOf(options.linkOptions);
+    if (options.capture) {
+        takeCapture(request, options);
+        takeUsualCore(request);
+        return request;
+    }
+    if (options.coverFaults) {
+        constexpr const char* isChosen = "--cover, whose blocks are chosen";
+        requireUnused(options.coverSizes, "--cover-sizes", isChosen);
+        const std::string blockOption = givenOf(options.blockOptions);
+        requireUnused(!blockOption.empty(), blockOption, isChosen);
+        request.cover = Cover::faults;
+        coverAllCores(request);
+        return request;
+    }
+    if (options.coverSizes) {
+        constexpr const char* takesAll = "--cover-sizes, which takes all";
+        request.cover = Cover::sizes;
         requireUnused(!options.blockSizes.empty(), "--block-size", takesAll);
         requireUnused(!options.stimuli.empty(), "--stimulus", takesAll);
         requireUnused(!linkOption.empty(), linkOption, takesAll);
         request.blockSizes = blockSizesOf({"all"}, "--block-size");
-        request.units = orDefault(request.units, {2, 4, 8});
-        request.algorithms = orDefault(request.algorithms, {0, 1, 2});
+        coverAllCores(request);
         request.iterations = orDefault(request.iterations, numbersTo(15));
         for (std::size_t i = 0; i < stimulusNames.size(); ++i) {
             request.stimuli.push_back(static_cast<Stimulus>(i));
@@ -92,16 +139,14 @@ VectorRequest requestOf(const VectorsOptions& options) {
         } else {
             request.blockSizes = orDefault(request.blockSizes, {40});
         }
-        request.units = orDefault(request.units, {2});
-        request.algorithms = orDefault(request.algorithms, {1});
-        request.iterations = orDefault(request.iterations, {6});
+        takeUsualCore(request);
         for (const std::string& name : options.stimuli) {
             const auto found = std::find(stimulusNames.begin(), stimulusNames.end(), name);
             request.stimuli.push_back(static_cast<Stimulus>(found - stimulusNames.begin()));
         }
         request.stimuli = orDefault(request.stimuli, {Stimulus::noise});
     }
-    request.blocks = options.blocks.value_or(request.cover ? 1 : 10);
+    request.blocks = options.blocks.value_or(options.coverSizes ? 1 : 10);
     request.ebN0.micro = static_cast<std::int32_t>(std::lround(options.ebN0 * 1e6));
     return request;
 }
@@ -109,24 +154,31 @@ VectorRequest requestOf(const VectorsOptions& options) {
 void addVectorsOptions(CLI::App& command, VectorsOptions& options) {
     VectorRequest& request = options.request;
     command.add_option("DIRECTORY", options.directory, "Where the set is made")->required()->type_name("");
-    command.add_flag("--cover", request.cover, "Make a set that reaches everything, see below");
+    command.add_flag("--cover", options.coverFaults,
+                     "Make a small set that finds the faults of designs, see\nbelow");
+    command.add_flag("--cover-sizes", options.coverSizes,
+                     "Make a set of every K and every shape of windows,\nsee below");
+    command.add_option("--capture", options.capture, "Take the blocks of this capture, see below")
+        ->type_name("FILE");
+    addListOption(
+        command, "--units", request.units,
+        "Processing units of the cores: 2, 4 or 8 (default 2;\nwith --cover and --cover-sizes 2,4,8)",
+        "N,...", unitsCheck());
+    addListOption(command, "--algorithm", request.algorithms,
+                  "0, 1 or 2, see 'quarzel decode --help' (default 1;\nwith --cover and --cover-sizes 0,1,2)",
+                  "N,...", algorithmCheck());
+    const std::size_t before = command.get_options().size();
     addListOption(command, "--block-size", options.blockSizes,
                   "Block sizes, divided by commas, or all (default\n40)", "K,...", blockSizeOrAll());
     addListOption(command, "--stimulus", options.stimuli, "Stimuli, see below (default noise)", "NAME,...",
                   oneOfStimuli());
-    addListOption(command, "--units", request.units,
-                  "Processing units of the cores: 2, 4 or 8\n(default 2; with --cover 2,4,8)", "N,...",
-                  unitsCheck());
-    addListOption(command, "--algorithm", request.algorithms,
-                  "0, 1 or 2, see 'quarzel decode --help' (default 1;\nwith --cover 0,1,2)", "N,...",
-                  algorithmCheck());
     addListOption(command, "--iterations", request.iterations,
-                  "Iterations, 1 to 15 (default 6; with --cover 1 to\n15, one after the other)", "N,...",
-                  iterationsCheck());
+                  "Iterations, 1 to 15 (default 6; with --cover-sizes\n1 to 15, one after the other)",
+                  "N,...", iterationsCheck());
     command
         .add_option("--blocks", options.blocks,
-                    "Blocks of each K, iterations and stimulus (default\n10; with --cover of noise, default "
-                    "1); of a link, its\nblocks in all")
+                    "Blocks of each K, iterations and stimulus (default\n10; with --cover-sizes of noise, "
+                    "default 1); of a\nlink, its blocks in all")
         ->type_name("N")
         ->transform(wholeNumber([](std::uint64_t n) { return n >= 1 && n <= 1000000; },
                                 "a number from 1 to 1000000"));
@@ -138,11 +190,14 @@ void addVectorsOptions(CLI::App& command, VectorsOptions& options) {
     addQuantiserOptions(command, request.quantiser);
     const std::size_t others = command.get_options().size();
     addLinkOptions(command, options.link);
-    const std::vector<CLI::Option*> all = command.get_options();
-    options.linkOptions.assign(all.begin() + static_cast<std::ptrdiff_t>(others), all.end());
+    const std::size_t ofLink = command.get_options().size();
     command.add_option("--seed", request.seed, "Seed of bits and noise (default 1)")
         ->type_name("N")
         ->transform(wholeNumber([](std::uint64_t) { return true; }, "a whole number"));
+    const std::vector<CLI::Option*> all = command.get_options();
+    const auto at = [&all](std::size_t place) { return all.begin() + static_cast<std::ptrdiff_t>(place); };
+    options.blockOptions.assign(at(before), all.end());
+    options.linkOptions.assign(at(others), at(ofLink));
     addThreadsOption(command, options.threads);
     command.add_flag("--replace", options.replace, "Replace the vector set in DIRECTORY");
     command.add_flag("--json", options.json, "Print one JSON object instead of text");

@@ -19,12 +19,16 @@ struct VectorsOptions {
     std::vector<std::string> blockSizes;
     std::vector<std::string> stimuli;
     std::optional<std::size_t> blocks;
+    std::optional<std::string> capture;
     double ebN0 = 1.0;
     unsigned threads = allCores();
     bool replace = false;
     bool json = false;
     LinkOptions link;
-    std::vector<const CLI::Option*> linkOptions;  ///< those of the link, given or not
+    std::vector<const CLI::Option*> blockOptions;  ///< those that tell what the blocks are, given or not
+    std::vector<const CLI::Option*> linkOptions;   ///< those of the link among them
+    bool coverFaults = false;
+    bool coverSizes = false;
     VectorRequest request;
 };
 

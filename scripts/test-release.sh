@@ -1,0 +1,43 @@
+#!/usr/bin/env bash
+# SPDX-License-Identifier: MIT
+# The checks of a release, which take a night: test-release.sh [PART...]
+# A run that was interrupted goes on where it was: parts that have passed at this commit are not run again.
+set -euo pipefail
+cd "$(dirname "$0")/.."
+. scripts/check_parts.sh
+
+part_test() { make test; }
+part_long() { scripts/test-long.sh; }
+part_old_processors() {
+    scripts/build.sh release
+    for processor in Nehalem core2duo; do
+        QUARZEL_TEST_EXHAUSTIVE=1 qemu-x86_64 -cpu $processor build/release/tests/frozen/frozen_decisions_test
+    done
+}
+# Every entry of the frozen decisions from each compiler at each level.
+part_compilers() {
+    for compiler in gcc,g++ clang,clang++; do
+        for flags in -O0 -O2 -O3 '-O2 -flto'; do
+            build=build/compilers/${compiler%,*}$(tr -d ' ' <<<"$flags")
+            cmake -G Ninja -S . -B "$build" -DCMAKE_BUILD_TYPE=Release -DQUARZEL_HARDEN=OFF \
+                -DCMAKE_C_COMPILER="${compiler%,*}" -DCMAKE_CXX_COMPILER="${compiler#*,}" \
+                -DCMAKE_C_FLAGS_RELEASE="$flags -DNDEBUG" -DCMAKE_CXX_FLAGS_RELEASE="$flags -DNDEBUG"
+            cmake --build "$build" --target frozen_decisions_test
+            QUARZEL_TEST_EXHAUSTIVE=1 "$build/tests/frozen/frozen_decisions_test" --gtest_brief=1
+        done
+    done
+}
+part_thread_sanitizer() {
+    cmake -G Ninja -S . -B build/threads -DCMAKE_BUILD_TYPE=Debug -DCMAKE_CXX_FLAGS_DEBUG='-O1 -g1 -fsanitize=thread' \
+        -DCMAKE_C_COMPILER=clang -DCMAKE_CXX_COMPILER=clang++
+    cmake --build build/threads --target hostile_host_test link_test
+    build/threads/tests/interface/hostile_host_test --gtest_filter='*32Threads*'
+    build/threads/tests/link/link_test --gtest_filter='*Parallel*'
+}
+part_fuzz_calls() { scripts/fuzz.sh 1000000 differential library_text options rate_recovery; }
+part_fuzz_readers() { scripts/fuzz.sh 10000000 memory_files reference_curves traces; }
+
+parts=(test long old_processors compilers thread_sanitizer fuzz_calls fuzz_readers)
+[ $# -gt 0 ] || set -- "${parts[@]}"
+scripts/install-packages.sh long
+run_parts test-release yes "$@"
