@@ -14,6 +14,13 @@ part_old_processors() {
         QUARZEL_TEST_EXHAUSTIVE=1 qemu-x86_64 -cpu $processor build/release/tests/frozen/frozen_decisions_test
     done
 }
+# The library on processors without lanes of their own, one of them big endian, emulated.
+part_other_processors() {
+    for processor in armhf ppc64le riscv64 s390x; do
+        scripts/build.sh $processor
+        ctest --preset $processor
+    done
+}
 # Every entry of the frozen decisions from each compiler at each level.
 part_compilers() {
     for compiler in gcc,g++ clang,clang++; do
@@ -37,7 +44,7 @@ part_thread_sanitizer() {
 part_fuzz_calls() { scripts/fuzz.sh 1000000 differential library_text options rate_recovery; }
 part_fuzz_readers() { scripts/fuzz.sh 10000000 memory_files reference_curves traces; }
 
-parts=(test long old_processors compilers thread_sanitizer fuzz_calls fuzz_readers)
+parts=(test long old_processors other_processors compilers thread_sanitizer fuzz_calls fuzz_readers)
 [ $# -gt 0 ] || set -- "${parts[@]}"
 scripts/install-packages.sh long
 run_parts test-release yes "$@"
