@@ -5,7 +5,6 @@
 #include <openssl/evp.h>
 
 #include <array>
-#include <iterator>
 #include <stdexcept>
 
 namespace quarzel::sweep {
@@ -18,7 +17,7 @@ std::string sha256(std::string_view bytes) {
     }
     std::string text;
     for (unsigned i = 0; i < size; ++i) {
-        fmt::format_to(std::back_inserter(text), "{:02x}", digest[i]);
+        text += fmt::format("{:02x}", digest[i]);
     }
     return text;
 }

@@ -4,13 +4,12 @@
 #include <fmt/format.h>
 
 #include <algorithm>
-#include <iterator>
 #include <string_view>
 
 #include "files/input_file.hpp"
 #include "files/output_file.hpp"
-#include "report_text.hpp"
 #include "tool_error.hpp"
+#include "valid_text.hpp"
 
 namespace quarzel::tool {
 
@@ -37,7 +36,7 @@ std::string escaped(const std::string& text) {
             case '\n':
             case '\r':
             case '\t':
-                fmt::format_to(std::back_inserter(xml), "&#{};", int{c});
+                xml += fmt::format("&#{};", int{c});
                 break;
             default:
                 if (static_cast<unsigned char>(c) < ' ') {
@@ -61,12 +60,12 @@ std::string junitText(const std::string& suite, const std::vector<JunitCase>& ca
         "<?xml version=\"1.0\" encoding=\"UTF-8\"?>\n<testsuites {0}>\n <testsuite {0} skipped=\"0\">\n",
         counts);
     for (const JunitCase& test : cases) {
-        fmt::format_to(std::back_inserter(xml), "  <testcase classname=\"{}\" name=\"{}\"",
-                       escaped(test.className), escaped(test.name));
+        xml += fmt::format("  <testcase classname=\"{}\" name=\"{}\"", escaped(test.className),
+                           escaped(test.name));
         if (test.failure) {
-            fmt::format_to(std::back_inserter(xml),
-                           ">\n   <failure message=\"{}\" type=\"difference\">{}</failure>\n  </testcase>\n",
-                           escaped(test.failure->message), escaped(test.failure->details));
+            xml +=
+                fmt::format(">\n   <failure message=\"{}\" type=\"difference\">{}</failure>\n  </testcase>\n",
+                            escaped(test.failure->message), escaped(test.failure->details));
         } else {
             xml += "/>\n";
         }

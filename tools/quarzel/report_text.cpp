@@ -4,14 +4,12 @@
 #include <fmt/format.h>
 
 #include <cstdint>
-#include <iterator>
-#include <nlohmann/json.hpp>
 #include <utility>
 
 namespace quarzel::tool {
 
 void reportLine(std::string& text, std::string_view label, std::string_view content) {
-    fmt::format_to(std::back_inserter(text), "{:14}{}\n", label, content);
+    text += fmt::format("{:14}{}\n", label, content);
 }
 
 std::string counted(std::size_t number, std::string_view noun, std::string_view plural) {
@@ -39,20 +37,6 @@ std::string shellWord(const std::string& text) {
         word += c == '\'' ? "'\\''" : std::string(1, c);
     }
     return word + '\'';
-}
-
-std::string validText(const std::string& text) {
-    using Json = nlohmann::json;
-    constexpr std::string_view replacement = "\xef\xbf\xbd";
-    std::string valid =
-        Json::parse(Json(text).dump(-1, ' ', false, Json::error_handler_t::replace)).get<std::string>();
-    for (const std::string_view none :
-         {"\xef\xbf\xbe", "\xef\xbf\xbf"}) {  // U+FFFE and U+FFFF, which XML forbids
-        for (std::size_t at = 0; (at = valid.find(none, at)) != std::string::npos;) {
-            valid.replace(at, none.size(), replacement);
-        }
-    }
-    return valid;
 }
 
 std::string durationText(double seconds) {

@@ -21,9 +21,6 @@ std::string listText(std::vector<std::string> items, std::size_t most);
 /// The word of a shell that stands for a text.
 std::string shellWord(const std::string& text);
 
-/// A text in UTF-8 that XML can hold: what is neither becomes U+FFFD. Control characters stay.
-std::string validText(const std::string& text);
-
 /// Hours, minutes and seconds: "1:02:03".
 std::string durationText(double seconds);
 

@@ -1,8 +1,9 @@
 // SPDX-License-Identifier: MIT
 #pragma once
 
-#include <CLI/CLI.hpp>
 #include <ostream>
+
+#include "options/cli_fwd.hpp"
 
 namespace quarzel::tool {
 

@@ -2,6 +2,7 @@
 #include "decode/info_command.hpp"
 
 #include <fmt/format.h>
+#include <CLI/CLI.hpp>
 
 #include <array>
 #include <cstdint>

@@ -2,6 +2,7 @@
 #include "options/block_sizes.hpp"
 
 #include <fmt/format.h>
+#include <CLI/CLI.hpp>
 
 #include <algorithm>
 

@@ -1,12 +1,12 @@
 // SPDX-License-Identifier: MIT
 #pragma once
 
-#include <CLI/CLI.hpp>
 #include <cstdint>
 #include <string>
 #include <vector>
 
 #include "link/size_table.hpp"
+#include "options/cli_fwd.hpp"
 
 namespace quarzel::tool {
 

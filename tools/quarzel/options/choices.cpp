@@ -2,6 +2,7 @@
 #include "options/choices.hpp"
 
 #include <fmt/format.h>
+#include <CLI/CLI.hpp>
 
 #include <utility>
 

@@ -2,6 +2,7 @@
 #include "options/core_options.hpp"
 
 #include <fmt/format.h>
+#include <CLI/CLI.hpp>
 
 #include <algorithm>
 #include <cstdint>

@@ -1,9 +1,9 @@
 // SPDX-License-Identifier: MIT
 #pragma once
 
-#include <CLI/CLI.hpp>
 #include <string>
 
+#include "options/cli_fwd.hpp"
 #include "quarzel/core.hpp"
 
 namespace quarzel::tool {

@@ -2,6 +2,7 @@
 #include "options/link_options.hpp"
 
 #include <fmt/format.h>
+#include <CLI/CLI.hpp>
 
 #include <algorithm>
 #include <string_view>

@@ -1,10 +1,11 @@
 // SPDX-License-Identifier: MIT
 #pragma once
 
-#include <CLI/CLI.hpp>
 #include <cstdint>
 #include <string>
 #include <vector>
+
+#include "options/cli_fwd.hpp"
 
 namespace quarzel::tool {
 

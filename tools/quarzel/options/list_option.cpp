@@ -2,6 +2,7 @@
 #include "options/list_option.hpp"
 
 #include <fmt/format.h>
+#include <CLI/CLI.hpp>
 
 namespace quarzel::tool {
 

@@ -2,6 +2,7 @@
 #include "options/quantiser_options.hpp"
 
 #include <fmt/format.h>
+#include <CLI/CLI.hpp>
 
 #include <string>
 

@@ -1,11 +1,11 @@
 // SPDX-License-Identifier: MIT
 #pragma once
 
-#include <CLI/CLI.hpp>
 #include <optional>
 #include <string>
 
 #include "link/channel_thresholds.hpp"
+#include "options/cli_fwd.hpp"
 
 namespace quarzel::tool {
 

@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: MIT
 #include "options/threads_option.hpp"
 
+#include <CLI/CLI.hpp>
 #include <algorithm>
 #include <cstdint>
 #include <thread>

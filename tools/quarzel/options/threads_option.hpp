@@ -1,7 +1,7 @@
 // SPDX-License-Identifier: MIT
 #pragma once
 
-#include <CLI/CLI.hpp>
+#include "options/cli_fwd.hpp"
 
 namespace quarzel::tool {
 

@@ -2,6 +2,7 @@
 #include "options/whole_number.hpp"
 
 #include <fmt/format.h>
+#include <CLI/CLI.hpp>
 
 #include <algorithm>
 #include <charconv>

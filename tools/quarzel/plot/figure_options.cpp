@@ -2,6 +2,7 @@
 #include "plot/figure_options.hpp"
 
 #include <fmt/format.h>
+#include <CLI/CLI.hpp>
 
 #include <charconv>
 #include <cmath>

@@ -1,9 +1,9 @@
 // SPDX-License-Identifier: MIT
 #pragma once
 
-#include <CLI/CLI.hpp>
-
 #include "plot/figure_layout.hpp"
+
+#include "options/cli_fwd.hpp"
 
 namespace quarzel::tool {
 

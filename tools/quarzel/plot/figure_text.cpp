@@ -5,7 +5,7 @@
 
 #include <string_view>
 
-#include "report_text.hpp"
+#include "valid_text.hpp"
 
 namespace quarzel::tool {
 

@@ -3,8 +3,6 @@
 
 #include <fmt/format.h>
 
-#include <iterator>
-
 namespace quarzel::tool {
 
 namespace {
@@ -32,8 +30,8 @@ std::string pictureCsv(const Picture& picture, const FigureAxes& axes) {
                 if (!isIn(axes.x, point.x) || !isIn(axes.y[p], point.rate > 0 ? point.rate : point.high)) {
                     continue;
                 }
-                fmt::format_to(std::back_inserter(csv), "{},{},{},{:.9g},{},", picture.panels[p].name,
-                               quoted(curve.label), nameOf(curve.kind), point.x, point.rate);
+                csv += fmt::format("{},{},{},{:.9g},{},", picture.panels[p].name, quoted(curve.label),
+                                   nameOf(curve.kind), point.x, point.rate);
                 csv +=
                     curve.kind == CurveKind::measured ? fmt::format("{},{},", point.low, point.high) : ",,";
                 csv += point.blocks > 0 ? fmt::format("{},{}\n", point.blocks, point.errors) : ",\n";

@@ -3,7 +3,6 @@
 
 #include <fmt/format.h>
 
-#include <iterator>
 #include <string>
 #include <utility>
 
@@ -17,7 +16,7 @@ class Script {
   public:
     template <class... Values>
     void add(fmt::format_string<Values...> form, Values&&... values) {
-        fmt::format_to(std::back_inserter(itsText), form, std::forward<Values>(values)...);
+        itsText += fmt::format(form, std::forward<Values>(values)...);
     }
     const std::string& text() const { return itsText; }
 

@@ -2,6 +2,7 @@
 #include "shell/shell_commands.hpp"
 
 #include <fmt/format.h>
+#include <CLI/CLI.hpp>
 
 #include <algorithm>
 #include <memory>

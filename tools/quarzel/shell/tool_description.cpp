@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: MIT
 #include "shell/tool_description.hpp"
 
+#include <CLI/CLI.hpp>
 #include <algorithm>
 
 #include "options/choices.hpp"

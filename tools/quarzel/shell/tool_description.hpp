@@ -1,9 +1,10 @@
 // SPDX-License-Identifier: MIT
 #pragma once
 
-#include <CLI/CLI.hpp>
 #include <string>
 #include <vector>
+
+#include "options/cli_fwd.hpp"
 
 namespace quarzel::tool {
 

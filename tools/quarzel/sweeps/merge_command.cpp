@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: MIT
 #include "sweeps/merge_command.hpp"
 
+#include <CLI/CLI.hpp>
 #include <algorithm>
 #include <filesystem>
 #include <iostream>

@@ -2,6 +2,7 @@
 #include "sweeps/rebuild_command.hpp"
 
 #include <fmt/format.h>
+#include <CLI/CLI.hpp>
 
 #include <iostream>
 #include <iterator>

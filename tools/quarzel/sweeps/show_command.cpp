@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: MIT
 #include "sweeps/show_command.hpp"
 
+#include <CLI/CLI.hpp>
 #include <memory>
 #include <string>
 

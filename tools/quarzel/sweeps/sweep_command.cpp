@@ -2,6 +2,7 @@
 #include "sweeps/sweep_command.hpp"
 
 #include <fmt/format.h>
+#include <CLI/CLI.hpp>
 #include <filesystem>
 #include <iostream>
 #include <optional>

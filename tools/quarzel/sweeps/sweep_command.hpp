@@ -1,11 +1,11 @@
 // SPDX-License-Identifier: MIT
 #pragma once
 
-#include <CLI/CLI.hpp>
 #include <functional>
 #include <memory>
 #include <ostream>
 
+#include "options/cli_fwd.hpp"
 #include "sweep/run.hpp"
 
 namespace quarzel::tool {

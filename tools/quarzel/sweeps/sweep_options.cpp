@@ -2,6 +2,7 @@
 #include "sweeps/sweep_options.hpp"
 
 #include <fmt/format.h>
+#include <CLI/CLI.hpp>
 
 #include <string_view>
 

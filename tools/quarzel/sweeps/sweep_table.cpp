@@ -2,6 +2,7 @@
 #include "sweeps/sweep_table.hpp"
 
 #include <fmt/format.h>
+#include <CLI/CLI.hpp>
 
 #include <algorithm>
 

@@ -1,10 +1,10 @@
 // SPDX-License-Identifier: MIT
 #pragma once
 
-#include <CLI/CLI.hpp>
 #include <ostream>
 #include <string>
 
+#include "options/cli_fwd.hpp"
 #include "sweep/result.hpp"
 
 /// The forms in which a sweep's result is printed.

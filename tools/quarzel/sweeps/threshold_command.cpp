@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: MIT
 #include "sweeps/threshold_command.hpp"
 
+#include <CLI/CLI.hpp>
 #include <algorithm>
 #include <filesystem>
 #include <map>

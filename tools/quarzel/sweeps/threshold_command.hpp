@@ -1,9 +1,9 @@
 // SPDX-License-Identifier: MIT
 #pragma once
 
-#include <CLI/CLI.hpp>
 #include <ostream>
 
+#include "options/cli_fwd.hpp"
 #include "sweeps/sweep_command.hpp"
 
 namespace quarzel::tool {

@@ -2,6 +2,7 @@
 #include "sweeps/verify_result_command.hpp"
 
 #include <fmt/format.h>
+#include <CLI/CLI.hpp>
 
 #include <memory>
 #include <nlohmann/json.hpp>

@@ -4,7 +4,6 @@
 #include <fmt/format.h>
 
 #include <algorithm>
-#include <iterator>
 
 namespace quarzel::tool {
 
@@ -32,21 +31,19 @@ void appendContext(std::string& text, const TraceDifference& difference) {
         }
     };
     text += "\nstep   raw";
-    forEachColumn([&](unsigned column) {
-        fmt::format_to(std::back_inserter(text), "{:>{}}", traceColumns()[column].heading(), width);
-    });
+    forEachColumn(
+        [&](unsigned column) { text += fmt::format("{:>{}}", traceColumns()[column].heading(), width); });
     text += '\n';
     const std::uint32_t step = difference.step;
     const std::uint32_t end = std::min(difference.steps, step + contextSteps + 1);
     for (std::uint32_t s = step - std::min(step, contextSteps); s < end; ++s) {
         for (const std::size_t trace : {0U, 1U}) {
-            fmt::format_to(std::back_inserter(text), "{:4}  {}   ", s, trace == 0 ? 'A' : 'B');
+            text += fmt::format("{:4}  {}   ", s, trace == 0 ? 'A' : 'B');
             forEachColumn([&](unsigned column) {
                 const TraceValue a = difference.blocks[0]->value(difference.pass, s, column);
                 const TraceValue b = difference.blocks[1]->value(difference.pass, s, column);
                 const bool isMarked = trace == 1 && a.isThere() && b.isThere() && !(a == b);
-                fmt::format_to(std::back_inserter(text), "{:>{}}",
-                               (isMarked ? "*" : "") + (trace == 0 ? a : b).text(), width);
+                text += fmt::format("{:>{}}", (isMarked ? "*" : "") + (trace == 0 ? a : b).text(), width);
             });
             endRow(text);
         }

@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: MIT
 #include "trace/trace_diff_command.hpp"
 
+#include <CLI/CLI.hpp>
 #include <fstream>
 #include <iostream>
 #include <memory>

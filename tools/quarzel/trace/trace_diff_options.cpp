@@ -2,6 +2,7 @@
 #include "trace/trace_diff_options.hpp"
 
 #include <fmt/format.h>
+#include <CLI/CLI.hpp>
 
 #include "options/choices.hpp"
 #include "options/list_option.hpp"

@@ -1,11 +1,11 @@
 // SPDX-License-Identifier: MIT
 #pragma once
 
-#include <CLI/CLI.hpp>
 #include <optional>
 #include <string>
 #include <vector>
 
+#include "options/cli_fwd.hpp"
 #include "trace/trace_comparison.hpp"
 #include "trace/trace_value.hpp"
 

@@ -4,7 +4,6 @@
 #include <fmt/format.h>
 
 #include <algorithm>
-#include <iterator>
 #include <string_view>
 
 #include "report_text.hpp"
@@ -90,8 +89,7 @@ void printCounts(std::string& text, const TraceComparison& comparison) {
     std::size_t shown = 0;
     for (const auto& [table, count] : comparison.byTable) {
         if (shown++ == mostTables) {
-            fmt::format_to(std::back_inserter(text), "{}and {} more passes\n", indent,
-                           comparison.byTable.size() - mostTables);
+            text += fmt::format("{}and {} more passes\n", indent, comparison.byTable.size() - mostTables);
             break;
         }
         const auto& [block, pass] = table;

@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: MIT
 #include "trace/trace_options.hpp"
 
+#include <CLI/CLI.hpp>
 #include <limits>
 
 #include "options/choices.hpp"

@@ -1,11 +1,12 @@
 // SPDX-License-Identifier: MIT
 #pragma once
 
-#include <CLI/CLI.hpp>
 #include <cstddef>
 #include <cstdint>
 #include <optional>
 #include <string>
+
+#include "options/cli_fwd.hpp"
 
 namespace quarzel::tool {
 

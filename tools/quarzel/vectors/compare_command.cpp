@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: MIT
 #include "vectors/compare_command.hpp"
 
+#include <CLI/CLI.hpp>
 #include <memory>
 #include <optional>
 #include <string>

@@ -3,8 +3,6 @@
 
 #include <fmt/format.h>
 
-#include <iterator>
-
 namespace quarzel::tool {
 
 std::string linkLayoutText(const link::CodedLink& link) {
@@ -15,10 +13,9 @@ std::string linkLayoutText(const link::CodedLink& link) {
     for (std::size_t r = 0; r < link.segmentation().C; ++r) {
         const link::CodeBlockLink& block = link.codeBlock(r);
         const link::RateMatching& matching = block.matching();
-        fmt::format_to(std::back_inserter(text),
-                       "{:08x} {:08x} {:08x} {:08x} {:08x} {:08x} {:08x} {:08x} // code block {}\n",
-                       matching.K(), matching.filler(), block.codedBits(), matching.bufferSize(),
-                       link.bitsBefore(r), link.softValuesBefore(r), coded, entries, r);
+        text += fmt::format("{:08x} {:08x} {:08x} {:08x} {:08x} {:08x} {:08x} {:08x} // code block {}\n",
+                            matching.K(), matching.filler(), block.codedBits(), matching.bufferSize(),
+                            link.bitsBefore(r), link.softValuesBefore(r), coded, entries, r);
         coded += block.codedBits();
         entries += matching.bufferSize();
     }

@@ -2,6 +2,7 @@
 #include "vectors/vectors_options.hpp"
 
 #include <fmt/format.h>
+#include <CLI/CLI.hpp>
 
 #include <algorithm>
 #include <cmath>

@@ -1,12 +1,12 @@
 // SPDX-License-Identifier: MIT
 #pragma once
 
-#include <CLI/CLI.hpp>
 #include <cstddef>
 #include <optional>
 #include <string>
 #include <vector>
 
+#include "options/cli_fwd.hpp"
 #include "options/link_options.hpp"
 #include "options/threads_option.hpp"
 #include "vectors/vector_plan.hpp"
