@@ -14,11 +14,16 @@ part_old_processors() {
         QUARZEL_TEST_EXHAUSTIVE=1 qemu-x86_64 -cpu $processor build/release/tests/frozen/frozen_decisions_test
     done
 }
-# The library on processors without lanes of their own, one of them big endian, emulated.
+# The library on processors without lanes of their own, one of them big endian, emulated; and the frozen decisions there.
 part_other_processors() {
+    scripts/build.sh release
+    local processor emulator
     for processor in armhf ppc64le riscv64 s390x; do
         scripts/build.sh $processor
         ctest --preset $processor
+        emulator=$(sed -n 's/^CMAKE_CROSSCOMPILING_EMULATOR:[^=]*=//p' build/$processor/CMakeCache.txt | tr ';' ' ')
+        QUARZEL_FROZEN_DECODER="$emulator build/$processor/tests/frozen/frozen_decoder" \
+            build/release/tests/frozen/frozen_decisions_test --gtest_filter='*AnotherProcessor*'
     done
 }
 # Every entry of the frozen decisions from each compiler at each level.

@@ -3,11 +3,16 @@
 #include "frozen/frozen_decisions.hpp"
 
 #include <gtest/gtest.h>
+#include <unistd.h>
 
+#include <algorithm>
+#include <cstdio>
 #include <cstdlib>
 #include <fstream>
+#include <iterator>
 #include <tuple>
 
+#include "frozen/frozen_core.hpp"
 #include "lanes/lane_setup.hpp"
 #include "oracle/plain_decoder.hpp"
 
@@ -15,37 +20,6 @@ namespace quarzel::test {
 namespace {
 
 const std::string file = std::string(QUARZEL_TEST_DATA) + "/frozen_decisions.csv";
-
-using Decisions = std::vector<std::vector<unsigned char>>;
-
-/// A core by one of its implementations.
-class FrozenCore {
-  public:
-    FrozenCore(const FrozenCase& which, const std::string& implementation)
-        : itsState(
-              makeState(genericsOf(static_cast<int>(which.units), 8, static_cast<int>(which.algorithm)))) {
-        EXPECT_EQ(vardel_ip_quarzel_set_implementation(itsState.get(), implementation.c_str()), 0);
-    }
-
-    Decisions operator()(const std::vector<Block>& blocks) const {
-        Decisions decisions;
-        std::vector<vardel_ip_quarzel_inputs> inputs;
-        std::vector<vardel_ip_quarzel_outputs> outputs;
-        for (const Block& block : blocks) {
-            const std::size_t K = block.systematic.size() - 4;
-            decisions.emplace_back(K, 0xEE);
-            inputs.push_back(block.inputs());
-            outputs.push_back({decisions.back().data(), static_cast<int>(K), 0, 0});
-        }
-        EXPECT_EQ(vardel_ip_quarzel_bitacc_simulate_batch(itsState.get(), outputs.data(), inputs.data(),
-                                                          static_cast<int>(blocks.size()), nullptr),
-                  0);
-        return decisions;
-    }
-
-  private:
-    State itsState;
-};
 
 /// The decoder that shares nothing with the product.
 Decisions decodePlainly(const FrozenCase& which, const std::vector<Block>& blocks) {
@@ -59,6 +33,34 @@ Decisions decodePlainly(const FrozenCase& which, const std::vector<Block>& block
     return decisions;
 }
 
+/// Decode by frozen_decoder on another processor.
+/// @param program  it, with its emulator before it
+Decisions decodeElsewhere(const std::string& program, const FrozenCase& which,
+                          const std::vector<Block>& blocks) {
+    const std::string in = testing::TempDir() + "frozen_soft_values_" + std::to_string(getpid());
+    const std::string out = testing::TempDir() + "frozen_bits_" + std::to_string(getpid());
+    std::ofstream soft(in, std::ios::binary);
+    for (const Block& block : blocks) {
+        for (const std::vector<int>* stream : {&block.systematic, &block.parity1, &block.parity2}) {
+            std::transform(stream->begin(), stream->end(), std::ostreambuf_iterator<char>(soft),
+                           [](int value) { return static_cast<char>(value); });
+        }
+    }
+    soft.close();
+    const std::string command =
+        program + ' ' + std::to_string(which.units) + ' ' + std::to_string(which.algorithm) + ' ' +
+        std::to_string(blocks.front().iterations) + ' ' + std::to_string(which.K) + " <" + in + " >" + out;
+    EXPECT_EQ(std::system(command.c_str()), 0) << command;
+    std::ifstream bits(out, std::ios::binary);
+    Decisions decisions(blocks.size(), std::vector<unsigned char>(which.K, 0xEE));
+    for (std::vector<unsigned char>& block : decisions) {
+        bits.read(reinterpret_cast<char*>(block.data()), static_cast<std::streamsize>(block.size()));
+    }
+    std::remove(in.c_str());
+    std::remove(out.c_str());
+    return decisions;
+}
+
 std::vector<std::string> storedLines() {
     std::ifstream stream(file);
     std::vector<std::string> lines;
@@ -66,14 +68,6 @@ std::vector<std::string> storedLines() {
         lines.push_back(line);
     }
     return lines;
-}
-
-std::vector<std::string> implementations() {
-    std::vector<std::string> names;
-    while (const char* name = vardel_ip_quarzel_get_implementation_name(static_cast<int>(names.size()))) {
-        names.emplace_back(name);
-    }
-    return names;
 }
 
 TEST(FrozenDecisions, AreStoredForEveryCoreAndBlockSize) {
@@ -132,6 +126,20 @@ TEST_P(FrozenPart, IsWhatADecoderWrittenAnewDecides) {
     forEachCase([&](const FrozenCase& which, const std::string& line) {
         if (exhaustive() || which.K <= 256) {
             EXPECT_EQ(frozenLine(which, [&](const auto& blocks) { return decodePlainly(which, blocks); }),
+                      line);
+        }
+    });
+}
+
+TEST_P(FrozenPart, IsWhatAnotherProcessorDecides) {
+    const char* const program = std::getenv("QUARZEL_FROZEN_DECODER");
+    if (program == nullptr) {
+        GTEST_SKIP() << "QUARZEL_FROZEN_DECODER names no program for one";
+    }
+    forEachCase([&](const FrozenCase& which, const std::string& line) {
+        if (exhaustive() || which.K <= 1024) {
+            EXPECT_EQ(frozenLine(which,
+                                 [&](const auto& blocks) { return decodeElsewhere(program, which, blocks); }),
                       line);
         }
     });
