@@ -39,6 +39,11 @@ part_compilers() {
         done
     done
 }
+# The decisions of 10^7 blocks beside the decoder written anew.
+part_third_opinion() {
+    scripts/build.sh release
+    QUARZEL_TEST_BLOCKS=10000000 build/release/tests/oracle/plain_decoder_test --gtest_filter='*DecidesAsTheCoreDoes'
+}
 part_thread_sanitizer() {
     cmake -G Ninja -S . -B build/threads -DCMAKE_BUILD_TYPE=Debug -DCMAKE_CXX_FLAGS_DEBUG='-O1 -g1 -fsanitize=thread' \
         -DCMAKE_C_COMPILER=clang -DCMAKE_CXX_COMPILER=clang++
@@ -49,7 +54,7 @@ part_thread_sanitizer() {
 part_fuzz_calls() { scripts/fuzz.sh 1000000 differential library_text options rate_recovery; }
 part_fuzz_readers() { scripts/fuzz.sh 10000000 memory_files reference_curves traces; }
 
-parts=(test long old_processors other_processors compilers thread_sanitizer fuzz_calls fuzz_readers)
+parts=(test long old_processors other_processors compilers third_opinion thread_sanitizer fuzz_calls fuzz_readers)
 [ $# -gt 0 ] || set -- "${parts[@]}"
 scripts/install-packages.sh long
 run_parts test-release yes "$@"

@@ -10,6 +10,7 @@
 #include <sstream>
 #include <string>
 
+#include "frozen/frozen_core.hpp"
 #include "lanes/lane_setup.hpp"
 #include "oracle/plain_qpp_rows.hpp"
 #include "support/model.hpp"
@@ -119,6 +120,39 @@ TEST(PlainDecoder, EqualsTheCoreInEverySignalOfEveryPass) {
             << block.iterations << " iterations";
     }
     std::cout << blocks << " blocks compared\n";
+}
+
+// The core decodes in lanes, groups of blocks as large as its widest vectors. QUARZEL_TEST_BLOCKS: how many
+// blocks.
+TEST(PlainDecoder, DecidesAsTheCoreDoes) {
+    std::mt19937 random = seededRandom();
+    const char* const wanted = std::getenv("QUARZEL_TEST_BLOCKS");
+    const long blocks = wanted != nullptr ? std::atol(wanted) : 1000;
+    constexpr int group = 64;
+    std::map<std::pair<int, int>, FrozenCore> cores;
+    long compared = 0;
+    for (; compared < blocks; compared += group) {
+        const int units = 2 << randomFrom(random, 0, 2), algorithm = randomFrom(random, 0, 2);
+        // Few sizes above 104, for the time that they take.
+        const int row = randomFrom(random, 0, randomFrom(random, 0, 499) == 0 ? 187 : 8);
+        const auto K = static_cast<std::size_t>(oracle::qppRows[static_cast<std::size_t>(row)].K);
+        std::vector<Block> sent;
+        for (int b = 0; b < group; ++b) {
+            sent.push_back(anyBlock(random, K));
+        }
+        const FrozenCase which{static_cast<std::uint32_t>(K), static_cast<std::uint32_t>(units),
+                               static_cast<std::uint32_t>(algorithm)};
+        const Decisions decisions =
+            cores.try_emplace({units, algorithm}, which, implementations().front()).first->second(sent);
+        oracle::PlainDecoder plain(oracle::soundDesign(units, algorithm));
+        for (std::size_t b = 0; b < sent.size(); ++b) {
+            const oracle::Streams streams{sent[b].systematic, sent[b].parity1, sent[b].parity2};
+            ASSERT_EQ(plain.decode(streams, sent[b].iterations, 0).decisions, decisions[b])
+                << "block " << compared + static_cast<long>(b) << ", K = " << K << ", " << units
+                << " units, type " << algorithm << ", " << sent[b].iterations << " iterations";
+        }
+    }
+    std::cout << compared << " blocks compared\n";
 }
 
 }  // namespace
