@@ -1,6 +1,6 @@
 # SPDX-License-Identifier: MIT
 # The commands of the README. Each does its own set-up.
-.PHONY: help demo test test-long test-release bench docs package validate format
+.PHONY: help demo test test-long test-release bench docs package validate atlas format
 
 help:
 	@echo "make demo       install what is missing, build, and decode the captures that come with the project"
@@ -11,6 +11,7 @@ help:
 	@echo "make docs       build the site of the pages and the headers in build/docs/site, with its links checked"
 	@echo "make package    build the Debian packages in build/package, and ask lintian about them"
 	@echo "make validate   simulate and draw docs/validation.md anew, a quarter of an hour"
+	@echo "make atlas      compute and draw docs/atlas.md anew, more than an hour of processor time"
 	@echo "make format     format the sources"
 
 demo:
@@ -52,6 +53,11 @@ validate:
 	@scripts/build.sh release
 	@scripts/build.sh bench
 	@scripts/validate.sh
+
+atlas:
+	@scripts/install-packages.sh test
+	@scripts/build.sh release
+	@scripts/atlas.sh
 
 format:
 	@scripts/install-packages.sh test
