@@ -4,6 +4,7 @@
 #include <fmt/format.h>
 #include <gmock/gmock.h>
 #include <gtest/gtest.h>
+#include <CLI/CLI.hpp>
 
 #include <algorithm>
 #include <nlohmann/json.hpp>
