@@ -105,12 +105,12 @@ TEST(DecoderDump, CountsPassesAcrossBlocksAndInputsPerBlock) {
 TEST(DecoderDump, StopEndsTheDecodeAfterTheLastRequestedPass) {
     Decoder decoder("MOD", false, 2U, 4U);
     std::vector<unsigned char> hard = {7};
-    decoder.setDump(1, true);
+    decoder.setDump(3, true);
     Output output = capture([&] { EXPECT_FALSE(decoder.decode(randomSoft(132, 2), hard, 6)); });
     EXPECT_EQ(output.err, "STOP:Dump complete\n");
     EXPECT_EQ(count(output.out, "itsSys [0]=["), 1);
-    EXPECT_EQ(count(output.out, "siso="), 1);
-    EXPECT_EQ(count(output.out, tableHead(0, 0)), 1);
+    EXPECT_EQ(count(output.out, "siso="), 3);
+    EXPECT_EQ(count(output.out, tableHead(0, 2)), 1);
     EXPECT_EQ(hard, std::vector<unsigned char>{7});
     EXPECT_EQ(decoder.sisoCount(), 0U);
     // The stop setting alone stops nothing.

@@ -253,6 +253,14 @@ TEST(LaneHistory, AnotherDecoderHasNone) {
     EXPECT_EQ(traceAfter(false, change).out, traceAfter(true, change).out);
 }
 
+TEST(LaneHistory, ADumpThatIsToStopTheDecodeStillDoes) {
+    const State state = makeState();
+    simulate(state.get(), Block(1024 + 4).inputs());
+    state->decoder->setDump(1, true);
+    const Output output = capture([&] { EXPECT_EQ(simulate(state.get(), Block(44).inputs()).status, 2); });
+    EXPECT_EQ(output.err, "STOP:Dump complete\n");
+}
+
 TEST(LaneHistory, CountersGoOnAsIfAllWasDecodedLiterally) {
     const State state = makeState();
     Block block(44);

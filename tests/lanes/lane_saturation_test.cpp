@@ -2,6 +2,8 @@
 // Lanes find out about saturated values while it converts them.
 #include <gtest/gtest.h>
 
+#include <algorithm>
+#include <bit>
 #include <string>
 #include <vector>
 
@@ -74,6 +76,34 @@ TEST(LaneSaturation, IsToldBeforeADecisionOverwritesIt) {
             "will not be reported\n");
         EXPECT_NE(block.systematic[3], -129);
     }
+}
+
+TEST(LaneSaturation, IsToldBeforeDecisionsReachTheFirstOrTheLastBytesOfAStream) {
+    // Decisions in the lowest byte of the one, in the two upper bytes of the other take them back into range;
+    // the highest byte of a value does not matter.
+    constexpr int low = 128;
+    constexpr int high = -(1 << 16);
+    constexpr bool lowFirst = std::endian::native == std::endian::little;
+    const auto expectTold = [](int position, int value, std::ptrdiff_t dout) {
+        const Block block(44);
+        std::vector<int> room(3 * 44);
+        int* const stream = &room[44];
+        std::copy(block.systematic.begin(), block.systematic.end(), stream);
+        stream[position] = value;
+        vardel_ip_quarzel_inputs inputs = block.inputs();
+        inputs.rsc1_sys = stream;
+        vardel_ip_quarzel_outputs outputs{reinterpret_cast<unsigned char*>(stream) + dout, 40, 0, 0};
+        const State state = makeState();
+        const Output output =
+            capture([&] { EXPECT_EQ(vardel_ip_quarzel_bitacc_simulate(state.get(), &outputs, inputs), 0); });
+        EXPECT_EQ(output.out, "WARNING:decoder:RSC1 systematic value in position " +
+                                  std::to_string(position) + " saturated " +
+                                  (value > 0 ? "positively" : "negatively") +
+                                  ", further saturation will not be reported\n");
+        EXPECT_NE(stream[position], value);
+    };
+    expectTold(0, lowFirst ? low : high, lowFirst ? -39 : -38);
+    expectTold(43, lowFirst ? high : low, lowFirst ? 4 * 44 - 2 : 4 * 44 - 1);
 }
 
 TEST(LaneSaturation, IsToldInABatchBeforeALaterBlocksTruncationOrFault) {
