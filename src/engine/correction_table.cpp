@@ -7,10 +7,10 @@
 
 namespace {
 
-/// Round half away from zero to the integer of the format, saturate, and keep the low byte of the word.
+/// Round a correction, which is not negative, to the integer of the format, halves up, saturate, and keep the
+/// low byte of the word.
 unsigned char toTableByte(double y, const TNumberFormat& format) {
-    const double scaled = y * format.scale;
-    const auto q = static_cast<std::int32_t>(scaled >= 0 ? scaled + 0.5 : scaled - 0.5);
+    const auto q = static_cast<std::int32_t>(y * format.scale + 0.5);
     if (q < format.minQ) {
         return static_cast<unsigned char>(format.min);
     }

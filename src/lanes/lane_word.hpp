@@ -140,9 +140,6 @@ inline Lanes<W> chooseBySign(Lanes<W> difference, Lanes<W> x, Lanes<W> y) {
 }
 
 /// Slices side by side, from anywhere.
-inline Lanes<8> joinSlices(Lanes<8> x) {
-    return x;
-}
 inline Lanes<16> joinSlices(Lanes<8> x, Lanes<8> y) {
     return {__builtin_shufflevector(x.v, y.v, 0, 1, 2, 3, 4, 5, 6, 7, 8, 9, 10, 11, 12, 13, 14, 15)};
 }

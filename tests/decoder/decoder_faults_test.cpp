@@ -2,10 +2,13 @@
 // Decoders that are wired in unusual ways, or that run out of memory, stay good.
 #include <gtest/gtest.h>
 
+#include <algorithm>
+#include <climits>
 #include <new>
 #include <sstream>
 
 #include "decoder/decoder_3gpu.hpp"
+#include "engine/engine_mod.hpp"
 #include "support/capture.hpp"
 #include "support/count_allocations.hpp"
 #include "support/decoder_setup.hpp"
@@ -135,6 +138,36 @@ TEST(DecoderFaults, ADerivedClassReachesSegmentsAndRangeForms) {
     std::vector<unsigned char> hard;
     EXPECT_TRUE(decoder.decode(randomSoft(3 * 516, 3), hard, 2));
     EXPECT_EQ(decoder.calls, 4);
+}
+
+/// An engine whose recursions give up.
+struct WeakEngine : TCalculationEngineMod {
+    unsigned forward = 0;   ///< how many it runs forward
+    unsigned backward = 0;  ///< how many it runs backward
+
+    T8* alpha(unsigned n, const T8* gamma, T8* alpha) override {
+        return forward-- > 0 ? TCalculationEngineMod::alpha(n, gamma, alpha) : nullptr;
+    }
+    T8* beta(unsigned n, const T8* gamma, T8* beta) override {
+        return backward-- > 0 ? TCalculationEngineMod::beta(n, gamma, beta) : nullptr;
+    }
+};
+
+TEST(DecoderFaults, ASegmentThatFailsEndsTheDecode) {
+    // Four segments of two windows each.
+    for (const auto& [forward, backward] : {std::pair{2U, 9U}, std::pair{4U, 3U}}) {
+        OpenDecoder<TDecoder3GPU> decoder("MOD", false, 1U, 4U);
+        WeakEngine weak;
+        weak.setFormats(decoder.engine.branch.get(), decoder.engine.state.get(), decoder.engine.branch.get());
+        ASSERT_TRUE(weak.initialise());
+        weak.forward = forward;
+        weak.backward = backward;
+        decoder.connect(decoder.interleaver.get(), &weak);
+        std::vector<unsigned char> hard = {7};
+        EXPECT_FALSE(decoder.decode(randomSoft(3 * 516, 3), hard, 1));
+        EXPECT_EQ(hard, std::vector<unsigned char>{7});
+        EXPECT_EQ(std::max(weak.forward, weak.backward), UINT_MAX);
+    }
 }
 
 TEST(DecoderFaults, SettingsCanBeRead) {

@@ -3,6 +3,7 @@
 
 #include <algorithm>
 #include <limits>
+#include <numeric>
 
 #include "decoder/decoder_3g.hpp"
 #include "support/capture.hpp"
@@ -195,7 +196,28 @@ TEST(Siso, SuppliedExtrinsicsMustCoverTheTermination) {
     EXPECT_EQ(decoder.decodeCount(), 0U);
 }
 
-/// An engine whose recursions fail.
+TEST(Siso, TheCountingDecodeRefusesALengthThatDoesNotFit) {
+    Decoder decoder("MOD", false);
+    std::vector<unsigned long long> errors(1);
+    const Output output =
+        capture([&] { EXPECT_FALSE(decoder.decode(randomSoft(133, 3), {}, errors, errors)); });
+    EXPECT_NE(output.err, "");
+    EXPECT_EQ(errors[0], 0U);
+}
+
+TEST(Siso, APermutationThatGotLostIsComputedAgain) {
+    Decoder decoder("MOD", false);
+    ASSERT_TRUE(decoder.extract(randomSoft(132, 3)));
+    std::iota(decoder.itsExtrinsic.begin(), decoder.itsExtrinsic.end(), short{0});
+    decoder.calcIntrinsic(0);
+    const std::vector<short> expected = decoder.intrinsic();
+    decoder.interleaver->itsPermutation.clear();
+    decoder.calcIntrinsic(0);
+    EXPECT_EQ(decoder.intrinsic(), expected);
+    EXPECT_EQ(decoder.interleaver->itsPermutation.size(), 40U);
+}
+
+/// A decoder whose operations fail.
 struct Broken : TDecoder3G {
     using TDecoder3G::TDecoder3G;
     unsigned failAt = 99;
@@ -215,6 +237,11 @@ TEST(Siso, TheFirstOperationThatFailsEndsTheDecode) {
         decoder.failAt = failAt;
         std::vector<unsigned char> hard;
         EXPECT_FALSE(decoder.decode(randomSoft(132, 1), hard, 3));
+        EXPECT_EQ(decoder.calls, failAt);
+        EXPECT_EQ(decoder.sisoCount(), 0U);
+        decoder.calls = 0;
+        std::vector<unsigned long long> errors(3);
+        EXPECT_FALSE(decoder.decode(randomSoft(132, 1), {}, errors, errors));
         EXPECT_EQ(decoder.calls, failAt);
         EXPECT_EQ(decoder.sisoCount(), 0U);
     }

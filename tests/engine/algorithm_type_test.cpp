@@ -40,6 +40,15 @@ TEST(AlgorithmTypeText, IsUnknownForAnyOtherValue) {
     }
 }
 
+TEST(AlgorithmTypeText, OfAStreamThatHasFailedIsNotRead) {
+    std::istringstream stream("MOD");
+    stream.setstate(std::ios::failbit);
+    AlgorithmType type = AlgorithmType::Mod;
+    stream >> type;
+    EXPECT_EQ(number(type), 0);
+    EXPECT_EQ(unread(stream), "MOD");
+}
+
 struct Reading {
     std::string text;
     int value;

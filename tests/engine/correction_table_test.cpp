@@ -57,6 +57,18 @@ int entry(const Table& table, int difference) {
     return table[static_cast<std::size_t>(difference + 32768)];
 }
 
+TEST(CorrectionTable, EntriesStayWithinTheLimitsOfTheFormat) {
+    TNumberFormat format(12, 3);
+    EXPECT_EQ(entry(accepted(16, format), 0), 6 << 4);
+    format.maxQ = 2;
+    format.max = 2 << 4;
+    EXPECT_EQ(entry(accepted(16, format), 0), 2 << 4);
+    EXPECT_EQ(entry(accepted(16, format), 20 << 4), 1 << 4);
+    format.minQ = 1;
+    format.min = 3 << 4;
+    EXPECT_EQ(entry(accepted(16, format), 32767), 3 << 4);
+}
+
 TEST(CorrectionTable, EqualsTheStoredTables) {
     const auto cases = readCases("correction_tables.jsonl");
     ASSERT_EQ(cases.size(), 50U);

@@ -7,6 +7,16 @@
 #include "support/count_allocations.hpp"
 #include "support/model.hpp"
 
+namespace {
+bool refuseMemory = false;
+}
+
+/// The linker puts this in place of malloc.
+extern "C" void* __real_malloc(std::size_t size);
+extern "C" void* __wrap_malloc(std::size_t size) {
+    return refuseMemory ? nullptr : __real_malloc(size);
+}
+
 namespace quarzel::test {
 namespace {
 
@@ -63,6 +73,50 @@ TEST(Allocation, ErrorLinesAreWrittenWhereThereIsNoMemoryAtAll) {
     EXPECT_EQ(output.err,
               "ERROR:decoder:Unhandled exception has occurred\n"
               "ERROR:decoder:Unhandled exception has occurred\n");
+}
+
+TEST(Allocation, AStateWithoutMemoryForItsRecordIsALine) {
+    vardel_ip_quarzel_state* state = nullptr;
+    vardel_ip_quarzel_state* unfilled = nullptr;
+    const Output output = capture([&] {
+        refuseMemory = true;
+        state = vardel_ip_quarzel_create_state(defaultGenerics());
+        unfilled = create_default_state(defaultGenerics());
+        refuseMemory = false;
+    });
+    EXPECT_EQ(state, nullptr);
+    EXPECT_EQ(unfilled, nullptr);
+    EXPECT_EQ(output.err,
+              "ERROR:decoder:Could not allocate memory for decoder state\n"
+              "ERROR:decoder:Could not allocate memory for decoder state\n");
+}
+
+TEST(Allocation, WithoutMemoryForStatusesNoBlockIsDecoded) {
+    const State state = makeState();
+    const Block block(44);
+    const vardel_ip_quarzel_inputs inputs = block.inputs();
+    std::vector<unsigned char> bits(40, 7);
+    vardel_ip_quarzel_outputs outputs{bits.data(), 40, 0, 0};
+    int status = 0;
+    const Output output = capture([&] {
+        failAllocationsAfter(0);
+        status = vardel_ip_quarzel_bitacc_simulate_batch(state.get(), &outputs, &inputs, 1, nullptr);
+        allowAllocations();
+    });
+    EXPECT_EQ(status, 99);
+    EXPECT_EQ(output.err, "ERROR:decoder:Unhandled exception has occurred\n");
+    EXPECT_EQ(bits, std::vector<unsigned char>(40, 7));
+}
+
+TEST(Allocation, WithoutMemoryTheTablesOfTheCodeAreRefused) {
+    unsigned permutation[40];
+    unsigned char corrections[2];
+    failAllocationsAfter(0);
+    const int noPermutation = vardel_ip_quarzel_get_permutation(40, permutation);
+    const int noCorrections = vardel_ip_quarzel_get_corrections(corrections);
+    allowAllocations();
+    EXPECT_EQ(noPermutation, 1);
+    EXPECT_EQ(noCorrections, 1);
 }
 
 /// Let memory run out after every number of allocations of a call, until it has enough: each time the call

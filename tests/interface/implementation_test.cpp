@@ -156,6 +156,14 @@ const std::vector<Change>& changes() {
         {"a dump", 1, [](auto& state) { vardel_ip_quarzel_bitacc_dump_config(&state, 1); }},
         {"a-priori values", 1,
          [](auto& state) { state.decoder->setExtrinsicIn(std::vector<short>(515, 800)); }},
+        {"no lanes", 1,
+         [](auto& state) {
+             delete state.lanes;
+             state.lanes = nullptr;
+             EXPECT_STREQ(vardel_ip_quarzel_get_implementation(&state), "literal");
+             EXPECT_EQ(vardel_ip_quarzel_set_implementation(&state, "literal"), 0);
+             EXPECT_EQ(vardel_ip_quarzel_set_implementation(&state, "baseline"), 1);
+         }},
         {"passes asked for", 1,
          [](auto& state) {
              vardel_ip_quarzel_set_passes(

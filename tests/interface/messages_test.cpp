@@ -75,6 +75,45 @@ TEST(MessagePort, TakesTheTraceLineByLine) {
     EXPECT_EQ(silence.out + silence.err, "");
 }
 
+/// A decoder of a program's own. Its trace comes character by character, and then its stream may fail.
+struct OwnDecoder : TDecoder {
+    bool fails = false;
+
+    std::string getProperties() const override { return "OWN"; }
+    bool decode(const std::vector<short>& soft, std::vector<unsigned char>& hard, unsigned) override {
+        hard.assign(soft.size() / 3 - 4, 1);
+        return checkDump(0);
+    }
+    void dumpFull(std::ostream& stream, unsigned siso) override {
+        TDecoder::dumpFull(stream, siso);
+        stream.put('o').put('w').put('n').put('\n').flush();
+        stream.setstate(fails ? std::ios::failbit : std::ios::goodbit);
+    }
+};
+
+TEST(MessagePort, TakesTheTraceOfADecoderOfTheProgramsOwn) {
+    Lines lines;
+    const State state = makeListening(lines);
+    auto* const own = new OwnDecoder;
+    own->connect(state->interleaver, state->engine);
+    delete state->decoder;
+    state->decoder = own;
+    own->setDump(2);
+    const Block block(44);
+    EXPECT_EQ(simulate(state.get(), block.inputs()).status, 0);
+    EXPECT_EQ(lines, (Lines{{VARDEL_IP_QUARZEL_TRACE, "own"}}));
+    // A text that is not whole ends the call; and so does the wish for what this decoder does not show.
+    own->fails = true;
+    EXPECT_EQ(simulate(state.get(), block.inputs()).status, 99);
+    own->setDump(0);
+    std::vector<unsigned char> bits(2 * 40);
+    const vardel_ip_quarzel_inputs inputs = block.inputs();
+    const vardel_ip_quarzel_array_inputs arrayInputs{
+        inputs.rsc1_sys, inputs.rsc1_par, inputs.rsc2_par, 44, 1, VARDEL_IP_QUARZEL_INT32, 44, 1, 2, nullptr};
+    const vardel_ip_quarzel_array_outputs arrayOutputs{bits.data(), 80, 40, nullptr};
+    EXPECT_EQ(vardel_ip_quarzel_bitacc_simulate_array(state.get(), &arrayOutputs, &arrayInputs, nullptr), 99);
+}
+
 TEST(MessagePort, MayBeChangedAtAnyTimeAndGivenUp) {
     const State state = makeState();
     Lines lines;
@@ -155,10 +194,19 @@ TEST(MessageOrder, ATraceThatFindsNoRoomLeavesTheStreamBad) {
     vardel_ip_quarzel_bitacc_dump_config(state.get(), 1);
     const int status = simulate(state.get(), Block(44).inputs()).status;
     const bool bad = std::cout.bad();
+    std::cout.clear();
+    // Nor does a stream throw that is to throw when it fails.
+    std::cout.exceptions(std::ios::badbit);
+    vardel_ip_quarzel_bitacc_dump_config(state.get(), 1);
+    const int later = simulate(state.get(), Block(44).inputs()).status;
+    const bool badAgain = std::cout.bad();
+    std::cout.exceptions(std::ios::goodbit);
     std::cout.rdbuf(before);
     std::cout.clear();
     EXPECT_EQ(status, 0);
     EXPECT_TRUE(bad);
+    EXPECT_EQ(later, 0);
+    EXPECT_TRUE(badAgain);
 }
 
 TEST(MessageOrder, AWarningThatFindsNoRoomIsWrittenNextTime) {

@@ -277,6 +277,35 @@ TEST(LaneSequences, TracesAmongLargerBlocksAndFaultsAreAsIfAllWasDecodedLiterall
     compare({sizesUpTo(1056), 8, 2, true, true}, scaled(20));
 }
 
+TEST(LaneBatch, MoreBlocksThanAreHandedOverAtOnceAreAsIfDecodedLiterally) {
+    std::mt19937 random = seededRandom();
+    for (const bool alike : {true, false}) {
+        std::vector<Block> blocks;
+        std::vector<vardel_ip_quarzel_inputs> inputs;
+        for (std::size_t i = 0; i < 600; ++i) {
+            Block& block = blocks.emplace_back(alike || random() % 4 != 0 ? 44 : 52);
+            for (std::vector<int>* stream : {&block.systematic, &block.parity1, &block.parity2}) {
+                std::ranges::generate(*stream, [&] { return static_cast<int>(random() % 60) - 30; });
+            }
+        }
+        std::ranges::transform(blocks, std::back_inserter(inputs), &Block::inputs);
+        const auto decisions = [&](const char* implementation) {
+            const State state = makeState();
+            EXPECT_EQ(vardel_ip_quarzel_set_implementation(state.get(), implementation), 0);
+            std::vector<unsigned char> bits(600 * 48, 7);
+            std::vector<vardel_ip_quarzel_outputs> outputs;
+            for (std::size_t i = 0; i < 600; ++i) {
+                outputs.push_back({&bits[48 * i], 48, 0, 0});
+            }
+            EXPECT_EQ(vardel_ip_quarzel_bitacc_simulate_batch(state.get(), outputs.data(), inputs.data(), 600,
+                                                              nullptr),
+                      0);
+            return bits;
+        };
+        EXPECT_EQ(decisions(lanes::bestCandidate().name), decisions("literal")) << alike;
+    }
+}
+
 TEST(LaneBatch, WrongArgumentsAreRefusedInTheirOrder) {
     const State state = makeState();
     Block block(44);

@@ -2,7 +2,10 @@
 #include <gtest/gtest.h>
 
 #include <cstdlib>
+#include <utility>
 
+#include "interleaver/interleaver_3gpplte.hpp"
+#include "lanes/lane_decode.hpp"
 #include "lanes/lane_setup.hpp"
 
 namespace quarzel::test {
@@ -35,6 +38,25 @@ TEST(LaneCandidates, KernelsComeByAscendingWidthFromEightLanesUp) {
             EXPECT_EQ(candidate.kernels[i].width, std::size_t{8} << i) << candidate.name;
         }
     }
+}
+
+TEST(LaneLayouts, WhatLanesCannotFollowIsRefused) {
+    LaneDecoder decoder(1, lanes::bestCandidate());
+    LaneSchedule schedule;
+    TInterleaver3GPPLTE().calcInterleaver(schedule.permutation, 512);
+    schedule.segments = 8;
+    schedule.windowLength = {64};
+    EXPECT_TRUE(decoder.add(schedule));
+    // Two positions that no longer stand in the rows of their neighbours, in either direction.
+    std::swap(schedule.permutation[1], schedule.permutation[2]);
+    EXPECT_FALSE(decoder.add(schedule));
+    schedule.permutation.resize(511);
+    EXPECT_FALSE(decoder.add(schedule));
+    schedule.permutation.resize(6144);
+    schedule.segments = 128;
+    EXPECT_FALSE(decoder.add(schedule));
+    schedule.segments = 4;
+    EXPECT_FALSE(decoder.add(schedule));
 }
 
 TEST(LaneCandidates, AModelStartsOutWithLanes) {
