@@ -64,6 +64,9 @@ TEST(DecoderFaults, ADecoderThatIsNotConnectedHasNothingToDump) {
     decoder.allocate(43);
     std::ostringstream stream;
     decoder.dumpFull(stream, 0);
+    TCalculationEngineMod withoutFormats;
+    decoder.connect(nullptr, &withoutFormats);
+    decoder.dumpFull(stream, 0);
     EXPECT_EQ(stream.str(), "");
     decoder.setDump(1);
     const Output output = capture([&] { EXPECT_TRUE(decoder.checkDump(0)); });

@@ -1,7 +1,10 @@
 // SPDX-License-Identifier: MIT
 #include <gtest/gtest.h>
 
+#include <algorithm>
 #include <functional>
+#include <iterator>
+#include <string>
 
 #include "support/capture.hpp"
 #include "support/count_allocations.hpp"
@@ -73,6 +76,17 @@ TEST(Allocation, ErrorLinesAreWrittenWhereThereIsNoMemoryAtAll) {
     EXPECT_EQ(output.err,
               "ERROR:decoder:Unhandled exception has occurred\n"
               "ERROR:decoder:Unhandled exception has occurred\n");
+}
+
+TEST(Allocation, OfALineForWhichThereIsNoMemoryWhatFitsIsWritten) {
+    const State state = makeState();
+    const std::string name(600, 'x');
+    const Output output = capture([&] {
+        failAllocationsAfter(0);
+        vardel_ip_quarzel_set_implementation(state.get(), name.c_str());
+        allowAllocations();
+    });
+    EXPECT_EQ(output.err, ("ERROR:decoder:There is no implementation '" + name).substr(0, 511) + "\n");
 }
 
 TEST(Allocation, AStateWithoutMemoryForItsRecordIsALine) {
@@ -149,16 +163,19 @@ TEST(Allocation, ASaturatedValueIsToldOnceWhereverMemoryRunsOut) {
     const Block saturated(40 + 4, 500);
     const Block good(1024 + 4, 5);
     std::vector<unsigned char> bits(1024);
-    vardel_ip_quarzel_outputs outputs[] = {{bits.data(), 1024, 0, 0}, {bits.data(), 1024, 0, 0}};
-    const vardel_ip_quarzel_inputs inputs[] = {saturated.inputs(), good.inputs()};
-    int statuses[2];
+    vardel_ip_quarzel_outputs outputs[3];
+    std::fill(std::begin(outputs), std::end(outputs), vardel_ip_quarzel_outputs{bits.data(), 1024, 0, 0});
+    vardel_ip_quarzel_inputs inputs[] = {saturated.inputs(), saturated.inputs(), good.inputs()};
+    inputs[0].iterations = 0;
+    int statuses[3];
     for (const char* implementation : {static_cast<const char*>(nullptr), "literal"}) {
         expectToldOnce(implementation, [&](vardel_ip_quarzel_state* state) {
             return vardel_ip_quarzel_bitacc_simulate(state, outputs, saturated.inputs());
         });
-        // The block that fails need not be the one with the value.
+        // The block that fails need not be the one with the value. One is refused at any rate.
         expectToldOnce(implementation, [&](vardel_ip_quarzel_state* state) {
-            return vardel_ip_quarzel_bitacc_simulate_batch(state, outputs, inputs, 2, statuses);
+            EXPECT_EQ(vardel_ip_quarzel_bitacc_simulate_batch(state, outputs, inputs, 3, statuses), 1);
+            return std::max(statuses[1], statuses[2]);
         });
     }
 }

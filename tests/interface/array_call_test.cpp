@@ -241,6 +241,9 @@ TEST(ArrayCall, WrongArgumentsAreRefusedInTheirOrder) {
     inputs.count = 1;
     inputs.rsc1_par = nullptr;
     EXPECT_EQ(textOf(state.get(), &outputs, &inputs), "ERROR:decoder:rsc1_par must not be a null pointer\n");
+    outputs.dout = nullptr;
+    EXPECT_EQ(textOf(state.get(), &outputs, &inputs),
+              "ERROR:decoder:Simulate called with null pointer for dout\n");
     EXPECT_EQ(bits, std::vector<unsigned char>(40, 0xEE));
 }
 

@@ -106,6 +106,8 @@ TEST(CodePort, NamesTheSignalsInTheOrderOfTheTraceColumns) {
         EXPECT_STRNE(signal.description, "");
     }
     EXPECT_EQ(column, traceColumnCount);
+    Signal none;
+    EXPECT_EQ(vardel_ip_quarzel_get_signal(-1, &none), 1);
 }
 
 TEST(CodePort, TheLibraryHasTheVersionOfItsHeader) {

@@ -133,9 +133,18 @@ const std::vector<Change>& changes() {
              newEngine(state, "MOD#:16");
              replace(state.state_format, right);
          }},
+        {"engine without a table", 2, [](auto& state) { newEngine(state, "MOD"); }},
+        {"a state format that the engine does not have", 1,
+         [](auto& state) {
+             static TNumberFormat right = *state.state_format;
+             state.engine->setFormats(state.input_format, &right, state.branch_format);
+             replace(state.state_format, TNumberFormat(11, 3));
+         }},
         {"an equal engine", 2, [](auto& state) { newEngine(state, "MOD#:16"); }, true},
         {"a decoder with other units", 1,
          [](auto& state) { newDecoder(state, new TDecoder3GPU(false, 8, 4)); }},
+        {"a decoder of the other layout", 1,
+         [](auto& state) { newDecoder(state, new TDecoder3GPU(true, 2, 4)); }},
         {"a decoder of a class of its own", 1, [](auto& state) { newDecoder(state, new OwnDecoder); }},
         {"an equal decoder", 1, [](auto& state) { newDecoder(state, new TDecoder3GPU(false, 2, 4)); }, true},
         {"an interleaver of a class of its own", 1,

@@ -213,11 +213,16 @@ TEST(MessageOrder, AWarningThatFindsNoRoomIsWrittenNextTime) {
     FullBuffer buffer;
     std::streambuf* const before = std::cout.rdbuf(&buffer);
     const State state = makeState();
-    const Block block(44, 200);
+    Block block(44, 200);
+    block.tag = 0x1FF;
     simulate(state.get(), block.inputs());
     std::cout.rdbuf(before);
     const Output output = capture([&] { simulate(state.get(), block.inputs()); });
-    EXPECT_EQ(output.out.substr(0, 24), "WARNING:decoder:RSC1 sys");
+    EXPECT_EQ(output.out,
+              "WARNING:decoder:RSC1 systematic value in position 0 saturated positively, further saturation "
+              "will not be reported\n"
+              "WARNING:decoder:Input block tag has been truncated to 8 bits, further truncation will not be "
+              "reported\n");
 }
 
 }  // namespace
