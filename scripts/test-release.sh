@@ -49,12 +49,24 @@ part_thread_sanitizer() {
         -DCMAKE_C_COMPILER=clang -DCMAKE_CXX_COMPILER=clang++
     cmake --build build/threads --target hostile_host_test link_test
     build/threads/tests/interface/hostile_host_test --gtest_filter='*32Threads*'
-    build/threads/tests/link/link_test --gtest_filter='*Parallel*'
+    build/threads/tests/link/link_test --gtest_filter='ForEachOnThreads*'
+}
+# The library and its tests compiled by Clang 19, warnings as errors, and what the tests reach.
+part_coverage() { scripts/coverage.sh; }
+# Other mutants in each release; a run that was interrupted goes on with those of its commit.
+part_mutation() { tests/mutation/mutate.py --seed $((16#$(git rev-parse --short=6 HEAD | cut -c1-6))); }
+part_reproducible() { scripts/reproducible.sh; }
+part_memcheck() {
+    scripts/build.sh release
+    for test in stored_calls_test simulate_test messages_test; do
+        valgrind --quiet --error-exitcode=1 --leak-check=full build/release/tests/interface/$test --gtest_brief=1
+    done
 }
 part_fuzz_calls() { scripts/fuzz.sh 1000000 differential library_text options rate_recovery; }
 part_fuzz_readers() { scripts/fuzz.sh 10000000 memory_files reference_curves traces; }
 
-parts=(test long old_processors other_processors compilers third_opinion thread_sanitizer fuzz_calls fuzz_readers)
+parts=(test long old_processors other_processors compilers third_opinion thread_sanitizer
+    coverage reproducible memcheck mutation fuzz_calls fuzz_readers)
 [ $# -gt 0 ] || set -- "${parts[@]}"
 scripts/install-packages.sh long
 run_parts test-release yes "$@"
