@@ -32,9 +32,6 @@ std::istream& operator>>(std::istream& stream, AlgorithmType& type) {
         }
         stream.get();
     }
-    if (!stream.good()) {
-        return stream;
-    }
     const int next = stream.peek();
     if (next <= ' ' || next == ':') {
         type = AlgorithmType::Mod;

@@ -45,7 +45,7 @@ struct LaneLayout {
     std::uint32_t segmentOf(std::uint32_t slice, std::uint32_t lane) const {
         return segments >= sliceLanes ? lane * slices() + slice : lane % segments;
     }
-    std::uint32_t blockOf(std::uint32_t lane) const { return segments >= sliceLanes ? 0 : lane / segments; }
+    std::uint32_t blockOf(std::uint32_t lane) const { return lane / segments; }
 
     /// The bundle of a block of a group.
     std::size_t bundleOf(std::size_t index) const { return index * lanesOfBlock() / sliceLanes; }
