@@ -47,7 +47,11 @@ TEST(LaneLayouts, WhatLanesCannotFollowIsRefused) {
     schedule.segments = 8;
     schedule.windowLength = {64};
     EXPECT_TRUE(decoder.add(schedule));
-    // Two positions that no longer stand in the rows of their neighbours, in either direction.
+    // Two positions of different slices in each other's place, and then two of different rows.
+    schedule.segments = 16;
+    std::swap(schedule.permutation[0], schedule.permutation[32]);
+    EXPECT_FALSE(decoder.add(schedule));
+    std::swap(schedule.permutation[0], schedule.permutation[32]);
     std::swap(schedule.permutation[1], schedule.permutation[2]);
     EXPECT_FALSE(decoder.add(schedule));
     schedule.permutation.resize(511);
