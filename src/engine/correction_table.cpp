@@ -7,10 +7,9 @@
 
 namespace {
 
-/// Round a correction, which is not negative, to the integer of the format, halves up, saturate, and keep the
-/// low byte of the word.
+/// Round half away from zero to the integer of the format, saturate, and keep the low byte of the word.
 unsigned char toTableByte(double y, const TNumberFormat& format) {
-    const auto q = static_cast<std::int32_t>(y * format.scale + 0.5);
+    const auto q = static_cast<std::int32_t>(std::lround(y * format.scale));
     if (q < format.minQ) {
         return static_cast<unsigned char>(format.min);
     }
