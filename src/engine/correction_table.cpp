@@ -7,9 +7,10 @@
 
 namespace {
 
-/// Round half away from zero to the integer of the format, saturate, and keep the low byte of the word.
+/// Round a correction, which is never negative, half up to the integer of the format, saturate, and keep the
+/// low byte of the word.
 unsigned char toTableByte(double y, const TNumberFormat& format) {
-    const auto q = static_cast<std::int32_t>(std::lround(y * format.scale));
+    const auto q = static_cast<std::int32_t>(y * format.scale + 0.5);
     if (q < format.minQ) {
         return static_cast<unsigned char>(format.min);
     }
