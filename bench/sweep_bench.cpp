@@ -145,10 +145,10 @@ void informationBits(benchmark::State& bench) {
     const auto K = static_cast<std::uint32_t>(bench.range(0));
     std::vector<std::uint8_t> bits(K);
     for (auto _ : bench) {
-        link::RandomSource({1, K, ebN0, 1}).informationBits(3, bits.data());
+        link::RandomSource({1, K, ebN0, 1}).octetBits(bits.data());
         benchmark::DoNotOptimize(bits.data());
     }
-    perBit(bench, K);
+    perBit(bench, 8.0 * K);
 }
 
 void encoder(benchmark::State& bench) {
@@ -166,12 +166,13 @@ void channel(benchmark::State& bench) {
     const auto K = static_cast<std::uint32_t>(bench.range(0));
     const link::QuantisedChannel channel({link::Quantiser::Kind::llr, 8}, ebN0);
     std::vector<std::uint8_t> streams(3 * (K + 4), 0x5a);
-    std::vector<std::int8_t> soft(streams.size());
+    std::vector<std::int8_t> soft(8 * streams.size());
     for (auto _ : bench) {
-        channel.transmit(link::RandomSource({1, K, ebN0, 1}), streams.data(), 3, streams.size(), soft.data());
+        channel.transmitOctet(link::RandomSource({1, K, ebN0, 1}), streams.data(), streams.size(),
+                              soft.data());
         benchmark::DoNotOptimize(soft.data());
     }
-    perBit(bench, K);
+    perBit(bench, 8.0 * K);
 }
 
 void drawAndEncode(benchmark::State& bench) {

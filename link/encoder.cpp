@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: MIT
 #include "link/encoder.hpp"
 
+#include <algorithm>
 #include <array>
 #include <stdexcept>
 #include <string>
@@ -64,10 +65,11 @@ void Encoder::encode(const std::uint8_t* bits, std::uint8_t* streams) const {
     std::uint8_t* const systematic = streams;
     std::uint8_t* const parity1 = streams + positions();
     std::uint8_t* const parity2 = streams + 2 * positions();
+    const std::uint16_t* const permutation = itsPermutation.data();
     ConstituentEncoders encoders;
+    std::copy_n(bits, K, systematic);
     for (std::size_t i = 0; i < K; ++i) {
-        systematic[i] = bits[i];
-        const std::uint32_t parity = encoders.parity(bits[i] | std::uint32_t{bits[itsPermutation[i]]} << 8);
+        const std::uint32_t parity = encoders.parity(bits[i] | std::uint32_t{bits[permutation[i]]} << 8);
         parity1[i] = static_cast<std::uint8_t>(parity);
         parity2[i] = static_cast<std::uint8_t>(parity >> 8);
     }

@@ -11,7 +11,8 @@ namespace quarzel::link {
 namespace {
 
 constexpr std::size_t groupsAtOnce = 8;
-constexpr std::size_t valuesAtOnce = groupsAtOnce * wordsPerGroup * 2;
+constexpr std::size_t valuesPerGroup = 2 * wordsPerGroup;
+constexpr std::size_t valuesAtOnce = groupsAtOnce * valuesPerGroup;
 
 /// The 16 random bits of a value, as the look-up takes them.
 std::uint32_t halfWordOf(const std::uint32_t* words, std::size_t value) {
@@ -95,25 +96,94 @@ void QuantisedChannel::draw(const std::uint32_t* words, const std::uint8_t* code
     }
 }
 
+/// The outputs that words decide, and those that need further ones.
+void QuantisedChannel::receive(const std::uint32_t* words, const std::uint8_t* codeBits, unsigned lane,
+                               std::size_t count, std::int8_t* soft, Refinement& refinement) const {
+    std::array<std::uint32_t, valuesAtOnce / valuesPerLookUp> undecided;
+    draw(words, codeBits, lane, count, soft, undecided.data());
+    for (std::size_t start = 0; start < count; start += valuesPerLookUp) {
+        for (std::uint32_t bits = undecided[start / valuesPerLookUp]; bits != 0; bits &= bits - 1) {
+            const std::size_t at = start + static_cast<std::size_t>(std::countr_zero(bits));
+            soft[at] = decide(halfWordOf(words, at), (codeBits[at] >> lane & 1U) != 0, refinement);
+        }
+    }
+}
+
+/// @param start  the first value, a multiple of valuesPerGroup
+void QuantisedChannel::send(const RandomSource& source, const std::uint8_t* codeBits, unsigned lane,
+                            std::size_t start, std::size_t end, std::int8_t* soft,
+                            Refinement& refinement) const {
+    std::array<std::uint32_t, groupsAtOnce * wordsPerGroup> words;
+    for (; start < end; start += valuesAtOnce) {
+        const std::size_t size = std::min(valuesAtOnce, end - start);
+        source.words(Purpose::noise, static_cast<std::uint32_t>(start / valuesPerGroup),
+                     (size + valuesPerGroup - 1) / valuesPerGroup, words.data());
+        receive(words.data(), codeBits + start, lane, size, soft + start, refinement);
+    }
+}
+
 void QuantisedChannel::transmit(const RandomSource& source, const std::uint8_t* codeBits, unsigned lane,
                                 std::size_t count, std::int8_t* soft) const {
-    std::array<std::uint32_t, groupsAtOnce * wordsPerGroup> words;
-    std::array<std::uint32_t, valuesAtOnce / valuesPerLookUp> undecided;
     Refinement refinement(source, Purpose::refinement);
-    for (std::size_t start = 0; start < count; start += valuesAtOnce) {
-        const std::size_t size = std::min(valuesAtOnce, count - start);
-        source.words(Purpose::noise, static_cast<std::uint32_t>(start / (2 * wordsPerGroup)),
-                     (size + 2 * wordsPerGroup - 1) / (2 * wordsPerGroup), words.data());
-        draw(words.data(), codeBits + start, lane, size, soft + start, undecided.data());
-        for (std::size_t time = 0; time * valuesPerLookUp < size; ++time) {
-            for (std::uint32_t bits = undecided[time]; bits != 0; bits &= bits - 1) {
-                const std::size_t value =
-                    time * valuesPerLookUp + static_cast<std::size_t>(std::countr_zero(bits));
-                const std::size_t at = start + value;
-                soft[at] =
-                    decide(halfWordOf(words.data(), value), (codeBits[at] >> lane & 1U) != 0, refinement);
+    send(source, codeBits, lane, 0, count, soft, refinement);
+}
+
+/// The last values of the blocks of an octet, so few that the words of a group are too many.
+class QuantisedChannel::LastValues {
+  public:
+    static constexpr std::size_t most = valuesPerLookUp / 2;
+
+    LastValues(const QuantisedChannel& channel, const RandomSource& source, const std::uint8_t* codeBits,
+               std::size_t start, std::size_t count)
+        : itsChannel(channel), itsCount(count) {
+        const OctetWords drawn =
+            source.octetWords(Purpose::noise, static_cast<std::uint32_t>(start / valuesPerGroup), count);
+        // A look-up takes those of two blocks: they are decided by the low halves of their words.
+        for (unsigned lane = 0; lane < blocksPerOctet; ++lane) {
+            for (std::size_t i = 0; i < count; ++i) {
+                itsWords[lane / 2 * most + i] |= (drawn.of(lane)[i] & 0xffffU) << 16 * (lane % 2);
+                itsCodeBits[lane * most + i] = codeBits[start + i] >> lane & 1U;
             }
         }
+        channel.draw(itsWords.data(), itsCodeBits.data(), 0, valuesPerGroup, itsSoft.data(),
+                     itsUndecided.data());
+    }
+
+    void receive(unsigned lane, std::int8_t* soft, Refinement& refinement) const {
+        for (std::size_t i = 0; i < itsCount; ++i) {
+            const std::size_t value = lane * most + i;
+            const bool isUndecided = (itsUndecided[lane / 2] >> value % valuesPerLookUp & 1U) != 0;
+            soft[i] = isUndecided ? itsChannel.decide(halfWordOf(itsWords.data(), value),
+                                                      itsCodeBits[value] != 0, refinement)
+                                  : itsSoft[value];
+        }
+    }
+
+  private:
+    const QuantisedChannel& itsChannel;
+    std::size_t itsCount;
+    std::array<std::uint32_t, wordsPerGroup> itsWords{};
+    std::array<std::uint8_t, valuesPerGroup> itsCodeBits{};
+    std::array<std::int8_t, valuesPerGroup> itsSoft;
+    std::array<std::uint32_t, valuesPerGroup / valuesPerLookUp> itsUndecided;
+};
+
+void QuantisedChannel::transmitOctet(const RandomSource& source, const std::uint8_t* codeBits,
+                                     std::size_t count, std::int8_t* soft) const {
+    const std::size_t last = count % valuesPerGroup;
+    const std::size_t start = count - last;
+    if (start == 0 || last == 0 || last > LastValues::most) {
+        Channel::transmitOctet(source, codeBits, count, soft);
+        return;
+    }
+    const OctetWords first = source.octetWords(Purpose::noise, 0, wordsPerGroup);
+    const LastValues lastValues(*this, source, codeBits, start, last);
+    for (unsigned lane = 0; lane < blocksPerOctet; ++lane, soft += count) {
+        const RandomSource own = source.ofLane(lane);
+        Refinement refinement(own, Purpose::refinement);
+        receive(first.of(lane), codeBits, lane, valuesPerGroup, soft, refinement);
+        send(own, codeBits, lane, valuesPerGroup, start, soft, refinement);
+        lastValues.receive(lane, soft + start, refinement);
     }
 }
 

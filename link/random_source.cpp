@@ -1,11 +1,8 @@
 // SPDX-License-Identifier: MIT
 #include "link/random_source.hpp"
 
-#include <Random123/philox.h>
-
 #include <algorithm>
-#include <array>
-#include <cstring>
+#include <bit>
 
 namespace quarzel::link {
 
@@ -33,37 +30,40 @@ PhiloxInput inputOf(const BlockName& name) {
             {static_cast<std::uint32_t>(name.seed), static_cast<std::uint32_t>(name.seed >> 32)}};
 }
 
-/// For each byte the 8 bytes that hold its bits, the lowest first.
-using SpreadTable = std::array<std::array<std::uint8_t, 8>, 256>;
-
-constexpr SpreadTable makeSpreadTable() {
-    SpreadTable table{};
-    for (unsigned byte = 0; byte < table.size(); ++byte) {
-        for (unsigned bit = 0; bit < 8; ++bit) {
-            table[byte][bit] = byte >> bit & 1U;
+/// Transpose the 8 by 8 bits that are in byte j of 8 words, for each j.
+void transposeBytes(std::array<std::uint32_t, 8>& rows) {
+    const auto swap = [&rows](unsigned distance, std::uint32_t mask) {
+        for (unsigned row = 0; row < rows.size(); ++row) {
+            if ((row & distance) == 0) {
+                const std::uint32_t change = (rows[row] >> distance ^ rows[row + distance]) & mask;
+                rows[row] ^= change << distance;
+                rows[row + distance] ^= change;
+            }
         }
-    }
-    return table;
-}
-
-constexpr SpreadTable spreadTable = makeSpreadTable();
-
-/// Set bit `lane` of each of `count` bytes, a multiple of 8, that is set in the words, lowest bit first.
-void spreadBits(const std::uint32_t* words, unsigned lane, std::size_t count, std::uint8_t* bytes) {
-    for (std::size_t at = 0; at < count; at += 8) {
-        // Shifts and ors of 8 bytes together, none of which reaches into another.
-        std::uint64_t eight = 0;
-        std::uint64_t sum = 0;
-        std::memcpy(&eight, spreadTable[words[at / 32] >> at % 32 & 0xffU].data(), 8);
-        std::memcpy(&sum, bytes + at, 8);
-        sum |= eight << lane;
-        std::memcpy(bytes + at, &sum, 8);
-    }
+    };
+    swap(4, 0x0f0f0f0f);
+    swap(2, 0x33333333);
+    swap(1, 0x55555555);
 }
 
 }  // namespace
 
 RandomSource::RandomSource(const BlockName& name) : itsName(name), itsInput(inputOf(name)) {}
+
+OctetWords::OctetWords(const PhiloxInput& first, std::size_t count)
+    : itsShift(static_cast<unsigned>(std::bit_width(std::min(count, countersPerGroup) - 1))) {
+    PhiloxInput input = first;
+    input.blockShift = itsShift;
+    const std::size_t counters = blocksPerOctet << itsShift;
+    drawFunctions().drawWords(input, (counters + countersPerGroup - 1) / countersPerGroup, itsWords.data());
+}
+
+RandomSource RandomSource::ofLane(unsigned lane) const {
+    RandomSource source = *this;
+    source.itsName.block = itsName.block - this->lane() + lane;
+    source.itsInput.counter[1] = itsInput.counter[1] - this->lane() + lane;
+    return source;
+}
 
 RandomSource RandomSource::ofTransmission() const {
     BlockName name = itsName;
@@ -79,31 +79,41 @@ PhiloxInput RandomSource::input(Purpose purpose, std::uint32_t index) const {
 
 void RandomSource::words(Purpose purpose, std::uint32_t firstGroup, std::size_t groups,
                          std::uint32_t* words) const {
-    drawFunctions().drawWords(input(purpose, firstGroup * static_cast<std::uint32_t>(wordsPerGroup / 4)),
-                              groups, words);
+    drawFunctions().drawWords(input(purpose, firstGroup * countersPerGroup), groups, words);
 }
 
-void RandomSource::informationBits(unsigned lane, std::uint8_t* bits) const {
-    constexpr std::uint32_t bitsPerGroup = 32 * wordsPerGroup;
-    constexpr std::uint32_t fewBits = 4 * 32;
-    std::array<std::uint32_t, wordsPerGroup> words;
-    const std::uint32_t size = itsName.transportBlock != 0 ? itsName.transportBlock : itsName.blockSize;
-    if (size <= fewBits) {
-        // A group takes longer than the few numbers that are needed of it.
-        PhiloxInput next = input(Purpose::informationBits, 0);
-        for (std::uint32_t word = 0; 32 * word < size; ++word, ++next.counter[0]) {
-            const auto& [a, b, c, d] = next.counter;
-            words[word] =
-                philox4x32((philox4x32_ctr_t{{a, b, c, d}}), (philox4x32_key_t{{next.key[0], next.key[1]}}))
-                    .v[0];
+OctetWords RandomSource::octetWords(Purpose purpose, std::uint32_t firstGroup, std::size_t count) const {
+    PhiloxInput first = input(purpose, firstGroup * countersPerGroup);
+    first.counter[1] -= lane();
+    return {first, count};
+}
+
+void RandomSource::octetBits(std::uint8_t* bits) const {
+    constexpr std::size_t bitsPerGroup = 32 * wordsPerGroup;
+    const std::size_t size = informationBitCount();
+    for (std::size_t start = 0; start < size; start += bitsPerGroup) {
+        const std::size_t count = std::min(bitsPerGroup, size - start);
+        const OctetWords words = octetWords(
+            Purpose::informationBits, static_cast<std::uint32_t>(start / bitsPerGroup), (count + 31) / 32);
+        for (std::size_t at = 0; at < count; at += 32) {
+            std::array<std::uint32_t, blocksPerOctet> rows;
+            for (unsigned lane = 0; lane < blocksPerOctet; ++lane) {
+                rows[lane] = words.of(lane)[at / 32];
+            }
+            transposeBytes(rows);
+            for (std::size_t i = 0; i < std::min<std::size_t>(32, count - at); i += 8) {
+                for (std::size_t row = 0; row < rows.size(); ++row) {
+                    bits[start + at + i + row] = static_cast<std::uint8_t>(rows[row] >> i);
+                }
+            }
         }
-        spreadBits(words.data(), lane, size, bits);
-        return;
     }
-    for (std::uint32_t at = 0; at < size; at += bitsPerGroup) {
-        this->words(Purpose::informationBits, at / bitsPerGroup, 1, words.data());
-        const std::size_t count = std::min<std::size_t>(bitsPerGroup, size - at);
-        spreadBits(words.data(), lane, count, bits + at);
+}
+
+void RandomSource::informationBits(std::uint8_t* bits) const {
+    octetBits(bits);
+    for (std::size_t i = 0; i < informationBitCount(); ++i) {
+        bits[i] = bits[i] >> lane() & 1U;
     }
 }
 

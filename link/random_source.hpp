@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: MIT
 #pragma once
 
+#include <array>
 #include <cstddef>
 #include <cstdint>
 
@@ -8,6 +9,9 @@
 #include "link/draw/draw.hpp"
 
 namespace quarzel::link {
+
+/// Blocks are encoded by octets, 8 from a multiple of 8 on, a bit of each byte for each.
+constexpr std::uint64_t blocksPerOctet = 8;
 
 /// The name of the random numbers of a code block in a transmission. Equal names give equal numbers on every
 /// machine, different names independent ones. The core, the quantiser and the modulation are not part of it,
@@ -33,6 +37,22 @@ enum class Purpose : std::uint32_t {
     fadingRefinement = 4,
 };
 
+/// Random words of the blocks of an octet.
+class OctetWords {
+  public:
+    OctetWords(const PhiloxInput& first, std::size_t count);
+
+    /// Those of the block at a place in the octet. Where more than 16 were drawn, they follow one another.
+    const std::uint32_t* of(unsigned lane) const {
+        const std::size_t counter = std::size_t{lane} << itsShift;
+        return &itsWords[counter / countersPerGroup * wordsPerGroup + counter % countersPerGroup];
+    }
+
+  private:
+    unsigned itsShift;  ///< of the counters that are drawn of a block, a power of 2
+    std::array<std::uint32_t, blocksPerOctet * wordsPerGroup> itsWords;
+};
+
 /// The random numbers of one code block, from the counter-based generator Philox4x32-10. The key is the seed;
 /// the counter is made of the name, the purpose and the index, each in bits of its own.
 ///
@@ -43,6 +63,12 @@ class RandomSource {
 
     std::uint32_t blockSize() const { return itsName.blockSize; }
 
+    /// The block's place in its octet.
+    unsigned lane() const { return static_cast<unsigned>(itsName.block % blocksPerOctet); }
+
+    /// The numbers of the block at a place in the same octet.
+    RandomSource ofLane(unsigned lane) const;
+
     /// The numbers that all code blocks of a transport block share in a transmission: those of its first.
     RandomSource ofTransmission() const;
 
@@ -51,12 +77,24 @@ class RandomSource {
     /// @param words       receives groups * wordsPerGroup words
     void words(Purpose purpose, std::uint32_t firstGroup, std::size_t groups, std::uint32_t* words) const;
 
+    /// Draw words of all blocks of the octet, together where a block needs only few.
+    /// @param firstGroup  as of `words`; what is drawn are the first words of this group
+    /// @param count       of them for each block, at most 64
+    OctetWords octetWords(Purpose purpose, std::uint32_t firstGroup, std::size_t count) const;
+
+    /// Draw the information bits of all blocks of the octet.
+    /// @param bits  receives K bytes, or A and up to the next multiple of 8: bit i of each is of block i
+    void octetBits(std::uint8_t* bits) const;
+
     /// Draw the information bits.
-    /// @param lane  which bit, 0 to 7, of each byte they go to: bytes can hold the bits of 8 blocks
-    /// @param bits  K bytes, or A and up to the next multiple of 8, whose other bits are kept
-    void informationBits(unsigned lane, std::uint8_t* bits) const;
+    /// @param bits  receives as many bytes as octetBits, of 0 or 1
+    void informationBits(std::uint8_t* bits) const;
 
   private:
+    std::uint32_t informationBitCount() const {
+        return itsName.transportBlock != 0 ? itsName.transportBlock : itsName.blockSize;
+    }
+
     PhiloxInput input(Purpose purpose, std::uint32_t index) const;
 
     BlockName itsName;

@@ -30,24 +30,18 @@ void BlockSimulator::send(const Setup& setup, const std::vector<std::uint64_t>& 
     const link::Encoder& encoder = encoderOf(setup.blockSize);
     const auto channel = itsChannels.of(setup);
     const std::size_t codeBits = 3 * encoder.positions();
-    itsBits.assign(octets.size() * setup.blockSize, 0);
+    itsBits.resize(octets.size() * setup.blockSize);
     itsCodeBits.resize(codeBits);
     itsSoft.resize(octets.size() * blocksPerOctet * codeBits);
     std::uint8_t* bits = itsBits.data();
     std::int8_t* soft = itsSoft.data();
     for (const std::uint64_t octet : octets) {
-        const auto sourceOf = [&](unsigned lane) {
-            return link::RandomSource({itsSeed, setup.blockSize, setup.ebN0, octet * blocksPerOctet + lane});
-        };
-        for (unsigned lane = 0; lane < blocksPerOctet; ++lane) {
-            sourceOf(lane).informationBits(lane, bits);
-        }
+        const link::RandomSource source({itsSeed, setup.blockSize, setup.ebN0, octet * blocksPerOctet});
+        source.octetBits(bits);
         encoder.encode(bits, itsCodeBits.data());
-        for (unsigned lane = 0; lane < blocksPerOctet; ++lane) {
-            channel->transmit(sourceOf(lane), itsCodeBits.data(), lane, codeBits, soft);
-            soft += codeBits;
-        }
+        channel->transmitOctet(source, itsCodeBits.data(), codeBits, soft);
         bits += setup.blockSize;
+        soft += blocksPerOctet * codeBits;
     }
 }
 

@@ -7,10 +7,11 @@
 #include <string_view>
 #include <vector>
 
+#include "link/random_source.hpp"
+
 namespace quarzel::sweep {
 
-/// An octet of blocks: numbers 8 n to 8 n + 7 of a point. Each byte that is encoded holds a bit of each.
-constexpr std::uint64_t blocksPerOctet = 8;
+using link::blocksPerOctet;
 
 /// Why a point has ended.
 enum class StopReason { blockErrors, blocks, time };

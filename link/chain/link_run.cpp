@@ -20,13 +20,11 @@ void LinkRun::begin(Decibels ebN0, std::span<const std::uint64_t> octets, std::u
     // Information bits are drawn 8 at a time.
     std::vector<std::uint8_t> information((itsLink.informationBits() + 7) / 8 * 8);
     for (std::size_t octet = 0; octet < octets.size(); ++octet) {
-        std::fill(information.begin(), information.end(), std::uint8_t{0});
         const std::uint64_t first = octets[octet] * blocksPerOctet;
-        const std::uint64_t lanes = std::min(blocksPerOctet, end - first);
-        for (unsigned lane = 0; lane < lanes; ++lane) {
-            RandomSource(nameOf(first + lane)).informationBits(lane, information.data());
-            itsBlocks.push_back(first + lane);
+        for (std::uint64_t block = first; block < std::min(first + blocksPerOctet, end); ++block) {
+            itsBlocks.push_back(block);
         }
+        RandomSource(nameOf(first)).octetBits(information.data());
         itsLink.encode(std::span(information).first(itsLink.informationBits()),
                        std::span(itsBits).subspan(octet * blockBits, blockBits),
                        std::span(itsCodeBits).subspan(octet * codeBits, codeBits));

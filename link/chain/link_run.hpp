@@ -24,8 +24,6 @@ struct Verdict {
 /// Thread rule: one thread at a time; each thread has a run of its own.
 class LinkRun {
   public:
-    static constexpr std::uint64_t blocksPerOctet = 8;
-
     /// @param link  not owned, must outlive the run
     LinkRun(const CodedLink& link, std::uint64_t seed) : itsLink(link), itsSeed(seed) {}
 

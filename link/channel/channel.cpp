@@ -16,6 +16,13 @@ bool isMemoryless(const ChannelSetup& setup) {
     return setup.fading == Fading::none && amplitudes(setup.modulation).size() == 2;
 }
 
+void Channel::transmitOctet(const RandomSource& source, const std::uint8_t* codedBits, std::size_t count,
+                            std::int8_t* soft) const {
+    for (unsigned lane = 0; lane < blocksPerOctet; ++lane) {
+        transmit(source.ofLane(lane), codedBits, lane, count, soft + lane * count);
+    }
+}
+
 std::unique_ptr<const Channel> makeChannel(const ChannelSetup& setup, Decibels ebN0, CodeRate rate) {
     if (isMemoryless(setup)) {
         return std::make_unique<QuantisedChannel>(setup.quantiser, ebN0, rate);

@@ -30,6 +30,13 @@ class Channel {
     /// @param soft       receives `count` soft values; positive means bit 1
     virtual void transmit(const RandomSource& source, const std::uint8_t* codedBits, unsigned lane,
                           std::size_t count, std::int8_t* soft) const = 0;
+
+    /// Send the coded bits of all blocks of an octet.
+    /// @param source     the random numbers of any of them
+    /// @param codedBits  bit i of each byte is of block i
+    /// @param soft       receives `count` soft values for each block: those that `transmit` gives
+    virtual void transmitOctet(const RandomSource& source, const std::uint8_t* codedBits, std::size_t count,
+                               std::int8_t* soft) const;
 };
 
 /// How the amplitude of the received symbols varies, which the receiver knows: not at all, or as Rayleigh's

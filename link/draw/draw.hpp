@@ -12,10 +12,16 @@ namespace quarzel::link {
 struct PhiloxInput {
     std::uint32_t counter[4];
     std::uint32_t key[2];
+    /// After 2^blockShift counters the next block begins: its counter[1] is greater by 1, and counter[0] is
+    /// the first one's again.
+    unsigned blockShift = oneBlock;
+
+    static constexpr unsigned oneBlock = 31;
 };
 
-/// Words that are drawn together: those of 16 successive counters.
-constexpr std::size_t wordsPerGroup = 64;
+/// Words that are drawn together: the 4 of each of 16 successive counters.
+constexpr std::size_t countersPerGroup = 16;
+constexpr std::size_t wordsPerGroup = 4 * countersPerGroup;
 
 /// Channel outputs that are looked up together, from 16 words.
 constexpr std::size_t valuesPerLookUp = 32;
@@ -46,8 +52,8 @@ struct SearchTable {
 };
 
 struct DrawFunctions {
-    /// Draw groups of words; input.counter[0] is that of the first word and goes on by 16 a group. Word 16 j
-    /// + i of a group is word j of the output for the group's counter i.
+    /// Draw groups of words, of 16 counters each, from the input's counter on. Word 16 j + i of a group is
+    /// word j of the output for the group's counter i.
     void (*drawWords)(const PhiloxInput& input, std::size_t groups, std::uint32_t* words);
 
     /// Look up `times` * 32 channel outputs. Of 16 words, the low halves decide the first 16, the high halves
@@ -58,8 +64,7 @@ struct DrawFunctions {
                    const std::int32_t* cells, std::size_t times, std::int8_t* soft, std::uint32_t* undecided);
 
     /// Search for `count` channel outputs, decided by the same halves of words; null where a look-up is
-    /// faster. Words are read, and `undecided` is written,
-    /// for a multiple of searchValues outputs.
+    /// faster. Words are read, and `undecided` is written, for a multiple of searchValues outputs.
     /// @param undecided  as of a look-up, but set for some outputs that 16 random bits decide, too
     void (*search)(const std::uint32_t* words, const std::uint8_t* codeBits, unsigned lane,
                    const SearchTable& table, std::size_t count, std::int8_t* soft, std::uint32_t* undecided);

@@ -14,14 +14,17 @@ namespace quarzel::link {
 namespace {
 
 /// Products in 64 bits, whose upper halves may hold anything on the way: the form that vectorises best.
-void drawWords(const PhiloxInput& input, std::size_t groups, std::uint32_t* __restrict words) {
-    constexpr std::uint32_t counters = wordsPerGroup / 4;
+template <bool isOneBlock>
+void drawGroups(const PhiloxInput& input, std::size_t groups, std::uint32_t* __restrict words) {
+    constexpr std::uint32_t counters = countersPerGroup;
     constexpr std::uint64_t low = 0xffffffff;
+    const std::uint32_t ofBlock = (std::uint32_t{1} << input.blockShift) - 1;
     for (std::size_t group = 0; group < groups; ++group, words += wordsPerGroup) {
-        const std::uint32_t first = input.counter[0] + static_cast<std::uint32_t>(group) * counters;
+        const std::uint32_t first = static_cast<std::uint32_t>(group) * counters;
         for (std::uint32_t i = 0; i < counters; ++i) {
-            std::uint64_t a = first + i;
-            std::uint64_t b = input.counter[1];
+            const std::uint32_t counter = first + i;
+            std::uint64_t a = input.counter[0] + (isOneBlock ? counter : counter & ofBlock);
+            std::uint64_t b = input.counter[1] + (isOneBlock ? 0 : counter >> input.blockShift);
             std::uint64_t c = input.counter[2];
             std::uint64_t d = input.counter[3];
             std::uint32_t key0 = input.key[0];
@@ -42,6 +45,11 @@ void drawWords(const PhiloxInput& input, std::size_t groups, std::uint32_t* __re
             words[3 * counters + i] = static_cast<std::uint32_t>(d);
         }
     }
+}
+
+inline void drawWords(const PhiloxInput& input, std::size_t groups, std::uint32_t* words) {
+    const auto draw = input.blockShift == PhiloxInput::oneBlock ? drawGroups<true> : drawGroups<false>;
+    draw(input, groups, words);
 }
 
 /// The output for one 16-bit random number and a code bit.

@@ -150,6 +150,30 @@ TEST(QuantisedChannel, TransmitsTheSameWithEveryInstructionSet) {
     }
 }
 
+// Counts that leave none, few and many values over a whole group of words.
+TEST(QuantisedChannel, TransmitsAnOctetAsItsBlocks) {
+    std::mt19937 random = quarzel::test::seededRandom();
+    std::vector<std::uint8_t> bits(codeBits);
+    std::generate(bits.begin(), bits.end(), [&] { return static_cast<std::uint8_t>(random()); });
+    for (const Channel& channel : channels) {
+        const RandomSource source({random(), K, channel.ebN0, random()});
+        for (std::size_t i = 0; i < supportedDrawFunctions().size; ++i) {
+            const QuantisedChannel quantised(channel.quantiser, channel.ebN0, {},
+                                             *supportedDrawFunctions().first[i]);
+            for (const std::size_t count : {1U, 12U, 128U, 132U, 140U, 144U, 145U, 1036U, 3084U}) {
+                std::vector<std::int8_t> octet(blocksPerOctet * count);
+                quantised.transmitOctet(source, bits.data(), count, octet.data());
+                for (unsigned lane = 0; lane < blocksPerOctet; ++lane) {
+                    std::vector<std::int8_t> soft(count);
+                    quantised.transmit(source.ofLane(lane), bits.data(), lane, count, soft.data());
+                    ASSERT_TRUE(std::equal(soft.begin(), soft.end(), octet.data() + lane * count))
+                        << channel.quantiser.scale << ' ' << i << ' ' << count << ' ' << lane;
+                }
+            }
+        }
+    }
+}
+
 TEST(QuantisedChannel, GivesAValueThatDependsOnItsOwnBitAlone) {
     const Channel& channel = channels[0];
     const QuantisedChannel quantised(channel.quantiser, channel.ebN0);

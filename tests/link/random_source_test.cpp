@@ -49,15 +49,19 @@ TEST(DrawFunctions, GiveTheNumbersOfTheLibraryForEveryCounter) {
     }
     constexpr std::uint32_t groups = 5;
     for (std::size_t i = 0; i < supportedDrawFunctions().size; ++i) {
-        std::array<std::uint32_t, groups * wordsPerGroup> words{};
-        supportedDrawFunctions().first[i]->drawWords(input, groups, words.data());
-        for (std::uint32_t counter = 0; counter < groups * 16; ++counter) {
-            const philox4x32_ctr_t expected =
-                philox4x32((philox4x32_ctr_t{{input.counter[0] + counter, input.counter[1], input.counter[2],
-                                              input.counter[3]}}),
-                           (philox4x32_key_t{{input.key[0], input.key[1]}}));
-            for (std::size_t j = 0; j < 4; ++j) {
-                ASSERT_EQ(words[counter / 16 * wordsPerGroup + 16 * j + counter % 16], expected.v[j]);
+        for (const unsigned shift : {PhiloxInput::oneBlock, 0U, 1U, 2U, 3U, 4U, 5U}) {
+            input.blockShift = shift;
+            std::array<std::uint32_t, groups * wordsPerGroup> words{};
+            supportedDrawFunctions().first[i]->drawWords(input, groups, words.data());
+            for (std::uint32_t counter = 0; counter < groups * 16; ++counter) {
+                const std::uint32_t block = counter >> shift;
+                const philox4x32_ctr_t expected = philox4x32(
+                    (philox4x32_ctr_t{{input.counter[0] + counter - (block << shift),
+                                       input.counter[1] + block, input.counter[2], input.counter[3]}}),
+                    (philox4x32_key_t{{input.key[0], input.key[1]}}));
+                for (std::size_t j = 0; j < 4; ++j) {
+                    ASSERT_EQ(words[counter / 16 * wordsPerGroup + 16 * j + counter % 16], expected.v[j]);
+                }
             }
         }
     }
@@ -112,23 +116,45 @@ TEST(RandomSource, GivesAGroupWhereverTheCallerBegins) {
     }
 }
 
-TEST(RandomSource, DrawsTheSameInformationBitsInEveryLane) {
-    for (const std::uint32_t K : {40U, 1024U, 6144U}) {
+TEST(RandomSource, DrawsTheInformationBitsOfAnOctetFromTheWordsOfItsBlocks) {
+    for (const std::uint32_t K : {40U, 72U, 128U, 512U, 528U, 1024U, 6144U}) {
         BlockName block = name;
         block.blockSize = K;
-        std::vector<std::uint8_t> bits(K);
-        RandomSource(block).informationBits(0, bits.data());
-        std::vector<std::uint32_t> words(4 * wordsPerGroup);
-        RandomSource(block).words(Purpose::informationBits, 0, 4, words.data());
-        for (std::size_t i = 0; i < K; ++i) {
-            ASSERT_EQ(bits[i], words[i / 32] >> i % 32 & 1U);
+        block.block = (std::uint64_t{1} << 33) - 3;
+        std::vector<std::uint8_t> octet(K);
+        RandomSource(block).octetBits(octet.data());
+        for (unsigned lane = 0; lane < blocksPerOctet; ++lane) {
+            block.block = block.block / blocksPerOctet * blocksPerOctet + lane;
+            const RandomSource source(block);
+            std::vector<std::uint32_t> words(4 * wordsPerGroup);
+            source.words(Purpose::informationBits, 0, 4, words.data());
+            std::vector<std::uint8_t> bits(K);
+            source.informationBits(bits.data());
+            for (std::size_t i = 0; i < K; ++i) {
+                ASSERT_EQ(bits[i], words[i / 32] >> i % 32 & 1U);
+                ASSERT_EQ(bits[i], octet[i] >> lane & 1U);
+            }
+            const auto ones = static_cast<double>(std::count(bits.begin(), bits.end(), 1));
+            EXPECT_NEAR(ones, K / 2.0, 2.5 * std::sqrt(K));  // the numbers are always the same; five sigma
         }
-        const auto ones = static_cast<double>(std::count(bits.begin(), bits.end(), 1));
-        EXPECT_NEAR(ones, K / 2.0, 2.5 * std::sqrt(K));  // the numbers are always the same; five sigma
-        std::vector<std::uint8_t> shifted(K, 0x41);
-        RandomSource(block).informationBits(7, shifted.data());
-        for (std::size_t i = 0; i < K; ++i) {
-            ASSERT_EQ(shifted[i], bits[i] << 7 | 0x41);
+    }
+}
+
+TEST(RandomSource, DrawsTheWordsOfAnOctetAsThoseOfItsBlocks) {
+    BlockName block = name;
+    block.block = (std::uint64_t{1} << 32) + 13;
+    const RandomSource source(block);
+    EXPECT_EQ(source.lane(), 5U);
+    for (const std::size_t count : {1U, 2U, 3U, 4U, 9U, 16U, 17U, 64U}) {
+        const OctetWords drawn = source.octetWords(Purpose::noise, 7, count);
+        for (unsigned lane = 0; lane < blocksPerOctet; ++lane) {
+            block.block = (std::uint64_t{1} << 32) + 8 + lane;
+            std::vector<std::uint32_t> words(wordsPerGroup);
+            RandomSource(block).words(Purpose::noise, 7, 1, words.data());
+            EXPECT_TRUE(std::equal(drawn.of(lane), drawn.of(lane) + count, words.begin())) << count;
+            std::vector<std::uint32_t> ofLane(wordsPerGroup);
+            source.ofLane(lane).words(Purpose::noise, 7, 1, ofLane.data());
+            EXPECT_EQ(ofLane, words);
         }
     }
 }

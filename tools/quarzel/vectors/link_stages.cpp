@@ -79,7 +79,7 @@ LinkStages LinkStageSource::make(std::uint32_t block) const {
     LinkStages stages;
     // Information bits are drawn 8 at a time.
     stages.bits.resize((itsLink.informationBits() + 7) / 8 * 8);
-    link::RandomSource(name).informationBits(0, stages.bits.data());
+    link::RandomSource(name).informationBits(stages.bits.data());
     stages.bits.resize(itsLink.informationBits());
     encode(stages);
     for (std::uint32_t i = 0; i < setup.redundancyVersions.size(); ++i) {

@@ -28,7 +28,7 @@ std::vector<std::int8_t> softOf(const std::vector<std::uint8_t>& bits, std::int8
 
 std::vector<std::uint8_t> codeWord(const link::RandomSource& source) {
     std::vector<std::uint8_t> bits(source.blockSize());
-    source.informationBits(0, bits.data());
+    source.informationBits(bits.data());
     const link::Encoder encoder(source.blockSize());
     std::vector<std::uint8_t> streams(3 * encoder.positions());
     encoder.encode(bits.data(), streams.data());
