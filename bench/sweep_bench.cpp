@@ -225,7 +225,7 @@ void channelTables(benchmark::State& bench) {
 
 BENCHMARK(sweepAndDecoder)
     ->ArgNames({"K", "units", "algorithm"})
-    ->ArgsProduct({{40, 1024, 6144}, {2, 8}, {0, 1, 2}})
+    ->ArgsProduct({{40, 512, 1024, 6144}, {2, 8}, {0, 1, 2}})
     ->Unit(benchmark::kMicrosecond);
 BENCHMARK(chainAndDecoder)
     ->ArgNames({"K", "units"})
