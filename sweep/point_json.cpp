@@ -7,6 +7,7 @@
 #include <string>
 #include <vector>
 
+#include "sweep/json_text.hpp"
 #include "sweep/statistics.hpp"
 
 namespace quarzel::sweep {
@@ -38,9 +39,17 @@ Json valueJson(Stop stop) {
     return nameOf(stop);
 }
 
-template <class Value>
-void readValue(const Json& json, Value& value) {
+void readValue(const Json& json, double& value) {
     json.get_to(value);
+}
+
+template <std::integral Value>
+void readValue(const Json& json, Value& value) {
+    value = wholeNumber<Value>(json);
+}
+
+void readValue(const Json& json, std::vector<unsigned>& values) {
+    values = wholeNumbers<unsigned>(json);
 }
 
 void readValue(const Json& json, link::Quantiser::Kind& kind) {
@@ -105,8 +114,9 @@ void appendSending(Json& json, const Setup& setup, const PointState& point) {
 }
 
 ErrorCount countFrom(const Json& json) {
-    return {json.at("bit_errors").get<std::uint64_t>(), json.at("block_errors").get<std::uint64_t>(),
-            json.value("undetected_errors", std::uint64_t{0})};
+    return {wholeNumber<std::uint64_t>(json.at("bit_errors")),
+            wholeNumber<std::uint64_t>(json.at("block_errors")),
+            wholeNumber<std::uint64_t>(json.value("undetected_errors", Json(0U)))};
 }
 
 void requirePossible(const PointState& point, const Setup& setup) {
@@ -179,8 +189,8 @@ std::pair<Setup, PointState> pointFrom(const Json& curve, const Json& json) {
     setup.ebN0 = {static_cast<std::int32_t>(std::lround(json.at("ebn0_db").get<double>() * 1e6))};
     setup.check();
     PointState point;
-    json.at("blocks").get_to(point.blocks);
-    json.at("bit_error_squares").get_to(point.bitErrorSquares);
+    readValue(json.at("blocks"), point.blocks);
+    readValue(json.at("bit_error_squares"), point.bitErrorSquares);
     if (const Json& reason = json.at("stopped_by"); !reason.is_null()) {
         point.stoppedBy = stopReasonOf(reason.get<std::string>()).value();
     }
@@ -205,7 +215,7 @@ std::pair<Setup, PointState> pointFrom(const Json& curve, const Json& json) {
         }
     }
     if (setup.sending.stop != Stop::none) {
-        json.at("iterations_used").get_to(point.iterationsUsed);
+        point.iterationsUsed = wholeNumbers<std::uint64_t>(json.at("iterations_used"));
         if (point.iterationsUsed.size() != static_cast<std::size_t>(setup.iterations)) {
             throw std::runtime_error("a point does not tell how often each number of iterations was used");
         }

@@ -5,6 +5,7 @@
 
 #include "sweep/document.hpp"
 #include "sweep/error.hpp"
+#include "sweep/json_text.hpp"
 #include "sweep/point_json.hpp"
 #include "sweep/sha256.hpp"
 
@@ -45,7 +46,7 @@ Result resultFrom(Json document) {
         upgrade(document);
     }
     Result result;
-    document.at("seed").get_to(result.seed);
+    result.seed = wholeNumber<std::uint64_t>(document.at("seed"));
     document.at("quarzel").get_to(result.quarzel);
     for (const Json& curve : document.at("curves")) {
         for (const Json& json : curve.at("points")) {
@@ -57,8 +58,9 @@ Result resultFrom(Json document) {
     }
     if (document.contains("part")) {
         const Json& part = document.at("part");
-        result.part = {{part.at("index").get<std::uint64_t>() - 1, part.at("count").get<std::uint64_t>()},
-                       part.at("sweep").get<std::string>()};
+        result.part = {
+            {wholeNumber<std::uint64_t>(part.at("index")) - 1, wholeNumber<std::uint64_t>(part.at("count"))},
+            part.at("sweep").get<std::string>()};
         if (result.part->shard.index >= result.part->shard.count ||
             result.part->shard.count > Shard::highestCount) {
             throw std::runtime_error("its part is not one of a sweep");

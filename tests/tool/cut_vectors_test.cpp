@@ -3,6 +3,7 @@
 
 #include <algorithm>
 #include <functional>
+#include <map>
 
 #include "npy_data.hpp"
 #include "refusal.hpp"
@@ -63,15 +64,21 @@ TEST_F(CutVectors, AreRefusedWhenTheyAreMixed) {
 TEST_F(CutVectors, AreRefusedWhenTheManifestHoldsWhatCannotBe) {
     const std::string whole = readFile(itsSet + "/manifest.json");
     const std::string size = "\"block_size\":40,";
-    for (const char* const other : {"-1", "41", "0", "4294967336"}) {
+    const std::string unknown = "it has a block size that LTE has not";
+    const std::string range = " is not a whole number from 0 to 4294967295";
+    for (const auto& [other, problem] :
+         std::map<std::string, std::string>{{"41", unknown},
+                                            {"0", unknown},
+                                            {"-1", "-1" + range},
+                                            {"40.5", "40.5" + range},
+                                            {"1e300", "1e+300" + range},
+                                            {"\"40\"", "\"40\"" + range},
+                                            {"4294967336", "4294967336" + range}}) {
         std::string altered = whole;
-        altered.replace(altered.find(size), size.size(), std::string("\"block_size\":") + other + ',');
+        altered.replace(altered.find(size), size.size(), "\"block_size\":" + other + ',');
         itsDirectory.write("set/manifest.json", altered);
-        EXPECT_EQ(refusal(),
-                  "quarzel: error: " + itsSet +
-                      "/manifest.json: is not a well-formed manifest: it has a block size that LTE has "
-                      "not; make the set again with 'quarzel vectors'\n")
-            << other;
+        EXPECT_EQ(refusal(), "quarzel: error: " + itsSet + "/manifest.json: is not a well-formed manifest: " +
+                                 problem + "; make the set again with 'quarzel vectors'\n");
     }
 }
 

@@ -104,9 +104,11 @@ TEST(HostileFile, MayHoldWhatNoSweepGives) {
     const std::string impossible = "a point has more errors or blocks than there can be";
     expectRefused(uncounted, [](Json& point) { point["per_iteration"] = Json::array(); });
     expectRefused(uncounted, [](Json& point) { point["per_iteration"].erase(0); });
-    expectRefused(impossible, [](Json& point) { point["blocks"] = -1; });
+    const std::string range = " is not a whole number from 0 to 18446744073709551615";
+    expectRefused("-1" + range, [](Json& point) { point["blocks"] = -1; });
+    expectRefused("1e+300" + range, [](Json& point) { point["blocks"] = 1e300; });
+    expectRefused("1e+300" + range, [](Json& point) { point["per_iteration"][0]["bit_errors"] = 1e300; });
     expectRefused(impossible, [](Json& point) { point["blocks"] = 0; });
-    expectRefused(impossible, [](Json& point) { point["blocks"] = 1e300; });
     expectRefused("an Eb/N0 is not a number of decibels", [](Json& point) { point["ebn0_db"] = 1e300; });
 }
 

@@ -67,11 +67,15 @@ Json toJson(const VectorCore& core) {
 }
 
 VectorCore coreFrom(const Json& object) {
-    VectorCore core{object.at("directory"), object.at("units"), object.at("algorithm"), {}};
+    VectorCore core{object.at("directory"),
+                    sweep::wholeNumber<int>(object.at("units")),
+                    sweep::wholeNumber<int>(object.at("algorithm")),
+                    {}};
     for (const Json& block : object.at("blocks")) {
-        core.blocks.push_back({block.at("block_size"), block.at("iterations"), block.at("stimulus"),
-                               block.at("capture"), block.at("row")});
-        if (!findBlockSize(block.at("block_size").get<std::uint64_t>())) {
+        core.blocks.push_back({sweep::wholeNumber<std::uint32_t>(block.at("block_size")),
+                               sweep::wholeNumber<int>(block.at("iterations")), block.at("stimulus"),
+                               block.at("capture"), sweep::wholeNumber<std::size_t>(block.at("row"))});
+        if (!findBlockSize(core.blocks.back().blockSize)) {
             throw std::invalid_argument("it has a block size that LTE has not");
         }
     }
@@ -102,10 +106,7 @@ std::string manifestText(const Json& configuration, const Json& coverage, const 
     return text + '\n';
 }
 
-VectorContent readManifest(const std::string& directory) {
-    const std::string file = directory + '/' + manifestName;
-    std::ifstream stream = openInput(file);
-    const std::string text(std::istreambuf_iterator<char>(stream), {});
+VectorContent contentOf(const std::string& text, const std::string& file) {
     constexpr const char* remedy = "make the set again with 'quarzel vectors'";
     const Json manifest = sweep::parseJson(text);
     if (manifest.is_discarded()) {
@@ -125,7 +126,8 @@ VectorContent readManifest(const std::string& directory) {
             content.cores.push_back(coreFrom(core));
         }
         for (const Json& entry : manifest.at("files")) {
-            content.files.push_back({entry.at("name"), entry.at("bytes"), entry.at("sha256")});
+            content.files.push_back(
+                {entry.at("name"), sweep::wholeNumber<std::size_t>(entry.at("bytes")), entry.at("sha256")});
         }
         return content;
     } catch (const Json::exception&) {
@@ -133,6 +135,12 @@ VectorContent readManifest(const std::string& directory) {
     } catch (const std::invalid_argument& error) {
         throw fileError(file, fmt::format("is not a well-formed manifest: {}", error.what()), remedy);
     }
+}
+
+VectorContent readManifest(const std::string& directory) {
+    const std::string file = directory + '/' + manifestName;
+    std::ifstream stream = openInput(file);
+    return contentOf({std::istreambuf_iterator<char>(stream), {}}, file);
 }
 
 std::string readUnaltered(const std::string& directory, const std::string& name,

@@ -59,6 +59,11 @@ struct VectorContent {
 std::string manifestText(const nlohmann::ordered_json& configuration, const nlohmann::ordered_json& coverage,
                          const VectorContent& content);
 
+/// Read the content that the text of a manifest tells.
+/// @param file  its name, for error messages
+/// @throws ToolError when it is of another version or not well-formed
+VectorContent contentOf(const std::string& text, const std::string& file);
+
 /// Read the content that the manifest of a set tells.
 /// @param directory  of the set
 /// @throws ToolError when there is none, or it is of another version or not well-formed
