@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: MIT
-// The literal decoder against every implementation, and the batch and the array call against single calls.
+// The literal decoder against another implementation, and the batch and the array call against single calls.
 #include <memory>
 #include <string>
 #include <vector>
@@ -105,8 +105,8 @@ Answer decodeArray(const Work& work, const char* implementation) {
 Work workOf(fuzz::InputBytes& bytes) {
     Work work{2 << bytes.takeFrom(0, 2), bytes.takeFrom(0, 2), bytes.takeFrom(0, 32), 0, 0, {}, {}};
     work.K = 40 + 8 * static_cast<std::size_t>(bytes.takeFrom(0, 24));
-    work.iterations = bytes.takeFrom(1, 4);
-    const int count = bytes.takeFrom(1, 4);
+    work.iterations = bytes.takeFrom(1, 2);
+    const int count = bytes.takeFrom(1, 3);
     const int factor = bytes.takeFrom(0, 9) == 0 ? 3 : 1;
     const std::string values = bytes.rest();
     std::size_t at = 0;
@@ -132,13 +132,17 @@ Work workOf(fuzz::InputBytes& bytes) {
 
 extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
     fuzz::InputBytes bytes(data, size);
+    std::vector<const char*> names;
+    while (const char* const name =
+               vardel_ip_quarzel_get_implementation_name(static_cast<int>(names.size()))) {
+        names.push_back(name);
+    }
+    const char* const name = names[bytes.take<std::uint8_t>() % names.size()];
     const Work work = workOf(bytes);
     const Answer literal = decodeSingly(work, "literal");
     fuzz::require(literal.statuses == std::vector<int>(work.blocks.size()), "every block is decoded");
-    for (int i = 0; const char* const name = vardel_ip_quarzel_get_implementation_name(i); ++i) {
-        fuzz::require(decodeSingly(work, name) == literal, "single calls are as if decoded literally");
-        fuzz::require(decodeBatch(work, name) == literal, "a batch is as if decoded literally");
-        fuzz::require(decodeArray(work, name) == literal, "an array is as if decoded literally");
-    }
+    fuzz::require(decodeSingly(work, name) == literal, "single calls are as if decoded literally");
+    fuzz::require(decodeBatch(work, name) == literal, "a batch is as if decoded literally");
+    fuzz::require(decodeArray(work, name) == literal, "an array is as if decoded literally");
     return 0;
 }

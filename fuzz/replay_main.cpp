@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: MIT
-// Runs a fuzz target on the files of its corpus, without a fuzzer: PROGRAM FOLDER
+// Runs a fuzz target on the files of its corpora, without a fuzzer: PROGRAM FOLDER...
 #include <cstdint>
 #include <cstdio>
 #include <filesystem>
@@ -10,18 +10,16 @@
 extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size);
 
 int main(int argc, char** argv) {
-    if (argc != 2) {
-        std::fprintf(stderr, "usage: %s FOLDER\n", argv[0]);
-        return 2;
-    }
     int inputs = 0;
-    for (const auto& entry : std::filesystem::directory_iterator(argv[1])) {
-        std::ifstream stream(entry.path(), std::ios::binary);
-        const std::string bytes(std::istreambuf_iterator<char>(stream), {});
-        std::printf("%s, %zu bytes\n", entry.path().c_str(), bytes.size());
-        std::fflush(stdout);
-        LLVMFuzzerTestOneInput(reinterpret_cast<const std::uint8_t*>(bytes.data()), bytes.size());
-        ++inputs;
+    for (int i = 1; i < argc; ++i) {
+        for (const auto& entry : std::filesystem::directory_iterator(argv[i])) {
+            std::ifstream stream(entry.path(), std::ios::binary);
+            const std::string bytes(std::istreambuf_iterator<char>(stream), {});
+            std::printf("%s, %zu bytes\n", entry.path().c_str(), bytes.size());
+            std::fflush(stdout);
+            LLVMFuzzerTestOneInput(reinterpret_cast<const std::uint8_t*>(bytes.data()), bytes.size());
+            ++inputs;
+        }
     }
     std::printf("%d inputs\n", inputs);
     return inputs == 0 ? 1 : 0;

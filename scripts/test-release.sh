@@ -62,8 +62,10 @@ part_memcheck() {
         valgrind --quiet --error-exitcode=1 --leak-check=full build/release/tests/interface/$test --gtest_brief=1
     done
 }
-part_fuzz_calls() { scripts/fuzz.sh 1000000 differential library_text options rate_recovery; }
-part_fuzz_readers() { scripts/fuzz.sh 10000000 memory_files reference_curves traces; }
+part_fuzz_calls() { scripts/fuzz.sh 1000000 c_interface differential library_text options rate_recovery; }
+part_fuzz_readers() {
+    scripts/fuzz.sh 10000000 bits_files captures manifests memory_files reference_curves results traces
+}
 
 parts=(test long old_processors other_processors compilers third_opinion thread_sanitizer
     coverage reproducible memcheck mutation fuzz_calls fuzz_readers)

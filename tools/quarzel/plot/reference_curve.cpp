@@ -101,15 +101,11 @@ void addLabels(Curves& file) {
 
 }  // namespace
 
-std::vector<ReferenceCurve> readReferenceCurves(const std::string& argument) {
-    const std::size_t equals = argument.find('=');
-    std::error_code ignored;  // a long label is not a file name
-    const bool hasLabel = equals != std::string::npos && !std::filesystem::exists(argument, ignored);
-    const std::string file = hasLabel ? argument.substr(equals + 1) : argument;
-    std::ifstream stream = openInput(file);
+std::vector<ReferenceCurve> readReferenceCurves(std::istream& stream, const std::string& label,
+                                                const std::string& file) {
     Curves result = curvesOf(readReferenceRows(stream, file), file);
     for (ReferenceCurve& curve : result.curves) {
-        curve.label = hasLabel ? argument.substr(0, equals) : std::filesystem::path(file).stem().string();
+        curve.label = label;
     }
     addLabels(result);
     std::erase_if(result.curves,
@@ -118,6 +114,16 @@ std::vector<ReferenceCurve> readReferenceCurves(const std::string& argument) {
         throw fileError(file, "holds no point", referenceRemedy);
     }
     return result.curves;
+}
+
+std::vector<ReferenceCurve> readReferenceCurves(const std::string& argument) {
+    const std::size_t equals = argument.find('=');
+    std::error_code ignored;  // a long label is not a file name
+    const bool hasLabel = equals != std::string::npos && !std::filesystem::exists(argument, ignored);
+    const std::string file = hasLabel ? argument.substr(equals + 1) : argument;
+    std::ifstream stream = openInput(file);
+    return readReferenceCurves(
+        stream, hasLabel ? argument.substr(0, equals) : std::filesystem::path(file).stem().string(), file);
 }
 
 }  // namespace quarzel::tool

@@ -2,6 +2,7 @@
 #pragma once
 
 #include <cstdint>
+#include <istream>
 #include <optional>
 #include <string>
 #include <utility>
@@ -25,6 +26,13 @@ struct ReferenceCurve {
 /// blocks, bit_errors and block_errors, of which one is enough. An empty field, or a count of 0, is no point.
 /// Rows that differ in source, K, code_bits, channel, modulation, decoder or iterations, where the file has
 /// these, are points of different curves.
+/// @param label  of a file with one curve; where it has more, what tells them apart follows
+/// @param file   its name, for error messages
+/// @throws ToolError when it is not well-formed
+std::vector<ReferenceCurve> readReferenceCurves(std::istream& stream, const std::string& label,
+                                                const std::string& file);
+
+/// The same of the file that an argument names.
 /// @param argument  "LABEL=FILE", or a file whose name without its ending is the label
 /// @throws ToolError when it cannot be read or is not well-formed
 std::vector<ReferenceCurve> readReferenceCurves(const std::string& argument);

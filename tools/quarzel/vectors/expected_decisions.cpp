@@ -91,6 +91,23 @@ ExpectedDecisions readCore(const std::string& name) {
     return expected;
 }
 
+}  // namespace
+
+std::string ExpectedBlock::about() const {
+    return iterations == 0
+               ? ""
+               : counted(static_cast<std::size_t>(iterations), "iteration", "iterations") + ", " + stimulus;
+}
+
+std::size_t ExpectedDecisions::packedSize() const {
+    const auto hasFirstSize = [this](const ExpectedBlock& block) {
+        return block.blockSize == blocks.front().blockSize;
+    };
+    return !blocks.empty() && std::all_of(blocks.begin(), blocks.end(), hasFirstSize)
+               ? blocks.front().blockSize / 8
+               : 0;
+}
+
 ExpectedDecisions readPacked(std::istream& stream, const std::string& file) {
     const NpyHeader header = readNpyHeader(stream, file);
     if (header.shape.size() != 2 || header.shape[1] > blockSizes().back().K / 8 ||
@@ -111,23 +128,6 @@ ExpectedDecisions readPacked(std::istream& stream, const std::string& file) {
         }
     }
     return expected;
-}
-
-}  // namespace
-
-std::string ExpectedBlock::about() const {
-    return iterations == 0
-               ? ""
-               : counted(static_cast<std::size_t>(iterations), "iteration", "iterations") + ", " + stimulus;
-}
-
-std::size_t ExpectedDecisions::packedSize() const {
-    const auto hasFirstSize = [this](const ExpectedBlock& block) {
-        return block.blockSize == blocks.front().blockSize;
-    };
-    return !blocks.empty() && std::all_of(blocks.begin(), blocks.end(), hasFirstSize)
-               ? blocks.front().blockSize / 8
-               : 0;
 }
 
 ExpectedDecisions readExpected(const std::string& name) {

@@ -3,6 +3,7 @@
 
 #include <cstddef>
 #include <cstdint>
+#include <istream>
 #include <string>
 #include <vector>
 
@@ -29,6 +30,11 @@ struct ExpectedDecisions {
     /// K / 8 when every block has the same K, else 0.
     std::size_t packedSize() const;
 };
+
+/// Read the decisions that an npy file of packed bits holds.
+/// @param file  its name, for error messages
+/// @throws ToolError when it is not well-formed or has another type or shape
+ExpectedDecisions readPacked(std::istream& stream, const std::string& file);
 
 /// Read the decisions of a core of a vector set, named by its directory, its memory of decisions or, where
 /// the set has only one core, the directory of the set; or an npy file of packed bits.
