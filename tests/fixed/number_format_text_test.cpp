@@ -123,6 +123,9 @@ TEST(NumberFormatText, IsEchoedWhenItHasAnotherShape) {
                                          "fix_17_0"}) {
         EXPECT_EQ(refusal(properties), unexpectedLine(properties)) << properties;
     }
+    // The largest numbers that are read as such.
+    EXPECT_EQ(refusal("Fix_4294967295_2"), widthLine);
+    EXPECT_EQ(refusal("Fix_6_4294967295"), binaryPointLine);
 }
 
 TEST(NumberFormatText, IsRefusedWithALineForNegativeNumbers) {
