@@ -10,7 +10,8 @@ namespace {
 /// Round a correction, which is never negative, half up to the integer of the format, saturate, and keep the
 /// low byte of the word.
 unsigned char toTableByte(double y, const TNumberFormat& format) {
-    const auto q = static_cast<std::int32_t>(y * format.scale + 0.5);
+    const double halfMore = y * format.scale + 0.5;
+    const auto q = static_cast<std::int32_t>(halfMore);
     if (q < format.minQ) {
         return static_cast<unsigned char>(format.min);
     }
