@@ -75,29 +75,24 @@ QUARZEL_FAILING(int, posix_spawnp, EAGAIN, EAGAIN,
                  const posix_spawnattr_t* attributes, char* const argv[], char* const environment[]),
                 child, file, actions, attributes, argv, environment)
 
-// As a function of a variable number of arguments these two are written out.
-extern "C" int openat(int directory, const char* name, int flags, ...) {
-    if (fails("openat")) {
-        errno = EMFILE;
-        return -1;
-    }
-    va_list more;
-    va_start(more, flags);
-    const auto mode = va_arg(more, mode_t);
-    va_end(more);
-    return static_cast<int>(::syscall(SYS_openat, directory, name, flags, mode));
+// As functions of a variable number of arguments these two are written out.
+#define QUARZEL_FAILING_OPEN(name, directory) \
+    if (fails(#name)) {                       \
+        errno = EMFILE;                       \
+        return -1;                            \
+    }                                         \
+    va_list more;                             \
+    va_start(more, flags);                    \
+    const auto mode = va_arg(more, mode_t);   \
+    va_end(more);                             \
+    return static_cast<int>(::syscall(SYS_openat, directory, file, flags, mode))
+
+extern "C" int openat(int directory, const char* file, int flags, ...) {
+    QUARZEL_FAILING_OPEN(openat, directory);
 }
 
-extern "C" int open(const char* name, int flags, ...) {
-    if (fails("open")) {
-        errno = EMFILE;
-        return -1;
-    }
-    va_list more;
-    va_start(more, flags);
-    const auto mode = va_arg(more, mode_t);
-    va_end(more);
-    return static_cast<int>(::syscall(SYS_openat, AT_FDCWD, name, flags, mode));
+extern "C" int open(const char* file, int flags, ...) {
+    QUARZEL_FAILING_OPEN(open, AT_FDCWD);
 }
 
 // The descriptor is closed all the same.
