@@ -23,8 +23,7 @@ std::string frozenDigest(const std::vector<unsigned char>& decisions);
 
 /// A line of the file: the case and the digests of its decisions.
 /// @param decode  `decisions = decode(blocks)`: K bytes of 0 or 1 for each of the blocks, which have one
-/// number
-///                of iterations
+///                number of iterations
 template <class Decode>
 std::string frozenLine(const FrozenCase& which, Decode&& decode) {
     std::vector<Block> blocks;
