@@ -45,14 +45,16 @@ std::vector<unsigned char> TCalculationEngineModBase::createLUT(unsigned points,
     const auto ignored = static_cast<std::int32_t>(format->binpt + format->shift - drop);
     const std::int32_t keep = ignored > 0 ? -(std::int32_t{1} << ignored) : -1;
 
-    std::vector<unsigned char> table;
-    table.reserve(65536);
-    for (std::int32_t difference = -32768; difference <= 32767; ++difference) {
-        // The complement, not the magnitude: -1 shares the entry of 0.
-        const std::int32_t d = (difference >= 0 ? difference : -difference - 1) & keep;
-        const double x = format->toReal(static_cast<std::int16_t>(d));
+    std::vector<unsigned char> table(65536, toTableByte(0.0, *format));
+    unsigned char* const zero = &table[32768];
+    for (std::int32_t difference = 0; difference <= 32767; ++difference) {
+        const double x = format->toReal(static_cast<std::int16_t>(difference & keep));
         // The cut-off is the number of points, not the difference that they reach.
-        table.push_back(toTableByte(x < points ? std::log(std::exp(-x) + 1.0) : 0.0, *format));
+        if (!(x < points)) {
+            break;
+        }
+        // The complement, not the magnitude: -1 shares the entry of 0.
+        zero[difference] = zero[-1 - difference] = toTableByte(std::log(std::exp(-x) + 1.0), *format);
     }
     return table;
 }
