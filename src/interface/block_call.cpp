@@ -85,10 +85,10 @@ Outcome decodeLiterally(vardel_ip_quarzel_state& state, const BlockCall& call) {
     toSoftValues(call, *state.input_format, *state.state_format, soft);
     std::vector<unsigned char> hard;
     if (!state.decoder->decode(soft, hard, static_cast<unsigned>(call.iterations))) {
-        return {2, 0};
+        return {2};
     }
     if (!hasRoom(call, hard.size())) {
-        return {refuse(state.messages, "Insufficient allocated space for output array"), 0};
+        return {refuse(state.messages, "Insufficient allocated space for output array")};
     }
     literal.writeIterations(call);
     std::copy(hard.begin(), hard.end(), call.dout + (call.iterations - 1) * call.iterationStride);
@@ -126,7 +126,7 @@ Outcome decodeInLanes(vardel_ip_quarzel_state& state, const BlockCall& call) {
 
 Outcome decodeBlock(vardel_ip_quarzel_state& state, const BlockCall& call) {
     if (state.decoder == nullptr) {  // a record that nobody has filled
-        return {unhandledException(state.messages), 0};
+        return {unhandledException(state.messages)};
     }
     try {
         if (call.positionStride == 1 && hasRoom(call, blockSize(call)) &&
@@ -136,7 +136,7 @@ Outcome decodeBlock(vardel_ip_quarzel_state& state, const BlockCall& call) {
         return decodeLiterally(state, call);
     } catch (...) {
         reportSaturation(state, call);
-        return {unhandledException(state.messages), 0};
+        return {unhandledException(state.messages)};
     }
 }
 

@@ -24,7 +24,7 @@ struct BlockCall {
 /// How a decode ended.
 struct Outcome {
     int status;
-    std::size_t bits;  ///< decisions written, when the status is 0
+    std::size_t bits = 0;  ///< decisions written, when the status is 0
 };
 
 /// The text for the first argument of a block that is wrong, or null.

@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: MIT
 #pragma once
 
+#include <algorithm>
 #include <cstdint>
 #include <optional>
 #include <vector>
@@ -38,8 +39,8 @@ struct LaneLayout {
     Sources natural;
     Sources interleaved;
 
-    std::uint32_t slices() const { return segments >= sliceLanes ? segments / sliceLanes : 1; }
-    std::uint32_t lanesOfBlock() const { return segments >= sliceLanes ? sliceLanes : segments; }
+    std::uint32_t slices() const { return std::max(segments / sliceLanes, 1U); }
+    std::uint32_t lanesOfBlock() const { return std::min(segments, sliceLanes); }
     std::uint32_t blocksPerBundle() const { return sliceLanes / lanesOfBlock(); }
     /// The segment in a lane of a slice, and the block of the bundle that it belongs to.
     std::uint32_t segmentOf(std::uint32_t slice, std::uint32_t lane) const {

@@ -207,11 +207,11 @@ inline Lanes<W> shuffleSlices(Lanes<W> x, Lanes<W> positions) {
     static_assert(W == 8);
     return {(typename Lanes<W>::Signed)vqtbl1q_u8((uint8x16_t)x.v, (uint8x16_t)positions.v)};
 #else
+    static_assert(W == 8);
     Lanes<W> result;
     for (std::size_t lane = 0; lane < W; ++lane) {
-        const std::size_t slice = lane / sliceLanes * sliceLanes;
         // A shuffle names bytes, two a lane.
-        result.v[lane] = x.v[slice + static_cast<std::size_t>(positions.v[lane] & 0xFF) / 2];
+        result.v[lane] = x.v[static_cast<std::size_t>(positions.v[lane] & 0xFF) / 2];
     }
     return result;
 #endif

@@ -113,6 +113,14 @@ TEST(ParallelDecoder, TracesItsCutWhenTheSizeChanges) {
     }
 }
 
+TEST(ParallelDecoder, TracesNoRecursionBelowVerbosity9) {
+    Decoder decoder("MOD", false, 2U, 4U);
+    decoder.setVerbosity(8);
+    capture([&] { decoder.allocate(128 + 3); });
+    std::vector<unsigned char> hard;
+    EXPECT_EQ(capture([&] { decoder.decode(randomSoft(3 * 128 + 12, 3), hard, 2); }).out, "");
+}
+
 TEST(ParallelDecoder, TracesTheThreadCountOfASizeItRefuses) {
     Decoder decoder("MOD", false, 4U, 4U);
     decoder.setVerbosity(9);

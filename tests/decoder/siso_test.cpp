@@ -111,6 +111,19 @@ TEST(Siso, IntrinsicIsHalfOfChannelAndMaskedHalfExtrinsicInThePassesOrder) {
     }
 }
 
+TEST(Siso, BranchMetricsEndWithTheBlock) {
+    Decoder decoder("MOD", false);
+    ASSERT_TRUE(decoder.extract(randomSoft(3 * 40 + 12, 5)));
+    T8* const behind = decoder.itsGamma + decoder.itsBlockSize;
+    for (const unsigned siso : {0U, 1U}) {
+        behind[-1] = behind[0] = behind[1] = T8{{1, 2, 3, 4, 5, 6, 7, 8}};
+        ASSERT_TRUE(decoder.calcIntrinsic(siso) && decoder.calcGamma(siso));
+        EXPECT_FALSE(compareT8(behind[-1], behind[0]));
+        EXPECT_TRUE(compareT8(behind[0], T8{{1, 2, 3, 4, 5, 6, 7, 8}}));
+        EXPECT_TRUE(compareT8(behind[0], behind[1]));
+    }
+}
+
 TEST(Siso, WithoutIterationsEveryDecisionIs1) {
     Decoder decoder("MOD", false);
     std::vector<unsigned char> hard = {7};

@@ -157,6 +157,15 @@ const std::vector<Change>& changes() {
          [](auto& state) { state.interleaver->itsPermutation = reversed(512); }},
         {"an inverse permutation of the block's size", 1,
          [](auto& state) { state.interleaver->itsInversePermutation = reversed(512); }},
+        {"an inverse permutation that ends otherwise", 1,
+         [](auto& state) {
+             TInterleaver& interleaver = *state.interleaver;
+             interleaver.itsInversePermutation.resize(512);
+             for (std::uint32_t i = 0; i < 512; ++i) {
+                 interleaver.itsInversePermutation[standard(512)[i]] = i;
+             }
+             std::swap(interleaver.itsInversePermutation[510], interleaver.itsInversePermutation[511]);
+         }},
         {"a permutation of another size", 1,
          [](auto& state) { state.interleaver->itsPermutation = reversed(40); }, true},
         {"an equal permutation", 1, [](auto& state) { state.interleaver->itsPermutation = standard(512); },
@@ -251,6 +260,11 @@ TEST(LaneHistory, ATraceShowsWhatLiteralDecodesWouldHaveLeftWhateverWasChangedSi
         {"engine", 2, [](auto& state) { newEngine(state, "MOD"); }},
         {"permutation", 2, [](auto& state) { state.interleaver->itsPermutation = reversed(1024); }},
         {"verbosity", 2, [](auto& state) { state.decoder->setVerbosity(9); }},
+        {"a block that the decoder was given", 2,
+         [](auto& state) {
+             std::vector<unsigned char> decisions;
+             EXPECT_TRUE(state.decoder->decode(std::vector<short>(3 * 48 + 12, 320), decisions, 2));
+         }},
         {"implementation", 2, [](auto& state) { vardel_ip_quarzel_set_implementation(&state, "literal"); }},
     };
     for (const Change& change : later) {

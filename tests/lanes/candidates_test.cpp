@@ -2,6 +2,7 @@
 #include <gtest/gtest.h>
 
 #include <cstdlib>
+#include <numeric>
 #include <utility>
 
 #include "interleaver/interleaver_3gpplte.hpp"
@@ -56,11 +57,22 @@ TEST(LaneLayouts, WhatLanesCannotFollowIsRefused) {
     EXPECT_FALSE(decoder.add(schedule));
     schedule.permutation.resize(511);
     EXPECT_FALSE(decoder.add(schedule));
-    schedule.permutation.resize(6144);
-    schedule.segments = 128;
-    EXPECT_FALSE(decoder.add(schedule));
-    schedule.segments = 4;
-    EXPECT_FALSE(decoder.add(schedule));
+}
+
+TEST(LaneLayouts, SegmentsAreAtMost64AndWithTheirTailAtMost1024Steps) {
+    const auto isTaken = [](std::uint32_t K, std::uint32_t segments) {
+        LaneSchedule schedule;
+        schedule.permutation.resize(K);
+        std::iota(schedule.permutation.begin(), schedule.permutation.end(), 0U);
+        schedule.segments = segments;
+        schedule.windowLength = {static_cast<std::uint16_t>(K / segments)};
+        return LaneDecoder(1, lanes::bestCandidate()).add(schedule);
+    };
+    EXPECT_TRUE(isTaken(6144, 64));
+    EXPECT_FALSE(isTaken(6144, 128));
+    EXPECT_TRUE(isTaken(1020, 1));
+    EXPECT_FALSE(isTaken(1021, 1));
+    EXPECT_FALSE(isTaken(6144, 4));
 }
 
 TEST(LaneCandidates, AModelStartsOutWithLanes) {
