@@ -438,7 +438,7 @@ VARDEL_IP_QUARZEL_API int vardel_ip_quarzel_get_block_size(int index, vardel_ip_
  *
  * @param K            a block size
  * @param permutation  receives K entries: the natural position that is read at each interleaved one
- * @return             0; or 1, with nothing written, when there is no such block size
+ * @return             0; or 1, with nothing written, when there is no such block size or not enough memory
  */
 VARDEL_IP_QUARZEL_API int vardel_ip_quarzel_get_permutation(unsigned int K, unsigned int* permutation);
 

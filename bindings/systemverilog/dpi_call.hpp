@@ -40,12 +40,13 @@ int decodeBlock(DpiCore& core, const bindings::ArrayBlocks& block, std::uint32_t
 
 /// Decode a block that lies in three arrays.
 /// @param positions  of the block; checked before an array is read
+/// @param stride     from a value to the next one of its stream
 /// @return K
 template <SoftValue Value>
 int decodeStreams(DpiCore& core, std::array<const Value*, 3> streams, std::size_t positions, int iterations,
-                  unsigned tag) {
+                  unsigned tag, std::ptrdiff_t stride = 1) {
     const std::uint32_t K = bindings::blockSizeOf(positions);
-    const SoftBlocks<Value> block{streams[0], streams[1], streams[2], 1, positions, 0};
+    const SoftBlocks<Value> block{streams[0], streams[1], streams[2], 1, positions, 0, stride};
     return decodeBlock(core, block, K, iterations, tag);
 }
 

@@ -29,9 +29,14 @@ Registry& registry() {
 }  // namespace
 
 bool DpiCore::take(bindings::Outcome&& outcome) {
-    warnings.insert(warnings.end(), std::make_move_iterator(outcome.warnings.begin()),
-                    std::make_move_iterator(outcome.warnings.end()));
-    error = outcome.done() ? "" : outcome.message();
+    try {
+        warnings.insert(warnings.end(), std::make_move_iterator(outcome.warnings.begin()),
+                        std::make_move_iterator(outcome.warnings.end()));
+        error = outcome.done() ? "" : outcome.message();
+    } catch (const std::bad_alloc&) {
+        outcome.fault = bindings::Fault::memory;
+        error = outcome.message();
+    }
     return outcome.done();
 }
 

@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: MIT
 #pragma once
 
+#include <array>
 #include <cstdint>
 #include <deque>
 #include <memory>
@@ -14,17 +15,20 @@ namespace quarzel::dpi {
 /// A model as a simulation uses it, with what the simulation pushes into it and has not popped yet.
 struct DpiCore {
     bindings::HostCore core;
-    std::vector<std::int32_t> soft[3];      ///< pushed values of the next block
-    std::vector<std::uint8_t> bits;         ///< decisions of the last block
-    std::size_t popped = 0;                 ///< how many of them have been popped
-    std::vector<std::uint8_t> information;  ///< pushed bits of the next block to encode
-    std::vector<std::uint8_t> code;         ///< code bits of the last encoded block, stream by stream
-    std::uint32_t tag = 0;                  ///< of the last decoded block
-    std::uint32_t tracePasses = 0;          ///< to trace of the next block
+    std::vector<std::array<std::int32_t, 3>> soft;  ///< pushed positions of the next block
+    std::vector<std::uint8_t> bits;                 ///< decisions of the last block
+    std::size_t popped = 0;                         ///< how many of them have been popped
+    std::vector<std::uint8_t> information;          ///< pushed bits of the next block to encode
+    std::vector<std::uint8_t> code;                 ///< code bits of the last encoded block, stream by stream
+    std::uint32_t tag = 0;                          ///< of the last decoded block
+    std::uint32_t tracePasses = 0;                  ///< to trace of the next block
     std::string traceFile;
     std::deque<std::string> warnings;  ///< not handed over yet
     std::string warning;               ///< handed over last
     std::string error;                 ///< of the last call; empty when it was good
+
+    /// With room for the error that memory has run out.
+    DpiCore() { error.reserve(100); }
 
     /// Keep what a call says.
     /// @return whether it was good

@@ -65,9 +65,7 @@ extern "C" const char* quarzel_dpi_next_warning(void* handle) {
 
 extern "C" void quarzel_dpi_push(void* handle, int systematic, int parity1, int parity2) {
     withCore(handle, [&](DpiCore& core) {
-        core.soft[0].push_back(systematic);
-        core.soft[1].push_back(parity1);
-        core.soft[2].push_back(parity2);
+        core.soft.push_back({systematic, parity1, parity2});
         return 0;
     });
 }
@@ -75,12 +73,11 @@ extern "C" void quarzel_dpi_push(void* handle, int systematic, int parity1, int 
 extern "C" int quarzel_dpi_run(void* handle, int iterations, unsigned tag) {
     return withCore(handle, [&](DpiCore& core) {
         // What was pushed is used up, whatever comes of it: the next block starts afresh.
-        std::array<std::vector<std::int32_t>, 3> soft;
-        for (std::size_t stream = 0; stream < soft.size(); ++stream) {
-            soft[stream].swap(core.soft[stream]);
-        }
-        const std::array<const std::int32_t*, 3> streams = {soft[0].data(), soft[1].data(), soft[2].data()};
-        return decodeStreams(core, streams, soft[0].size(), iterations, tag);
+        const std::vector<std::array<std::int32_t, 3>> soft = std::exchange(core.soft, {});
+        const std::array<std::int32_t, 3> none{};
+        const std::array<std::int32_t, 3>& first = soft.empty() ? none : soft.front();
+        return decodeStreams<std::int32_t>(core, {&first[0], &first[1], &first[2]}, soft.size(), iterations,
+                                           tag, 3);
     });
 }
 

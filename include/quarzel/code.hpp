@@ -64,10 +64,14 @@ inline std::optional<BlockSize> findBlockSize(std::uint64_t K) {
 
 /// The natural position that is read at each interleaved one.
 /// @throws std::invalid_argument when there is no block size K
+/// @throws std::bad_alloc when there is no memory
 inline std::vector<unsigned> permutation(std::uint32_t K) {
-    std::vector<unsigned> table(findBlockSize(K) ? K : 0);
-    if (vardel_ip_quarzel_get_permutation(K, table.data()) != 0) {
+    if (!findBlockSize(K)) {
         throw std::invalid_argument("there is no block size of " + std::to_string(K) + " bits");
+    }
+    std::vector<unsigned> table(K);
+    if (vardel_ip_quarzel_get_permutation(K, table.data()) != 0) {
+        throw std::bad_alloc();
     }
     return table;
 }

@@ -177,7 +177,7 @@ end
 %!error <no option 'unit'; choose from units, algorithm> quarzel_decode (soft{:}, 6, 'unit', 2)
 %!error <units must be a whole number> quarzel_decode (soft{:}, 6, 'units', '8')
 %!error <trace_file must be the name of a file> quarzel_decode (soft{:}, 6, 'trace_file', 8)
-%!error <nowhere/trace cannot be written: .*; choose another trace_file> ...
+%!error <nowhere/trace cannot be written: .*; choose another file for the trace> ...
 %! quarzel_decode (soft{1}(:,1), soft{2}(:,1), soft{3}(:,1), 1, 'trace_file', '/nowhere/trace')
 %!error <6 tags for 7 blocks|one tag a block> quarzel_decode (soft{:}, 6, struct ('tags', 1:6))
 %!error <tags must be whole numbers> quarzel_decode (soft{:}, 6, struct ('tags', -1))

@@ -7,16 +7,14 @@
 //   [problem, ...] = quarzel_mex(...)                                           as lte_calls.cpp has them
 //
 // It never raises an error, which would leave C++ by a jump. `problem` is empty, or a struct: `fault` names
-// what went wrong, `text` says it, `warnings` are the model's. The functions that users call raise them.
+// what went wrong, `text` says it, `warnings` are the model's. The functions that users call raise them. Only
+// where memory is missing for the struct itself an exception leaves the call, of which Octave makes an error.
 #include <mex.h>
 
 #include <algorithm>
 #include <array>
-#include <cerrno>
 #include <csignal>
 #include <cstdint>
-#include <cstdio>
-#include <cstring>
 #include <span>
 #include <string>
 #include <vector>
@@ -24,6 +22,7 @@
 #include "common/encoding.hpp"
 #include "common/host_core.hpp"
 #include "common/quantising.hpp"
+#include "common/trace_file.hpp"
 #include "core_shelf.hpp"
 #include "decode_options.hpp"
 #include "lte_calls.hpp"
@@ -68,18 +67,6 @@ bool isInterrupted() {
     return &octave_signal_caught != nullptr && octave_signal_caught != 0;
 }
 
-void writeFile(const std::string& name, const std::string& text) {
-    std::FILE* const file = std::fopen(name.c_str(), "w");
-    if (file == nullptr) {
-        throw BindingError(Fault::value, name + " cannot be written: " + std::strerror(errno) +
-                                             "; choose another trace_file");
-    }
-    const std::size_t count = std::fwrite(text.data(), 1, text.size(), file);
-    if (std::fclose(file) != 0 || count != text.size()) {
-        throw BindingError(Fault::value, name + " cannot be written whole; free some space");
-    }
-}
-
 CoreShelf& shelf() {
     static CoreShelf cores;
     return cores;
@@ -116,7 +103,7 @@ void decode(Results& results, Arguments arguments, std::vector<std::string>& war
     warnings.swap(outcome.warnings);
     requireDone(outcome);
     if (!options.traceFile.empty()) {
-        writeFile(options.traceFile, outcome.trace);
+        quarzel::bindings::writeTrace(options.traceFile, outcome.trace);
     }
     results[2] = mxCreateNumericMatrix(1, static_cast<mwSize>(tags.size()), mxUINT32_CLASS, mxREAL);
     std::copy(tags.begin(), tags.end(), static_cast<std::uint32_t*>(mxGetData(results[2])));
@@ -138,15 +125,12 @@ void encode(Results& results, const mxArray* bits) {
 /// @return  false when there is none of that name
 bool runLte(Results& results, const std::string& command, Arguments arguments) {
     std::vector<mxArray*> given;
-    const bool isKnown = quarzel::octave::runLte(
-        command, arguments, given,
-        {[](const auto& settings) -> auto& { return shelf().take(settings);
-}
-, isInterrupted
-}  // namespace
-);
-std::copy(given.begin(), given.end(), results.begin() + 1);
-return isKnown;
+    const auto takeCore = [](const auto& settings) -> auto& {
+        return shelf().take(settings);
+    };
+    const bool isKnown = quarzel::octave::runLte(command, arguments, given, {takeCore, isInterrupted});
+    std::copy(given.begin(), given.end(), results.begin() + 1);
+    return isKnown;
 }
 
 /// Soft values of real numbers, in an array of their shape.
@@ -183,7 +167,7 @@ mxArray* problemOf(const Outcome& outcome, const std::vector<std::string>& warni
     return problem;
 }
 
-Results run(Arguments arguments) noexcept {
+Results run(Arguments arguments) {
     Results results{};
     std::vector<std::string> warnings;
     const Outcome outcome = guarded([&] {

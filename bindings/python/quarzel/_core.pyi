@@ -11,32 +11,29 @@ algorithms: tuple[Algorithm, ...]
 
 class ModelWarning(UserWarning): ...
 
-class Core:
-    def __init__(self, units: int, algorithm: int, tag_width: int, implementation: str) -> None: ...
-    @property
-    def implementation(self) -> str: ...
-    def decode(
-        self,
-        systematic: NDArray[Any],
-        parity1: NDArray[Any],
-        parity2: NDArray[Any],
-        iterations: int,
-        tags: Optional[NDArray[np.uint32]],
-        every_iteration: bool,
-    ) -> tuple[NDArray[np.uint8], NDArray[np.uint32]]: ...
-    def decode_plain(
-        self, systematic: object, parity1: object, parity2: object, iterations: object
-    ) -> Optional[NDArray[np.uint8]]: ...
-    def trace(
-        self,
-        systematic: NDArray[Any],
-        parity1: NDArray[Any],
-        parity2: NDArray[Any],
-        iterations: int,
-        passes: int,
-    ) -> tuple[NDArray[np.uint8], int, NDArray[np.int16], dict[str, NDArray[np.int16]]]: ...
-    def close(self) -> None: ...
-
+def open_core(units: int, algorithm: int, tag_width: int, implementation: str) -> object: ...
+def implementation(core: object) -> str: ...
+def decode(
+    core: object,
+    systematic: NDArray[Any],
+    parity1: NDArray[Any],
+    parity2: NDArray[Any],
+    iterations: int,
+    tags: Optional[NDArray[np.uint32]],
+    every_iteration: bool,
+) -> tuple[NDArray[np.uint8], NDArray[np.uint32]]: ...
+def decode_plain(
+    core: object, systematic: object, parity1: object, parity2: object, iterations: object
+) -> Optional[NDArray[np.uint8]]: ...
+def trace(
+    core: object,
+    systematic: NDArray[Any],
+    parity1: NDArray[Any],
+    parity2: NDArray[Any],
+    iterations: int,
+    passes: int,
+) -> tuple[NDArray[np.uint8], int, NDArray[np.int16], dict[str, NDArray[np.int16]]]: ...
+def close_core(core: object) -> None: ...
 def implementations() -> list[str]: ...
 def encode(bits: NDArray[np.uint8]) -> NDArray[np.uint8]: ...
 
@@ -73,7 +70,7 @@ def encode_transport_block(
 ) -> NDArray[np.uint8]: ...
 def soft_values(A: int) -> int: ...
 def decode_transport_block(
-    core: Core,
+    core: object,
     soft: NDArray[np.int16],
     A: int,
     scheme: str,

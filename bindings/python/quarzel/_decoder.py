@@ -71,8 +71,7 @@ class Decoder:
                 f"there is no implementation {implementation!r}; leave it out for the fastest one, or choose one of {names}"
             )
         self._wanted = implementation
-        self._core = _core.Core(self._units, self._algorithm, self._tag_width, implementation or "")
-        self._decode_plain = self._core.decode_plain
+        self._core = _core.open_core(self._units, self._algorithm, self._tag_width, implementation or "")
 
     def __setattr__(self, name: str, value: object) -> None:
         if not name.startswith("_") and (type(self) is Decoder or hasattr(Decoder, name)):
@@ -103,7 +102,7 @@ class Decoder:
     @property
     def implementation(self) -> str:
         """The name of the implementation that decodes. Traced blocks are always decoded by ``"literal"``."""
-        return self._core.implementation
+        return _core.implementation(self._core)
 
     @overload
     def decode(
@@ -161,13 +160,13 @@ class Decoder:
         """
         if tags is None and not packed:
             # One block costs so little that the checks below would take half of the time.
-            plain = self._decode_plain(systematic, parity1, parity2, iterations)
+            plain = _core.decode_plain(self._core, systematic, parity1, parity2, iterations)
             if plain is not None:
                 return plain
         blocks = soft_blocks(systematic, parity1, parity2)
         tag_array = None if tags is None else _tag_array(tags, blocks.shape)
         count = whole("iterations", iterations, 1, MAX_ITERATIONS)
-        bits, tags_back = self._core.decode(*blocks.streams, count, tag_array, False)
+        bits, tags_back = _core.decode(self._core, *blocks.streams, count, tag_array, False)
         if packed:
             bits = np.packbits(bits, axis=-1)
         bits = bits.reshape(*blocks.shape, bits.shape[-1])
@@ -189,7 +188,7 @@ class Decoder:
         """
         blocks = soft_blocks(systematic, parity1, parity2)
         count = whole("iterations", iterations, 1, MAX_ITERATIONS)
-        bits, _ = self._core.decode(*blocks.streams, count, None, True)
+        bits, _ = _core.decode(self._core, *blocks.streams, count, None, True)
         return bits.reshape(*blocks.shape, *bits.shape[1:])
 
     def trace(
@@ -214,7 +213,7 @@ class Decoder:
             raise ValueError(f"a trace shows one block, not blocks of shape {blocks.shape}; pick one of them")
         all_passes = 2 * whole("iterations", iterations, 1, MAX_ITERATIONS)
         count = all_passes if passes is None else min(whole("passes", passes, 1), all_passes)
-        bits, block, inputs, signals = self._core.trace(*blocks.streams, all_passes // 2, count)
+        bits, block, inputs, signals = _core.trace(self._core, *blocks.streams, all_passes // 2, count)
         return trace_of_arrays(block, inputs, signals, bits[0])
 
     def close(self) -> None:
@@ -227,7 +226,7 @@ class Decoder:
             ...
         ValueError: the decoder has been closed; make a new one
         """
-        self._core.close()
+        _core.close_core(self._core)
 
     def __enter__(self) -> Decoder:
         return self

@@ -84,7 +84,7 @@ def decode_transport_block(
         raise ValueError(f"transport blocks of A = {A} bits have soft buffers of {size} values, not {sums.shape[-1]}")
     settings = (choice("units", units, (2, 4, 8)), algorithm_number(algorithm))
     iterations = whole("iterations", iterations, 1, MAX_ITERATIONS)
-    core = _core.Core(*settings, 0, "")
+    core = _core.open_core(*settings, 0, "")
     bits, ok = _core.decode_transport_block(
         core, rows_of(array), A, *_transmission(scheme, layers, rv), iterations, sums
     )

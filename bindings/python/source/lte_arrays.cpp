@@ -13,6 +13,7 @@
 #include "common/lte_coding.hpp"
 #include "common/lte_modulation.hpp"
 #include "common/lte_transport.hpp"
+#include "core_capsule.hpp"
 #include "decode_arrays.hpp"
 #include "link/coding/coded_sizes.hpp"
 #include "link/modulation/demodulation.hpp"
@@ -228,7 +229,7 @@ void addLte(py::module_& module) {
     module.def("encode_transport_block", &encodeTransportBlocks, py::arg("bits"), py::arg("G"),
                py::arg("scheme"), py::arg("layers"), py::arg("rv"));
     module.def("soft_values", &softValues, py::arg("A"));
-    module.def("decode_transport_block", &decodeTransportBlocks, py::arg("core"), py::arg("soft"),
+    module.def("decode_transport_block", onCore(&decodeTransportBlocks), py::arg("core"), py::arg("soft"),
                py::arg("A"), py::arg("scheme"), py::arg("layers"), py::arg("rv"), py::arg("iterations"),
                py::arg("buffers").noconvert());
 }

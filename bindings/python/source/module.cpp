@@ -3,14 +3,13 @@
 #include <pybind11/stl.h>
 
 #include <algorithm>
-#include <memory>
 #include <string>
 #include <tuple>
 #include <vector>
 
 #include "common/encoding.hpp"
-#include "common/host_core.hpp"
 #include "common/quantising.hpp"
+#include "core_capsule.hpp"
 #include "decode_arrays.hpp"
 #include "lte_arrays.hpp"
 #include "plain_decode.hpp"
@@ -24,11 +23,12 @@ namespace {
 using namespace quarzel::python;
 using quarzel::bindings::HostCore;
 
-std::unique_ptr<HostCore> makeCore(int units, int algorithm, int tagWidth,
-                                   const std::string& implementation) {
-    auto core = std::make_unique<HostCore>();
-    raise(core->open({units, algorithm, tagWidth}, implementation));
-    return core;
+std::string implementationOf(HostCore& core) {
+    return core.implementation();
+}
+
+void closeCore(HostCore& core) {
+    raise(core.close());
 }
 
 Bytes encode(const Bytes& bits) {
@@ -101,17 +101,16 @@ PYBIND11_MODULE(_core, module) {
     module.attr("version") = vardel_ip_quarzel_version();
     module.attr("algorithms") = py::tuple(py::cast(quarzel::algorithmNames));
     addWarning(module);
-    py::class_<HostCore>(module, "Core")
-        .def(py::init(&makeCore), py::arg("units"), py::arg("algorithm"), py::arg("tag_width"),
-             py::arg("implementation"))
-        .def_property_readonly("implementation", &HostCore::implementation)
-        .def("decode", &decodeArrays, py::arg("systematic"), py::arg("parity1"), py::arg("parity2"),
-             py::arg("iterations"), py::arg("tags"), py::arg("every_iteration"))
-        .def("decode_plain", &decodePlain, py::arg("systematic"), py::arg("parity1"), py::arg("parity2"),
-             py::arg("iterations"))
-        .def("trace", &traceArrays, py::arg("systematic"), py::arg("parity1"), py::arg("parity2"),
-             py::arg("iterations"), py::arg("passes"))
-        .def("close", [](HostCore& core) { raise(core.close()); });
+    module.def("open_core", &openCore, py::arg("units"), py::arg("algorithm"), py::arg("tag_width"),
+               py::arg("implementation"));
+    module.def("implementation", onCore(&implementationOf), py::arg("core"));
+    module.def("decode", onCore(&decodeArrays), py::arg("core"), py::arg("systematic"), py::arg("parity1"),
+               py::arg("parity2"), py::arg("iterations"), py::arg("tags"), py::arg("every_iteration"));
+    module.def("decode_plain", onCore(&decodePlain), py::arg("core"), py::arg("systematic"),
+               py::arg("parity1"), py::arg("parity2"), py::arg("iterations"));
+    module.def("trace", onCore(&traceArrays), py::arg("core"), py::arg("systematic"), py::arg("parity1"),
+               py::arg("parity2"), py::arg("iterations"), py::arg("passes"));
+    module.def("close_core", onCore(&closeCore), py::arg("core"));
     module.def("implementations", &quarzel::implementations);
     module.def("encode", &encode, py::arg("bits"));
     module.attr("llr_scale") = quarzel::llrScale;

@@ -4,8 +4,11 @@
 #include <dlfcn.h>
 #include <gtest/gtest.h>
 #include <svdpi.h>
+#include <unistd.h>
 
 #include <array>
+#include <cstdio>
+#include <cstdlib>
 #include <random>
 #include <string>
 #include <vector>
@@ -151,6 +154,63 @@ TEST_F(DpiLibrary, RefusesAHandleThatItHasNotGiven) {
     EXPECT_STREQ(
         function<const char*(void*)>("quarzel_dpi_error")(stranger),
         "the decoder has been closed, or made in another process before a checkpoint; make a new one");
+}
+
+/// Each allocation of a block that is pushed, decoded and traced fails, by itself and with all that follow
+/// it: the call that misses it says so, and a block that is pushed anew is decoded, and traced when that was
+/// asked for before.
+TEST_F(DpiLibrary, TellsOfEachAllocationThatFailsAndGoesOn) {
+    const auto push = function<void(void*, int, int, int)>("quarzel_dpi_push");
+    const auto run = function<int(void*, int, unsigned)>("quarzel_dpi_run");
+    const auto traceNext = function<int(void*, int, const char*)>("quarzel_dpi_trace_next");
+    const std::string trace = testing::TempDir() + "dpi_trace_" + std::to_string(getpid());
+    const std::string mark = trace + ".failed";
+    const std::string lack = "there is not enough memory; decode fewer blocks in one call";
+    setenv("QUARZEL_FAILED", mark.c_str(), 1);
+    setenv("QUARZEL_FAILING_IN", "quarzel_dpi", 1);
+    const auto decode = [&] {
+        bool isPushed = true;
+        for (std::size_t i = 0; i < positions; ++i) {
+            const auto value = [&](std::size_t stream) {
+                return static_cast<int>(static_cast<signed char>(itsLogic.at(stream).at(i).aval));
+            };
+            push(itsHandle, value(0), value(1), value(2));
+            isPushed = isPushed && error().empty();
+        }
+        const int result = run(itsHandle, 6, 0);
+        EXPECT_EQ(result == K, error().empty());
+        EXPECT_TRUE(result == K || !isPushed || error() == lack) << error();
+        return result == K;
+    };
+    ASSERT_EQ(decodeLogic(), K);
+    const auto expectDecisions = [&] {
+        for (std::size_t i = 0; i < K; ++i) {
+            ASSERT_EQ(function<int(void*)>("quarzel_dpi_pop")(itsHandle), itsLogicBits.at(i)) << i;
+        }
+    };
+    int failures = 0;
+    for (const std::string more : {"", "+"}) {
+        for (int number = 1;; ++number) {
+            SCOPED_TRACE(std::to_string(number) + more);
+            ASSERT_EQ(traceNext(itsHandle, 2, trace.c_str()), 0);
+            setenv("QUARZEL_FAILING", ("malloc " + std::to_string(number) + more).c_str(), 1);
+            const bool isDecoded = decode();
+            unsetenv("QUARZEL_FAILING");
+            const bool failed = std::remove(mark.c_str()) == 0;
+            failures += failed ? 1 : 0;
+            if (!isDecoded) {
+                EXPECT_NE(std::remove(trace.c_str()), 0);
+                ASSERT_TRUE(decode());
+            }
+            expectDecisions();
+            EXPECT_EQ(std::remove(trace.c_str()), 0);
+            if (!failed || HasFailure()) {
+                break;
+            }
+        }
+    }
+    EXPECT_GT(failures, 20);
+    unsetenv("QUARZEL_FAILING_IN");
 }
 
 }  // namespace

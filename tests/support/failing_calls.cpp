@@ -1,9 +1,12 @@
 // SPDX-License-Identifier: MIT
 // Calls of the system that fail when a test wants it, loaded before the C library: QUARZEL_FAILING names one
-// and the number of the call at which it fails, counted from 1, or from which on: "write 3" or "write 3+".
-// The file that QUARZEL_FAILED names is made then.
+// and the number of the call at which it fails, counted from 1 since it was set, or from which on: "write 3"
+// or "write 3+". The file that QUARZEL_FAILED names is made then. With QUARZEL_FAILING_IN, a part of the path
+// of a library, only calls from inside it count.
 #include <dlfcn.h>
+#include <execinfo.h>
 #include <fcntl.h>
+#include <link.h>
 #include <pthread.h>
 #include <spawn.h>
 #include <stdio.h>
@@ -11,25 +14,65 @@
 #include <sys/syscall.h>
 #include <unistd.h>
 
-#include <atomic>
+#include <array>
 #include <cerrno>
 #include <cstdarg>
 #include <cstdlib>
 #include <cstring>
+#include <mutex>
 
 namespace {
 
+/// Whether a function of the library is being called whose path has this part.
+bool isInside(const char* part) {
+    std::array<void*, 50> frames{};
+    const int depth = ::backtrace(frames.data(), static_cast<int>(frames.size()));
+    for (int i = 0; i < depth; ++i) {
+        dl_find_object object{};
+        if (::_dl_find_object(frames.at(static_cast<std::size_t>(i)), &object) == 0 &&
+            std::strstr(object.dlfo_link_map->l_name, part) != nullptr) {
+            return true;
+        }
+    }
+    return false;
+}
+
+/// Count a call.
+/// @param wanted  the value of QUARZEL_FAILING
+/// @return        its number, from 1 after every change of the value
+long count(const char* wanted) {
+    static std::mutex mutex;
+    static std::array<char, 64> last{};
+    static long calls = 0;
+    const std::lock_guard lock(mutex);
+    if (std::strcmp(last.data(), wanted) != 0) {
+        std::strncpy(last.data(), wanted, last.size() - 1);
+        calls = 0;
+    }
+    return ++calls;
+}
+
 /// Whether this call of a function has to fail.
 bool fails(const char* name) {
-    const char* wanted = std::getenv("QUARZEL_FAILING");
+    const char* const wanted = std::getenv("QUARZEL_FAILING");
     const std::size_t size = std::strlen(name);
     if (wanted == nullptr || std::strncmp(wanted, name, size) != 0 || wanted[size] != ' ') {
         return false;
     }
-    static std::atomic<long> calls = 0;
+    static thread_local bool isAsking = false;  // whoever looks at the calls may call itself
+    if (isAsking) {
+        return false;
+    }
+    isAsking = true;
+    const char* const part = std::getenv("QUARZEL_FAILING_IN");
+    const bool counts = part == nullptr || isInside(part);
+    isAsking = false;
+    if (!counts) {
+        return false;
+    }
     char* end = nullptr;
     const long first = std::strtol(wanted + size, &end, 10);
-    const long call = ++calls;
+    const long call = count(wanted);
     if (call != first && (call < first || *end != '+')) {
         return false;
     }
@@ -103,4 +146,14 @@ extern "C" int close(int file) {
         return -1;
     }
     return static_cast<int>(result);
+}
+
+// The C library's own, as to look for the next one takes memory.
+extern "C" void* __libc_malloc(size_t size);
+extern "C" void* malloc(size_t size) {
+    if (fails("malloc")) {
+        errno = ENOMEM;
+        return nullptr;
+    }
+    return __libc_malloc(size);
 }
