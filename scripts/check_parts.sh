@@ -25,10 +25,15 @@ run_parts() {
         rm -f "$folder/$part.passed"
         echo "$part (log in $folder/$part.log)"
         begin=$SECONDS
-        # In a shell of its own, which ends at the first command that fails.
-        (set -e; "part_$part") >"$folder/$part.log" 2>&1 &
+        # In a shell of its own, which ends at the first command that fails, and with all that it has started when this
+        # run is stopped.
+        set -m
+        (set -e; "part_$part") >"$folder/$part.log" 2>&1 </dev/null &
+        set +m
+        trap "kill -- -$!; exit 130" HUP INT TERM
         status=0
         wait $! || status=$?
+        trap - HUP INT TERM
         if [ $status -eq 0 ]; then
             echo "$state" >"$folder/$part.passed"
             summary+=("$(printf '%-24s passed %6d s' "$part" $((SECONDS - begin)))")
