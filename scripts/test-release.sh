@@ -11,9 +11,10 @@ product=--gtest_filter=-*WrittenAnew*
 
 part_test() { make test; }
 part_long() { scripts/test-long.sh; }
+# Without AVX2, without AVX, and without SSSE3 and SSE4.1.
 part_old_processors() {
     scripts/build.sh release
-    for processor in Nehalem core2duo; do
+    for processor in IvyBridge Nehalem Opteron_G1; do
         QUARZEL_TEST_EXHAUSTIVE=1 qemu-x86_64 -cpu $processor \
             build/release/tests/frozen/frozen_decisions_test --gtest_brief=1 $product
     done

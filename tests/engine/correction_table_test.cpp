@@ -67,6 +67,7 @@ TEST(CorrectionTable, EntriesStayWithinTheLimitsOfTheFormat) {
     format.minQ = 1;
     format.min = 3 << 4;
     EXPECT_EQ(entry(accepted(16, format), 32767), 3 << 4);
+    EXPECT_EQ(entry(accepted(16, format), 20 << 4), 1 << 4);
 }
 
 TEST(CorrectionTable, EqualsTheStoredTables) {

@@ -63,7 +63,7 @@ class AllocationFailure : public testing::TestWithParam<std::tuple<int, int>> {
         Lines lines;
         std::vector<unsigned char> right(blocks * K, 2);
         std::vector<unsigned char> bits(blocks * K);
-        std::vector<int> statuses(blocks);
+        std::vector<int> statuses(blocks + 1);
         ASSERT_EQ(decode(make(lines).get(), right.data(), statuses.data()), 0);
         ASSERT_EQ(std::count(right.begin(), right.end(), 2), 0);
         int refused = 0;
@@ -71,7 +71,9 @@ class AllocationFailure : public testing::TestWithParam<std::tuple<int, int>> {
             const std::size_t room = failedAllocations();
             lines = {};
             std::fill(bits.begin(), bits.end(), static_cast<unsigned char>(2));
-            std::fill(statuses.begin(), statuses.end(), -77);
+            std::fill(statuses.begin(), statuses.end() - 1, -77);
+            // A block more, that must not be taken for one that is not decided on yet.
+            statuses.back() = -1;
             const State state = make(lines);
             if (state == nullptr) {
                 EXPECT_EQ(lines.unhandled + lines.others, 1);
@@ -81,6 +83,7 @@ class AllocationFailure : public testing::TestWithParam<std::tuple<int, int>> {
             const int result = decode(state.get(), bits.data(), statuses.data());
             EXPECT_EQ(lines.others, 0);
             EXPECT_EQ(lines.unhandled, std::count(statuses.begin(), statuses.end(), 99));
+            EXPECT_EQ(statuses.back(), -1);
             for (std::size_t block = 0; block < blocks; ++block) {
                 EXPECT_TRUE(statuses[block] == 0 || statuses[block] == 99) << statuses[block];
                 const auto first = static_cast<std::ptrdiff_t>(block * K);

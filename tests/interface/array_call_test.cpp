@@ -169,6 +169,17 @@ TEST(ArrayCall, IsTheBatchCallForEveryTypeOfValueAndOrderInMemory) {
     compare<std::int32_t>(random, INT32_MIN, INT32_MAX);
 }
 
+TEST(ArrayCall, WithoutTagsEveryBlockHasTheTag0) {
+    const std::vector<signed char> soft(3 * 44, 8);
+    std::vector<unsigned char> bits(40);
+    unsigned tag = 777;
+    const vardel_ip_quarzel_array_inputs inputs{
+        soft.data(), soft.data() + 44, soft.data() + 88, 132, 1, VARDEL_IP_QUARZEL_INT8, 44, 1, 1, nullptr};
+    const vardel_ip_quarzel_array_outputs outputs{bits.data(), 40, 0, &tag};
+    EXPECT_EQ(vardel_ip_quarzel_bitacc_simulate_array(makeState().get(), &outputs, &inputs, nullptr), 0);
+    EXPECT_EQ(tag, 0U);
+}
+
 TEST(ArrayCall, GivesAfterEachIterationWhatADecodeOfSoManyGives) {
     std::mt19937 random = seededRandom();
     for (const char* implementation : {"best", "literal"}) {

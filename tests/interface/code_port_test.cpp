@@ -1,4 +1,5 @@
 // SPDX-License-Identifier: MIT
+#include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
 #include <cmath>
@@ -96,6 +97,7 @@ TEST(CodePort, GivesTheCorrectionsOfMaxStar) {
 
 TEST(CodePort, NamesTheSignalsInTheOrderOfTheTraceColumns) {
     std::size_t column = 0;
+    std::vector<std::string> descriptions;
     for (const Signal& signal : signals()) {
         for (unsigned value = 0; value < signal.width; ++value, ++column) {
             ASSERT_LT(column, traceColumns.size());
@@ -103,9 +105,12 @@ TEST(CodePort, NamesTheSignalsInTheOrderOfTheTraceColumns) {
             EXPECT_EQ(signal.width > 1 ? static_cast<int>(signal.first + value) : -1,
                       traceColumns[column].index);
         }
-        EXPECT_STRNE(signal.description, "");
+        descriptions.emplace_back(signal.description);
     }
     EXPECT_EQ(column, traceColumnCount);
+    EXPECT_THAT(descriptions,
+                testing::ElementsAre("intrinsic value", "forward metric", "backward metric", "branch metric",
+                                     "log-likelihood ratio", "extrinsic value"));
     Signal none;
     EXPECT_EQ(vardel_ip_quarzel_get_signal(-1, &none), 1);
 }

@@ -230,16 +230,18 @@ TEST(Implementation, LanesDecodeOnlyWhereNothingCanTell) {
     }
 }
 
-/// What a trace of K = 40 shows after larger blocks were decoded in lanes and something changed.
-Output traceAfter(bool literal, const std::function<void(vardel_ip_quarzel_state&)>& change) {
+/// What a trace shows after blocks of some sizes were decoded and something changed.
+/// @param K  of the block that is traced
+Output traceAfter(bool literal, const std::vector<std::size_t>& sizes,
+                  const std::function<void(vardel_ip_quarzel_state&)>& change, std::size_t K) {
     const State state = makeState(genericsOf(8, 8, 2));
     if (literal) {
         vardel_ip_quarzel_set_implementation(state.get(), "literal");
     }
     return capture([&] {
         std::mt19937 random(7);
-        for (const std::size_t K : {512U, 6144U, 40U, 1024U}) {
-            Block block(K + 4);
+        for (const std::size_t size : sizes) {
+            Block block(size + 4);
             for (std::vector<int>* stream : {&block.systematic, &block.parity1, &block.parity2}) {
                 for (int& value : *stream) {
                     value = static_cast<int>(random() % 256) - 128;
@@ -249,8 +251,13 @@ Output traceAfter(bool literal, const std::function<void(vardel_ip_quarzel_state
         }
         change(*state);
         vardel_ip_quarzel_bitacc_dump_config(state.get(), 2);
-        simulate(state.get(), Block(44, 3).inputs());
+        simulate(state.get(), Block(K + 4, 3).inputs());
     });
+}
+
+/// The same for a trace of K = 40 after larger blocks.
+Output traceAfter(bool literal, const std::function<void(vardel_ip_quarzel_state&)>& change) {
+    return traceAfter(literal, {512, 6144, 40, 1024}, change, 40);
 }
 
 TEST(LaneHistory, ATraceShowsWhatLiteralDecodesWouldHaveLeftWhateverWasChangedSince) {
@@ -275,6 +282,12 @@ TEST(LaneHistory, ATraceShowsWhatLiteralDecodesWouldHaveLeftWhateverWasChangedSi
         EXPECT_EQ(got.out, expected.out);
         EXPECT_EQ(got.err, expected.err);
     }
+}
+
+TEST(LaneHistory, ABlockHidesTheSmallerOnesBeforeIt) {
+    const auto nothing = [](auto&) {};
+    EXPECT_EQ(traceAfter(false, {2048, 512, 6144, 40}, nothing, 1056).out,
+              traceAfter(true, {2048, 512, 6144, 40}, nothing, 1056).out);
 }
 
 TEST(LaneHistory, AnotherDecoderHasNone) {

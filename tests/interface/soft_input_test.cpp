@@ -69,6 +69,19 @@ TEST(SoftInput, OtherFormatsAreRequantisedToTheStateFormat) {
     EXPECT_EQ(saturated, 0);
 }
 
+TEST(SoftInput, ALimitOfTheStateFormatIsForWhatLiesBeyondIt) {
+    TNumberFormat limited = stateFormat;
+    limited.minQ = -5;
+    limited.min = -7 * 16;
+    limited.maxQ = 5;
+    limited.max = 7 * 16;
+    int saturated = 0;
+    EXPECT_EQ(toSoftValue(-6, inputFormat, limited, saturated), -7 * 16);
+    EXPECT_EQ(toSoftValue(-5, inputFormat, limited, saturated), -5 * 16);
+    EXPECT_EQ(toSoftValue(5, inputFormat, limited, saturated), 5 * 16);
+    EXPECT_EQ(toSoftValue(6, inputFormat, limited, saturated), 7 * 16);
+}
+
 TEST(SoftInput, PositionsInterleaveTheThreeStreams) {
     const Block block({1, 2, 3}, {4, 5, 6}, {7, 8, 9}, 1, 0);
     std::vector<short> soft;

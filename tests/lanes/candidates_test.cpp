@@ -1,9 +1,16 @@
 // SPDX-License-Identifier: MIT
 #include <gtest/gtest.h>
 
+#include <algorithm>
 #include <cstdlib>
+#include <fstream>
+#include <iterator>
 #include <numeric>
+#include <set>
+#include <sstream>
+#include <string>
 #include <utility>
+#include <vector>
 
 #include "interleaver/interleaver_3gpplte.hpp"
 #include "lanes/lane_decode.hpp"
@@ -21,6 +28,28 @@ TEST(LaneCandidates, TheBestIsTheFirstThatTheMachineSupports) {
         EXPECT_STREQ(lanes::bestCandidate().name, expected);
     }
 }
+
+#if defined(__x86_64__) && defined(__linux__)
+TEST(LaneCandidates, AreSupportedWhereTheKernelTellsOfTheirInstructions) {
+    if (std::getenv("QUARZEL_TEST_BEST_CANDIDATE") != nullptr) {
+        GTEST_SKIP() << "an emulated processor is not the one that the kernel tells of";
+    }
+    std::ifstream file("/proc/cpuinfo");
+    std::string line;
+    while (std::getline(file, line) && !line.starts_with("flags")) {
+    }
+    std::istringstream words(line);
+    const std::set<std::string> flags{std::istream_iterator<std::string>(words), {}};
+    const std::vector<std::vector<std::string>> needed = {
+        {"avx512bw", "avx512vl", "avx512dq"}, {"avx2"}, {"sse4_1"}, {}};
+    ASSERT_EQ(lanes::candidates().end() - lanes::candidates().begin(), 4);
+    for (std::size_t i = 0; i < needed.size(); ++i) {
+        EXPECT_EQ(lanes::candidates().begin()[i].supported(),
+                  std::ranges::all_of(needed[i], [&](const auto& flag) { return flags.contains(flag); }))
+            << lanes::candidates().begin()[i].name;
+    }
+}
+#endif
 
 TEST(LaneCandidates, TheLastRunsEverywhere) {
     const lanes::Candidate& last = lanes::candidates().end()[-1];
