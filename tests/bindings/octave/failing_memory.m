@@ -1,6 +1,8 @@
 % SPDX-License-Identifier: MIT
 % Let each allocation inside the functions fail, by itself and with all that follow it: a call raises an error of memory
 % or does its work, and the next one is good. Ends with 1 when that is not so.
+randn ('state', 20261122);
+rand ('state', 20261122);
 soft = arrayfun (@(~) int8 (round (20 * randn (44, 3))), 1:3, 'UniformOutput', false);
 block = cellfun (@(x) x(:,1), soft, 'UniformOutput', false);
 bits = uint8 (rand (40, 2) > 0.5);
