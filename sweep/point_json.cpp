@@ -124,7 +124,9 @@ void requirePossible(const PointState& point, const Setup& setup) {
     const bool isPossible =
         point.blocks <= mostBlocks &&
         std::all_of(point.counts.begin(), point.counts.end(), [&](const ErrorCount& count) {
-            return count.blockErrors <= point.blocks && count.undetected <= count.blockErrors &&
+            const bool hasCrc = setup.sending.transportBlock != 0;
+            return count.blockErrors <= point.blocks &&
+                   count.undetected <= (hasCrc ? count.blockErrors : 0) &&
                    count.bitErrors <= point.blocks * setup.informationBits();
         });
     if (!isPossible) {

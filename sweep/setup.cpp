@@ -40,7 +40,8 @@ void requireLink(const Setup& setup) {
 }  // namespace
 
 std::uint32_t Setup::codedBits() const {
-    return sending.codedBits != 0 ? sending.codedBits : 3 * (blockSize + tailPositions);
+    constexpr auto tail = static_cast<std::uint32_t>(tailPositions);
+    return sending.codedBits != 0 ? sending.codedBits : 3 * (blockSize + tail);
 }
 
 void Setup::check() const {

@@ -109,6 +109,9 @@ TEST(HostileFile, MayHoldWhatNoSweepGives) {
     expectRefused("1e+300" + range, [](Json& point) { point["blocks"] = 1e300; });
     expectRefused("1e+300" + range, [](Json& point) { point["per_iteration"][0]["bit_errors"] = 1e300; });
     expectRefused(impossible, [](Json& point) { point["blocks"] = 0; });
+    expectRefused(impossible, [](Json& point) {  // the link has no CRC that could miss them
+        point["per_iteration"][0].update({{"block_errors", 1}, {"undetected_errors", 1}});
+    });
     expectRefused("an Eb/N0 is not a number of decibels", [](Json& point) { point["ebn0_db"] = 1e300; });
 }
 
