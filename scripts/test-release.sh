@@ -37,7 +37,8 @@ part_compilers() {
         for flags in -O0 -O2 -O3 '-O2 -flto'; do
             build=build/compilers/${compiler%,*}$(tr -d ' ' <<<"$flags")
             cmake -G Ninja -S . -B "$build" -DCMAKE_BUILD_TYPE=Release -DQUARZEL_HARDEN=OFF \
-                -DQUARZEL_LANES_LEVEL="${flags% *}" -DCMAKE_C_COMPILER="${compiler%,*}" -DCMAKE_CXX_COMPILER="${compiler#*,}" \
+                -DQUARZEL_LANES_LEVEL="${flags% *}" \
+                -DCMAKE_C_COMPILER="${compiler%,*}" -DCMAKE_CXX_COMPILER="${compiler#*,}" \
                 -DCMAKE_C_FLAGS_RELEASE="$flags -DNDEBUG" -DCMAKE_CXX_FLAGS_RELEASE="$flags -DNDEBUG"
             cmake --build "$build" --target frozen_decisions_test
             QUARZEL_TEST_EXHAUSTIVE=1 "$build/tests/frozen/frozen_decisions_test" --gtest_brief=1 $product

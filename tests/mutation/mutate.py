@@ -83,7 +83,8 @@ def copy_sources():
 
 def configure():
     options = ["-DCMAKE_BUILD_TYPE=Release", "-DCMAKE_C_COMPILER=clang", "-DCMAKE_CXX_COMPILER=clang++",
-               "-DCMAKE_CXX_FLAGS_RELEASE=-O1", "-DQUARZEL_LANES_LEVEL=-O1", "-DQUARZEL_TOOL=OFF", "-DQUARZEL_HARDEN=OFF", "-DQUARZEL_WERROR=OFF",
+               "-DCMAKE_CXX_FLAGS_RELEASE=-O1", "-DQUARZEL_LANES_LEVEL=-O1",
+               "-DQUARZEL_TOOL=OFF", "-DQUARZEL_HARDEN=OFF", "-DQUARZEL_WERROR=OFF",
                "-DCMAKE_GTEST_DISCOVER_TESTS_DISCOVERY_MODE=PRE_TEST"]
     if shutil.which("ld.lld"):
         options += ["-DCMAKE_EXE_LINKER_FLAGS=-fuse-ld=lld", "-DCMAKE_SHARED_LINKER_FLAGS=-fuse-ld=lld"]
