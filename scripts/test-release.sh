@@ -27,7 +27,7 @@ part_other_processors() {
         scripts/build.sh $processor
         ctest --preset $processor
         emulator=$(sed -n 's/^CMAKE_CROSSCOMPILING_EMULATOR:[^=]*=//p' build/$processor/CMakeCache.txt | tr ';' ' ')
-        QUARZEL_FROZEN_DECODER="$emulator build/$processor/tests/frozen/frozen_decoder" \
+        QUARZEL_TEST_EXHAUSTIVE=1 QUARZEL_FROZEN_DECODER="$emulator build/$processor/tests/frozen/frozen_decoder" \
             build/release/tests/frozen/frozen_decisions_test --gtest_filter='*AnotherProcessor*'
     done
 }

@@ -16,11 +16,13 @@ from . import lte
 from ._code import Segments, block_sizes, encode, qpp, segments
 from ._core import ModelWarning
 from ._core import version as __version__
+from ._curve import Curve, Point
 from ._decoder import Decoder, algorithms, implementations
 from ._figure import plot
 from ._mismatch import Mismatch
+from ._result import SweepResult
 from ._scoreboard import Scoreboard
-from ._simulation import Curve, Point, SweepResult, sweep
+from ._simulation import sweep
 from ._soft import quantise
 from ._trace import BlockTrace, read_trace
 from ._types import Algorithm, Units

@@ -6,8 +6,9 @@ from __future__ import annotations
 import dataclasses
 from typing import Iterable, Optional, Union
 
+from ._curve import Curve
 from ._link import sending_text
-from ._simulation import Curve, SweepResult
+from ._result import SweepResult
 
 Results = Union[SweepResult, Curve, Iterable[Union[SweepResult, Curve]]]
 
