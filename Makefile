@@ -4,7 +4,7 @@
 
 help:
 	@echo "make demo       install what is missing, build, and decode the captures that come with the project"
-	@echo "make test       install what is missing, build, and run every test, the library's with sanitizers, too"
+	@echo "make test       install what is missing, build, and run every test, the library's again under sanitizers"
 	@echo "make test-long  the checks that take an hour or two: the tool with sanitizers, 64-bit Arm, whole domains, proofs, Slurm, bindings without the tool, the analyser"
 	@echo "make test-release  the checks of a release, a night: both above, compilers, old processors, fuzzers"
 	@echo "make bench      build and run the benchmarks"

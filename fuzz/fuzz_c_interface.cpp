@@ -4,6 +4,7 @@
 #include <algorithm>
 #include <array>
 #include <climits>
+#include <cstdint>
 #include <cstring>
 
 #include "input_bytes.hpp"
@@ -48,18 +49,18 @@ class HostileCaller {
         }
     };
 
-    static void takeMessage(void* lines, int kind, const char* text) {
+    static void takeMessage(void* sum, int kind, const char* text) {
         fuzz::require(kind >= VARDEL_IP_QUARZEL_ERROR && kind <= VARDEL_IP_QUARZEL_TRACE,
                       "a line has a kind");
-        *static_cast<std::size_t*>(lines) += std::strlen(text);
+        *static_cast<std::int64_t*>(sum) += static_cast<std::int64_t>(std::strlen(text));
     }
 
     static void takePass(void* sum, const vardel_ip_quarzel_pass* pass) {
         for (std::size_t step = 0; step < pass->steps; ++step) {
-            *static_cast<std::size_t*>(sum) +=
-                static_cast<std::size_t>(pass->inputs[1][2][step] + pass->intrinsic[step] +
-                                         pass->alpha[8 * step + 7] + pass->beta[8 * step + 7] +
-                                         pass->gamma[4 * step + 3] + pass->llr[step] + pass->extrinsic[step]);
+            *static_cast<std::int64_t*>(sum) += pass->inputs[1][2][step] + pass->intrinsic[step] +
+                                                pass->alpha[8 * step + 7] + pass->beta[8 * step + 7] +
+                                                pass->gamma[4 * step + 3] + pass->llr[step] +
+                                                pass->extrinsic[step];
         }
     }
 
@@ -255,7 +256,7 @@ class HostileCaller {
     fuzz::InputBytes itsBytes;
     test::State itsState;
     bool itHasDecoder = true;
-    std::size_t itsSum = 0;  ///< of all that is told, so that it is read
+    std::int64_t itsSum = 0;  ///< of all that is told, so that it is read
 };
 
 }  // namespace

@@ -22,28 +22,27 @@ std::string frozenHeader();
 std::string frozenDigest(const std::vector<unsigned char>& decisions);
 
 /// A line of the file: the case and the digests of its decisions.
-/// @param decode  `decisions = decode(blocks)`: K bytes of 0 or 1 for each of the blocks, which have one
-///                number of iterations
+/// @param decode  `decisions = decode(blocks)`: K bytes of 0 or 1 for each of the blocks
 template <class Decode>
 std::string frozenLine(const FrozenCase& which, Decode&& decode) {
-    std::vector<Block> blocks;
+    std::vector<Block> inputs;
     for (std::size_t kind = 0; kind < frozenClassNames.size(); ++kind) {
-        blocks.push_back(frozenInput(which, static_cast<FrozenClass>(kind)));
+        inputs.push_back(frozenInput(which, static_cast<FrozenClass>(kind)));
     }
-    std::array<std::string, frozenClassNames.size()> digests;
+    std::vector<Block> blocks;
     for (const int iterations : frozenIterations) {
-        for (Block& block : blocks) {
+        for (Block& block : inputs) {
             block.iterations = iterations;
-        }
-        const std::vector<std::vector<unsigned char>> decisions = decode(blocks);
-        for (std::size_t kind = 0; kind < digests.size(); ++kind) {
-            digests[kind] += ',' + frozenDigest(decisions.at(kind));
+            blocks.push_back(block);
         }
     }
+    const std::vector<std::vector<unsigned char>> decisions = decode(blocks);
     std::string line =
         std::to_string(which.K) + ',' + std::to_string(which.units) + ',' + std::to_string(which.algorithm);
-    for (const std::string& text : digests) {
-        line += text;
+    for (std::size_t kind = 0; kind < inputs.size(); ++kind) {
+        for (std::size_t block = kind; block < blocks.size(); block += inputs.size()) {
+            line += ',' + frozenDigest(decisions.at(block));
+        }
     }
     return line;
 }

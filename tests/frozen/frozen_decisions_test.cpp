@@ -41,15 +41,16 @@ Decisions decodeElsewhere(const std::string& program, const FrozenCase& which,
     const std::string out = testing::TempDir() + "frozen_bits_" + std::to_string(getpid());
     std::ofstream soft(in, std::ios::binary);
     for (const Block& block : blocks) {
+        soft.put(static_cast<char>(block.iterations));
         for (const std::vector<int>* stream : {&block.systematic, &block.parity1, &block.parity2}) {
             std::transform(stream->begin(), stream->end(), std::ostreambuf_iterator<char>(soft),
                            [](int value) { return static_cast<char>(value); });
         }
     }
     soft.close();
-    const std::string command =
-        program + ' ' + std::to_string(which.units) + ' ' + std::to_string(which.algorithm) + ' ' +
-        std::to_string(blocks.front().iterations) + ' ' + std::to_string(which.K) + " <" + in + " >" + out;
+    const std::string command = program + ' ' + std::to_string(which.units) + ' ' +
+                                std::to_string(which.algorithm) + ' ' + std::to_string(which.K) + " <" + in +
+                                " >" + out;
     EXPECT_EQ(std::system(command.c_str()), 0) << command;
     std::ifstream bits(out, std::ios::binary);
     Decisions decisions(blocks.size(), std::vector<unsigned char>(which.K, 0xEE));
