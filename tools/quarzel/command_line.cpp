@@ -20,6 +20,7 @@
 #include "sweeps/merge_command.hpp"
 #include "sweeps/rebuild_command.hpp"
 #include "sweeps/show_command.hpp"
+#include "sweeps/sweep_command.hpp"
 #include "sweeps/threshold_command.hpp"
 #include "sweeps/verify_result_command.hpp"
 #include "tool_error.hpp"

@@ -3,7 +3,7 @@
 
 #include <ostream>
 
-#include "sweeps/sweep_command.hpp"
+#include "sweeps/make_workers.hpp"
 #include "tool_error.hpp"
 
 namespace quarzel::tool {

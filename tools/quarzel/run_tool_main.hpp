@@ -1,7 +1,7 @@
 // SPDX-License-Identifier: MIT
 #pragma once
 
-#include "sweeps/sweep_command.hpp"
+#include "sweeps/make_workers.hpp"
 
 namespace quarzel::tool {
 

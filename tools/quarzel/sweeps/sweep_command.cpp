@@ -1,44 +1,19 @@
 // SPDX-License-Identifier: MIT
 #include "sweeps/sweep_command.hpp"
 
-#include <fmt/format.h>
 #include <CLI/CLI.hpp>
-#include <filesystem>
-#include <iostream>
-#include <optional>
+#include <memory>
 #include <string>
 #include <utility>
 
-#include "files/file_lock.hpp"
-#include "files/input_file.hpp"
-#include "files/output_file.hpp"
 #include "options/threads_option.hpp"
 #include "options/whole_number.hpp"
-#include "report_text.hpp"
-#include "sweeps/checkpoint.hpp"
-#include "sweeps/failure_folder.hpp"
-#include "sweeps/sweep_files.hpp"
-#include "sweeps/sweep_options.hpp"
-#include "sweeps/sweep_table.hpp"
-#include "sweeps/sweep_watch.hpp"
+#include "sweeps/sweep_run.hpp"
 #include "tool_error.hpp"
 
 namespace quarzel::tool {
 
 namespace {
-
-struct Options {
-    SweepOptions sweep;
-    std::optional<std::string> output;
-    std::optional<std::string> checkpoint;
-    std::uint64_t checkpointSeconds = 30;
-    bool resume = false;
-    std::uint64_t keptFailures = 0;  // of each point
-    unsigned threads = 0;            // the usual number
-    SweepForm form = SweepForm::table;
-
-    bool isShard() const { return sweep.shard != "1/1"; }
-};
 
 constexpr const char* description = "Simulate a link: error rates over Eb/N0";
 
@@ -98,202 +73,10 @@ Examples:
   quarzel sweep --ebn0 1:0.1:2 --max-blocks 1000000 --shard 3/16 -o part3.json
 )";
 
-void checkOptions(const Options& options, Checkpoint& checkpoint) {
-    if (options.output && options.output->empty()) {
-        throw ToolError(ExitCode::usage, "-o", "the name of the file is empty", "give one");
-    }
-    if (options.isShard() && !options.output) {
-        throw ToolError(ExitCode::usage, "--shard", "a part is only useful in a file", "name one with -o");
-    }
-    if (options.resume && checkpoint.file().empty()) {
-        throw ToolError(ExitCode::usage, "--resume", "there is no file to go on from",
-                        "name the output with -o, or the checkpoint with --checkpoint");
-    }
-    if (options.output && !checkpoint.file().empty() && isSameFile(*options.output, checkpoint.file())) {
-        throw ToolError(ExitCode::usage, "--checkpoint", "it is also the output of -o", "give another name");
-    }
-    if (options.output) {
-        probeOutput(*options.output);
-    }
-    if (options.keptFailures != 0) {
-        if (!options.output || !isWhole(*options.output)) {
-            throw ToolError(ExitCode::usage, "--keep-failures", "there is no result to keep them beside",
-                            "name a file with -o");
-        }
-        FailureFolder(*options.output).probe();
-    }
-    checkpoint.lock();
-    if (!options.resume && checkpoint.exists()) {
-        throw fileError(checkpoint.file(), "is the checkpoint of an interrupted sweep",
-                        "go on from it with --resume, or remove it to begin anew");
-    }
-    checkpoint.probe();
-}
-
-/// What the output and the checkpoint already hold.
-sweep::Result knownResult(const Options& options, const Checkpoint& checkpoint, std::uint64_t seed,
-                          const std::optional<sweep::Part>& part) {
-    sweep::NamedResult known{options.output.value_or(""), {seed, {}, part}};
-    for (const std::string& file : {known.name, checkpoint.file()}) {
-        std::error_code ignored;
-        if (!isStandardStream(file) && std::filesystem::is_regular_file(file, ignored)) {
-            joinSweepFile(known, file);
-        }
-    }
-    return known.result;
-}
-
-/// Keep the first failing blocks of each point beside the result, which is there.
-void keepFailures(const Options& options, const sweep::Result& result, const sweep::Dispatcher& dispatcher,
-                  const MakeWorkers& makeWorkers) {
-    if (options.keptFailures != 0) {
-        const FailingBlocks failing =
-            failingBlocksOf(result.points, dispatcher, *makeWorkers(options.threads));
-        FailureFolder(*options.output).write(result, failing);
-    }
-}
-
-/// The plan of a sweep that goes on from what is known.
-sweep::Plan planOf(const Options& options, const sweep::Configuration& configuration,
-                   const sweep::Shard& shard, const sweep::Points& known) {
-    try {
-        sweep::Plan plan = sweep::planOf(configuration, shard, known);
-        plan.keptFailures = options.keptFailures;
-        return plan;
-    } catch (const sweep::Error& error) {
-        throw fileError(options.output.value_or(""), error.problem(), error.remedy());
-    }
-}
-
-[[noreturn]] void failInterrupted(const sweep::Dispatcher& dispatcher, bool isKept,
-                                  const Checkpoint& checkpoint) {
-    const std::string problem = fmt::format("interrupted when {} of {} points were done",
-                                            dispatcher.firstUnfinished(), dispatcher.plan().points.size());
-    if (checkpoint.file().empty()) {
-        throw ToolError(ExitCode::interrupted, "", problem, "next time name a file with -o to keep them");
-    }
-    if (!isKept) {
-        throw ToolError(
-            ExitCode::interrupted, checkpoint.file(), problem + ", and they could not be kept",
-            checkpoint.exists() ? "go on from what was kept before with --resume" : "run the command again");
-    }
-    throw ToolError(ExitCode::interrupted, "", problem, "go on with the same command and --resume");
-}
-
-/// What the user can do, beyond what the failure itself says, when the result could not be written.
-const char* remedyForResult(bool isKept, const Checkpoint& checkpoint) {
-    if (isKept) {
-        return "the sweep is done: --resume then writes it at once";
-    }
-    return checkpoint.exists() ? "--resume then goes on from what was kept" : "the sweep then begins anew";
-}
-
-/// Write the output of a finished sweep. The checkpoint stays until the output is there.
-void writeResult(const Options& options, const sweep::Dispatcher& dispatcher, const sweep::Result& result,
-                 Checkpoint& checkpoint) {
-    if (options.output) {
-        const bool isKept = checkpoint.save(dispatcher);
-        try {
-            writeOutput(*options.output, sweep::resultText(result));
-        } catch (const ToolError& error) {
-            throw ToolError(error.code(), "", error.what(), remedyForResult(isKept, checkpoint));
-        }
-        checkpoint.remove();
-    }
-}
-
-/// Where the report goes: standard output that holds the result holds nothing else.
-std::ostream& reportStream(const Options& options, std::ostream& results) {
-    return options.output && isStandardStream(*options.output) ? std::cerr : results;
-}
-
-void printResult(const Options& options, const sweep::Result& result, std::ostream& results) {
-    std::ostream& stream = reportStream(options, results);
-    if (!result.part) {
-        printSweep(stream, result, options.form);
-        return;
-    }
-    std::uint64_t blocks = 0;
-    for (const auto& [setup, point] : result.points) {
-        blocks += point.blocks;
-    }
-    const sweep::Shard& shard = result.part->shard;
-    stream << fmt::format("{}: part {} of {}, {} with {} blocks\n", *options.output, shard.index + 1,
-                          shard.count, counted(result.points.size(), "point", "points"), blocks);
-}
-
-/// Where an interruption loses nothing; empty: nowhere.
-std::string checkpointOf(const Options& options) {
-    if (options.checkpoint) {
-        return *options.checkpoint;
-    }
-    return options.output && isWhole(*options.output) ? *options.output + ".checkpoint" : "";
-}
-
-void runSweep(const Options& options, std::ostream& results, const MakeWorkers& makeWorkers) {
-    const sweep::Configuration configuration = configurationOf(options.sweep);
-    const sweep::Shard shard = shardOf(options.sweep);
-    const std::optional<sweep::Part> part = sweep::partOf(configuration, shard);
-    Checkpoint checkpoint(checkpointOf(options), std::chrono::seconds(options.checkpointSeconds), part);
-    checkOptions(options, checkpoint);
-    // What the output has meanwhile received would be lost, too.
-    const std::unique_ptr<FileLock> lock = lockOutput(options.output);
-    sweep::Result result = knownResult(options, checkpoint, configuration.seed, part);
-    sweep::Dispatcher dispatcher(planOf(options, configuration, shard, result.points));
-    const bool isThere = !result.points.empty() && !checkpoint.exists();
-    if (dispatcher.hasFinished() && isThere) {
-        printResult(options, result, results);
-        keepFailures(options, result, dispatcher, makeWorkers);
-        return;
-    }
-    bool isShown = false;
-    {
-        SweepWatch watch(checkpoint);
-        makeWorkers(options.threads)->run(dispatcher, watch);
-        isShown = watch.finish(dispatcher) && options.form == SweepForm::table && !part;
-    }
-    if (!dispatcher.hasFinished()) {
-        if ((!options.output || checkpoint.file().empty()) && !isShown) {
-            printSweep(reportStream(options, results), {result.seed, dispatcher.points(), part},
-                       options.form);
-        }
-        failInterrupted(dispatcher, checkpoint.save(dispatcher), checkpoint);
-    }
-    for (std::size_t i = 0; i < dispatcher.plan().points.size(); ++i) {
-        const auto known = result.points.find(dispatcher.plan().points[i].setup);
-        if (dispatcher.isLeftOut(i) && known != result.points.end() && !known->second.stoppedBy) {
-            result.points.erase(known);  // begun by a run that was interrupted
-        }
-    }
-    for (const auto& [setup, point] : dispatcher.points()) {
-        result.points.insert_or_assign(setup, point);
-    }
-    isShown = isShown && result.points.size() == dispatcher.plan().points.size();
-    try {
-        writeResult(options, dispatcher, result, checkpoint);
-    } catch (const ToolError&) {
-        if (!result.part && !isShown) {
-            printResult(options, result, results);  // perhaps all that is left of it
-        }
-        throw;
-    }
-    if (!isShown) {
-        printResult(options, result, results);
-    }
-    if (!options.output && results.flush()) {
-        checkpoint.remove();
-    }
-    keepFailures(options, result, dispatcher, makeWorkers);
-}
-
 }  // namespace
 
-std::unique_ptr<sweep::Workers> makeThreadWorkers(unsigned threads) {
-    return std::make_unique<sweep::ThreadWorkers>(threads == 0 ? allCores() : threads);
-}
-
 void addSweepCommand(CLI::App& app, std::ostream& results, MakeWorkers makeWorkers) {
-    auto options = std::make_shared<Options>();
+    auto options = std::make_shared<SweepRunOptions>();
     CLI::App* command = app.add_subcommand("sweep", description)->group("Commands");
     command->footer(std::string(footer) + '\n' + exitCodesHelp);
     addSweepOptions(*command, options->sweep);
@@ -316,7 +99,7 @@ void addSweepCommand(CLI::App& app, std::ostream& results, MakeWorkers makeWorke
     addThreadsOption(*command, options->threads);
     addFormOptions(*command, options->form);
     command->callback([options, &results, makeWorkers = std::move(makeWorkers)] {
-        runSweep(*options, results, makeWorkers);
+        SweepRun(*options, results).run(makeWorkers);
     });
 }
 

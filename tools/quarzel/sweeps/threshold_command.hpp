@@ -4,7 +4,7 @@
 #include <ostream>
 
 #include "options/cli_fwd.hpp"
-#include "sweeps/sweep_command.hpp"
+#include "sweeps/make_workers.hpp"
 
 namespace quarzel::tool {
 

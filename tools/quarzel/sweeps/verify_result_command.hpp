@@ -4,7 +4,7 @@
 #include <ostream>
 
 #include "options/cli_fwd.hpp"
-#include "sweeps/sweep_command.hpp"
+#include "sweeps/make_workers.hpp"
 #include "tool_error.hpp"
 
 namespace quarzel::tool {
