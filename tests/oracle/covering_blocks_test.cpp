@@ -89,9 +89,9 @@ INSTANTIATE_TEST_SUITE_P(Cores, CoveringBlocks,
                          testing::Values(std::pair(2, 0), std::pair(2, 1), std::pair(2, 2), std::pair(4, 0),
                                          std::pair(4, 1), std::pair(4, 2), std::pair(8, 0), std::pair(8, 1),
                                          std::pair(8, 2)),
-                         [](const auto& info) {
-                             return std::to_string(info.param.first) + "UnitsType" +
-                                    std::to_string(info.param.second);
+                         [](const auto& test) {
+                             return std::to_string(test.param.first) + "UnitsType" +
+                                    std::to_string(test.param.second);
                          });
 
 /// Why the odd step of a halved rest goes nowhere.

@@ -94,6 +94,6 @@ TEST_P(LinkReceived, IsWhatASweepReceives) {
 }
 
 INSTANTIATE_TEST_SUITE_P(AllKinds, LinkReceived, testing::ValuesIn(linkCases()),
-                         [](const auto& info) { return std::string(info.param.name); });
+                         [](const auto& test) { return std::string(test.param.name); });
 
 }  // namespace quarzel::test

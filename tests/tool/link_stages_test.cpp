@@ -127,6 +127,6 @@ TEST_P(LinkStages, TellWhichCrcsHold) {
 }
 
 INSTANTIATE_TEST_SUITE_P(AllKinds, LinkStages, testing::ValuesIn(linkCases()),
-                         [](const auto& info) { return std::string(info.param.name); });
+                         [](const auto& test) { return std::string(test.param.name); });
 
 }  // namespace quarzel::test
