@@ -186,7 +186,8 @@ TEST(ShowCommand, PrintsAStoredResult) {
         show.insert(show.end(), form.begin(), form.end());
         std::vector<std::string> options = {"-o", file};
         options.insert(options.end(), form.begin(), form.end());
-        EXPECT_EQ(runTool(quickSweepWith(options)).out, runTool(show).out);
+        const std::string printed = runTool(quickSweepWith(options)).out;
+        EXPECT_EQ(runTool(show).out, printed);
     }
     EXPECT_THAT(runTool({"show", QUARZEL_SWEEP_DATA "/every_core.json"}).out, testing::HasSubstr(", scale "));
 }
