@@ -174,6 +174,9 @@ TEST(State, ADefaultStateHasNoComponentsAndCanBeDestroyed) {
 
 TEST(State, RecordIsPlainAndInTheDocumentedOrder) {
     static_assert(std::is_trivially_copyable_v<vardel_ip_quarzel_state>);
+    if (sizeof(void*) != 8) {
+        GTEST_SKIP() << "the offsets are those of 64-bit processors";
+    }
     EXPECT_EQ(offsetof(vardel_ip_quarzel_state, generics), 0U);
     EXPECT_EQ(offsetof(vardel_ip_quarzel_state, decoder), 72U);
     EXPECT_EQ(offsetof(vardel_ip_quarzel_state, interleaver), 80U);
