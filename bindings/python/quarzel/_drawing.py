@@ -102,6 +102,7 @@ def draw_uncoded(axes: Any, curves: list[Curve], rate: str) -> None:
 
 
 def frame(axes: Any, rate: str, lowest: float) -> None:
+    """Name the axes, and end the logarithmic one at the decade below the lowest mark."""
     axes.set_yscale("log")
     axes.set_ylim(10.0 ** min(-1, math.floor(math.log10(lowest / 1.5))), 1)
     axes.set(xlabel="Eb/N0 [dB]", ylabel=_NAMES[rate])
